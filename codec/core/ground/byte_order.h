@@ -1,0 +1,32 @@
+// Integers on disk and on the wire, byte by byte: the same on every host, at any alignment.
+#pragma once
+
+#include <cstdint>
+
+namespace pelo {
+
+constexpr uint16_t load_be16(const uint8_t* p) { return static_cast<uint16_t>(p[0] << 8 | p[1]); }
+constexpr uint32_t load_be32(const uint8_t* p) {
+  return uint32_t{p[0]} << 24 | uint32_t{p[1]} << 16 | uint32_t{p[2]} << 8 | p[3];
+}
+constexpr uint64_t load_be64(const uint8_t* p) {
+  return uint64_t{load_be32(p)} << 32 | load_be32(p + 4);
+}
+constexpr uint16_t load_le16(const uint8_t* p) { return static_cast<uint16_t>(p[1] << 8 | p[0]); }
+constexpr uint32_t load_le32(const uint8_t* p) {
+  return uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 | uint32_t{p[1]} << 8 | p[0];
+}
+constexpr void store_be16(uint8_t* p, uint32_t v) {
+  p[0] = static_cast<uint8_t>(v >> 8);
+  p[1] = static_cast<uint8_t>(v);
+}
+constexpr void store_le16(uint8_t* p, uint32_t v) {
+  p[0] = static_cast<uint8_t>(v);
+  p[1] = static_cast<uint8_t>(v >> 8);
+}
+constexpr void store_le32(uint8_t* p, uint32_t v) {
+  store_le16(p, v);
+  store_le16(p + 2, v >> 16);
+}
+
+}  // namespace pelo

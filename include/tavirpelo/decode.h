@@ -1,0 +1,57 @@
+/*
+ * Decoding: one call from a file or a byte buffer into a raw image, and the JPEG decoder on a decoder
+ * information object.
+ */
+#ifndef TAVIRPELO_DECODE_H
+#define TAVIRPELO_DECODE_H
+
+#include "tavirpelo/decinfo.h"
+#include "tavirpelo/raw.h"
+
+/* ---- one-call decoding ----
+ * The picture is placed in `raw` (its size and format) as the option word says. 1, or 0 with
+ * debug_PeloCodecError 15 (null source, raw image or pixels), 12 (length 0), 9 (unknown or unsupported
+ * format). Pixels may be partly written after a failure. */
+
+/* Detect the format first. */
+TAVIRPELO_API int TAVIRPELO_DecodeImageFromFile(const char* path, TAVIRPELO_RAWINFO* raw,
+                                                uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeImageFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                                  uint32_t option);
+
+TAVIRPELO_API int TAVIRPELO_DecodeJpegFromFile(const char* path, TAVIRPELO_RAWINFO* raw,
+                                               uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeJpegFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                                 uint32_t option);
+
+/* The same without argument checks. */
+TAVIRPELO_API int elo_dec_jpeg_from_file(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int elo_dec_jpeg_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                           uint32_t option);
+
+/* ---- JPEG on a decoder information object ---- */
+
+/* Decodes into a buffer of reqWidth x reqHeight pixels of decInfo->outFormat, fitted and rotated by
+ * decInfo->option. With TAVIRPELO_FIT_TIGHT the buffer holds exactly the produced picture. 1, or 0 with
+ * gTAVIRPELO_Error 2 or 4 (or none) and a line in the log. Damaged or short baseline data keeps the rows
+ * decoded so far and gives 1. */
+TAVIRPELO_API int TAVIRPELO_DecodeJPEG(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth,
+                                       int reqHeight);
+
+/* Decodes the embedded JPEG thumbnail tightly; it is at most reqWidth x reqHeight, its size is stored in
+ * *outWidth and *outHeight. 1, or 0 (no thumbnail, failure). decInfo->option keeps the tight fitting. */
+TAVIRPELO_API int PELOJ_DecodeThumbnail(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth,
+                                        int reqHeight, int* outWidth, int* outHeight);
+
+/* Uncompressed thumbnails are never decoded: does nothing, 1. */
+TAVIRPELO_API int PELOJ_DecodeUncompressThumbnail(void);
+
+/* Size of the last produced picture, before rotation; 1. */
+TAVIRPELO_API int PELOJ_GetDecSize(const TAVIRPELO_DECINFO* decInfo, int* width, int* height);
+
+/* Turn a packed width x height picture in place, clockwise or the other way. 1, or 0 for formats other
+ * than 0, 1 and 9 or when memory is short. */
+TAVIRPELO_API int PELOJ_RotateImage90(void* buffer, int width, int height, int outFormat);
+TAVIRPELO_API int PELOJ_RotateImage270(void* buffer, int width, int height, int outFormat);
+
+#endif

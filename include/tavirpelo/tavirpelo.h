@@ -1,0 +1,12 @@
+/* The whole codec interface. */
+#ifndef TAVIRPELO_TAVIRPELO_H
+#define TAVIRPELO_TAVIRPELO_H
+
+#include "tavirpelo/decinfo.h"
+#include "tavirpelo/decode.h"
+#include "tavirpelo/encode.h"
+#include "tavirpelo/io.h"
+#include "tavirpelo/parse.h"
+#include "tavirpelo/raw.h"
+
+#endif
