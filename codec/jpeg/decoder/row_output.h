@@ -1,0 +1,49 @@
+// The last stage of a decode: one row of samples becomes one row of the caller's pixels.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "codec/pixel/packers.h"
+#include "tavirpelo/api.h"
+
+typedef struct PELOJ_JDINFO PELOJ_JDINFO;
+
+namespace pelo::jpeg {
+
+// Where and how rows are written. Rows are addressed from their number, so that no pointer is formed
+// outside the buffer; one past `limit` is counted but never written.
+struct RowOutput {
+  uint8_t* plane[3];    // first pixel; null writes nothing
+  ptrdiff_t pixelStep;  // bytes between neighbours of a written row
+  ptrdiff_t rowStep;    // bytes between written rows
+  int planar;           // Y, Cb and Cr planes
+  int dither;           // YCbCr sources only
+  int emitted;          // rows delivered
+  int limit;            // rows to deliver
+  PackRow pack;
+};
+
+// Sets the output position and the packer of the state's format, rotation and target size; `buffer` holds
+// bufferWidth x bufferHeight pixels, or exactly the picture when the fitting is tight.
+void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option);
+
+}  // namespace pelo::jpeg
+
+// One-row writers: `count` samples a row of each channel, one pixel each.
+TAVIRPELO_API void PELOJ_YcbcrWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
+                                              const uint8_t* cr, int count);
+TAVIRPELO_API void PELOJ_GrayWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count);
+TAVIRPELO_API void PELOJ_RGBWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g,
+                                            const uint8_t* b, int count);
+
+// The sample nearest to each output column's centre; `count` is the number of output columns.
+TAVIRPELO_API void PELOJ_FastYcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
+                                              const uint8_t* cr, int count);
+TAVIRPELO_API void PELOJ_FastYcbcrUpscaleWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y,
+                                                     const uint8_t* cb, const uint8_t* cr, int count);
+
+// Accumulator writers: `count` packed sums of four samples (codec/pixel/lanes.h).
+TAVIRPELO_API void PELOJ_YcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
+TAVIRPELO_API void PELOJ_GrayWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
+TAVIRPELO_API void PELOJ_RGBWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
