@@ -1,0 +1,10 @@
+// The row functions: one iMCU row is decoded when the last one is used up, then shown row by row.
+#pragma once
+
+#include "codec/jpeg/decoder/jd_info.h"
+
+// Produce up to `rowsWanted` full-grid rows (minus *rowCounter, which advances) at full size and at
+// reduced scales. 201: failed or aborted by CheckFn; 101: the picture's last rows have been produced, or
+// its data has ended quietly; another value: more to come.
+TAVIRPELO_API int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
+TAVIRPELO_API int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
