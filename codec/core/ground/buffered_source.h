@@ -29,7 +29,7 @@ constexpr uint32_t kSourceBufferSize = 4096;
 // A reader with its own zero-filled buffer.
 class BufferedSource {
  public:
-  // Starts at the I/O object's current position; false when memory is short.
+  // Offsets count from 0, so the caller moves the I/O object to its start. False when memory is short.
   [[nodiscard]] bool open(TAVIRPELO_IO* io);
   PELOJ_SOURCE* get() { return &source_; }
   PELOJ_SOURCE* operator->() { return &source_; }

@@ -1,0 +1,112 @@
+// The OS layer: the only place where the codec meets the platform's memory, files and threads.
+#include <pthread.h>
+#include <sys/stat.h>
+
+#include <climits>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+
+#include "platform/fault_injection.h"
+#include "tavirpelo/io.h"
+
+using pelo::faults::allocations;
+
+namespace {
+
+bool usable(const FILE* stream) {
+  return stream != nullptr && stream != TAVIRPELO_INVALID_FILE;
+}
+
+}  // namespace
+
+// ---- memory ----
+
+void* TAVIRPELO_OsMalloc(size_t size) {
+  if (size == 0 || allocations.hit()) return nullptr;
+  return std::malloc(size);
+}
+
+void TAVIRPELO_OsFree(void* pointer) {
+  std::free(pointer);
+}
+
+void* TAVIRPELO_OsRealloc(void* pointer, size_t size) {
+  if (allocations.hit()) return nullptr;
+  return std::realloc(pointer, size);
+}
+
+// The C functions may not be given null even for no bytes.
+void* TAVIRPELO_OsMemcpy(void* destination, const void* source, size_t size) {
+  return size == 0 ? destination : std::memcpy(destination, source, size);
+}
+
+void* TAVIRPELO_OsMemset(void* destination, int value, size_t size) {
+  return size == 0 ? destination : std::memset(destination, value, size);
+}
+
+// ---- files ----
+
+FILE* TAVIRPELO_OsFopen(const char* path, const char* mode) {
+  if (path == nullptr) return nullptr;
+  // Opening a directory for reading succeeds on some systems; only its reads fail.
+  struct stat status;
+  if (lstat(path, &status) == 0 && S_ISDIR(status.st_mode)) return nullptr;
+  return std::fopen(path, mode);
+}
+
+size_t TAVIRPELO_OsFread(void* buffer, size_t size, size_t count, FILE* stream) {
+  return std::fread(buffer, size, count, stream);
+}
+
+size_t TAVIRPELO_OsFwrite(const void* buffer, size_t size, size_t count, FILE* stream) {
+  return std::fwrite(buffer, size, count, stream);
+}
+
+int TAVIRPELO_OsFseek(FILE* stream, long offset, int whence) {
+  return std::fseek(stream, offset, whence);
+}
+
+long TAVIRPELO_OsFtell(FILE* stream) {
+  return std::ftell(stream);
+}
+
+int TAVIRPELO_OsFclose(FILE* stream) {
+  return std::fclose(stream);
+}
+
+FILE* TAVIRPELO_OpenFile(const char* path) {
+  FILE* stream = TAVIRPELO_OsFopen(path, "rb");
+  return stream != nullptr ? stream : TAVIRPELO_INVALID_FILE;
+}
+
+int TAVIRPELO_ReadFile(FILE* stream, void* buffer, int length) {
+  if (!usable(stream) || buffer == nullptr || length < 1) return 0;
+  return static_cast<int>(TAVIRPELO_OsFread(buffer, 1, static_cast<size_t>(length), stream));
+}
+
+// A refused seek is not an error of its own: the caller compares the position with what it asked for.
+int TAVIRPELO_SeekFile(FILE* stream, int offset, int whence) {
+  if (!usable(stream)) return -1;
+  (void)TAVIRPELO_OsFseek(stream, offset, whence);
+  const long position = TAVIRPELO_OsFtell(stream);
+  return position < 0 || position > INT_MAX ? -1 : static_cast<int>(position);
+}
+
+int TAVIRPELO_CloseFile(FILE* stream) {
+  return usable(stream) ? TAVIRPELO_OsFclose(stream) : EOF;
+}
+
+// ---- tasks ----
+
+unsigned long TAVIRPELO_OsThreadCreate(void* (*routine)(void*), void* argument) {
+  pthread_t thread;
+  if (pthread_create(&thread, nullptr, routine, argument) != 0) return 0;
+  return static_cast<unsigned long>(thread);
+}
+
+void TAVIRPELO_OsSleep(int) {}
+
+void TAVIRPELO_CheckExStatus(int* status) {
+  if (status != nullptr) *status = 0;
+}
