@@ -97,7 +97,15 @@ TAVIRPELO_API long TAVIRPELO_OsFtell(FILE* stream);
 TAVIRPELO_API int TAVIRPELO_OsFclose(FILE* stream);
 
 /* The value TAVIRPELO_OpenFile returns instead of null. */
+#ifdef __cplusplus
+#define TAVIRPELO_INVALID_FILE (reinterpret_cast<FILE*>(static_cast<ptrdiff_t>(-1)))
+#else
+#ifdef __cplusplus
+#define TAVIRPELO_INVALID_FILE (reinterpret_cast<FILE*>(ptrdiff_t{-1}))
+#else
 #define TAVIRPELO_INVALID_FILE ((FILE*)(ptrdiff_t)-1)
+#endif
+#endif
 
 /* Opens for reading; TAVIRPELO_INVALID_FILE on failure. */
 TAVIRPELO_API FILE* TAVIRPELO_OpenFile(const char* path);
