@@ -1,10 +1,7 @@
-// The decoder information object: creation, options, callbacks, the error globals.
+// The decoder information object: creation, options, callbacks.
 #include "codec/core/ground/os_memory.h"
+#include "codec/core/ground/zoom_state.h"
 #include "tavirpelo/decinfo.h"
-
-int gTAVIRPELO_Error = 0;
-int gTavirError = 0;
-int debug_PeloCodecError = 0;
 
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_DECINFO) == 76);
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_CALLBACK) == 8);
@@ -54,7 +51,7 @@ TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfoWithStream(void* context, int size, TA
 int TAVIRPELO_DestroyDecInfo(TAVIRPELO_DECINFO* decInfo) {
   gTavirError = decInfo == nullptr ? TAVIRPELO_ERROR_NULL : TAVIRPELO_ERROR_NONE;
   if (decInfo == nullptr) return 0;
-  TAVIRPELO_OsFree(decInfo->pZoomInfo);
+  pelo::release_zoom_state(*decInfo);
   TAVIRPELO_OsFree(decInfo->pCallback);
   TAVIRPELO_Close_IO(decInfo->pIO);
   TAVIRPELO_OsFree(decInfo);
@@ -74,8 +71,6 @@ int TAVIRPELO_SetDecMode(TAVIRPELO_DECINFO* decInfo, int mode) {
 }
 
 int TAVIRPELO_GetErrorCode(void) { return gTavirError; }
-
-int TAVIRPELO_CheckFn(TAVIRPELO_DECINFO*, int, int) { return 1; }
 
 int PELOJ_GetVersion(void) { return kDecoderVersion; }
 
