@@ -100,11 +100,7 @@ TAVIRPELO_API int TAVIRPELO_OsFclose(FILE* stream);
 #ifdef __cplusplus
 #define TAVIRPELO_INVALID_FILE (reinterpret_cast<FILE*>(static_cast<ptrdiff_t>(-1)))
 #else
-#ifdef __cplusplus
-#define TAVIRPELO_INVALID_FILE (reinterpret_cast<FILE*>(ptrdiff_t{-1}))
-#else
 #define TAVIRPELO_INVALID_FILE ((FILE*)(ptrdiff_t)-1)
-#endif
 #endif
 
 /* Opens for reading; TAVIRPELO_INVALID_FILE on failure. */
