@@ -13,7 +13,7 @@ int next_byte(BitReader& reader) {
     if (count <= 0) return -1;
     source.consumed += static_cast<uint32_t>(count);
     reader.next = source.buffer;
-    reader.end = source.buffer + count;
+    reader.end = reader.plainEnd = source.buffer + count;
   }
   return *reader.next++;
 }
@@ -59,6 +59,7 @@ BitReader fill_by_bytes(BitReader reader) {
   while (state.left <= kBitBufferSize - 8) {
     const int byte = reader.jd->unreadMarker == 0 ? next_data_byte(reader) : -1;
     if (byte < 0) {
+      reader.plainEnd = reader.next;
       pad(state);
       break;
     }
@@ -75,7 +76,8 @@ uint32_t decode_long_code(BitReader& reader, const DerivedTable& table) {
 
 BitReader open_bits(PELOJ_JDINFO& jd) {
   const uint8_t* next = jd.source->buffer + jd.source->pos;
-  return {jd.entropy->bits, next, next + jd.source->avail, &jd};
+  const uint8_t* end = next + jd.source->avail;
+  return {jd.entropy->bits, next, end, jd.unreadMarker == 0 ? end : next, &jd};
 }
 
 void close_bits(PELOJ_JDINFO& jd, const BitReader& reader) {

@@ -31,6 +31,7 @@ struct BitReader {
   BitState state;
   const uint8_t* next;
   const uint8_t* end;
+  const uint8_t* plainEnd;  // end, or next once a marker was met: what may be read without looking
   PELOJ_JDINFO* jd;
 
   void fill();
@@ -64,7 +65,7 @@ constexpr bool has_ff(uint32_t word) { return ((~word - 0x01010101u) & word & 0x
 inline void BitReader::fill() {
   if (state.left >= kFilledBits) return;
   if constexpr (kBitBufferSize == 64) {
-    if (end - next >= 4) {
+    if (plainEnd - next >= 4) {
       const uint32_t word = load_be32(next);
       if (!has_ff(word)) {
         state.bits = state.bits << 32 | word;

@@ -1,0 +1,148 @@
+#include "tests/support/jpeg_samples.h"
+
+#include <cmath>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+
+#include "tavirpelo/tavirpelo.h"
+
+#ifdef TAVIR_HAVE_LIBJPEG
+#include <jpeglib.h>
+#endif
+
+namespace tests {
+
+Bytes sample_pixels(int width, int height) {
+  Bytes pixels;
+  uint32_t noise = 12345;
+  for (int y = 0; y < height; ++y) {
+    for (int x = 0; x < width; ++x) {
+      noise = noise * 1664525 + 1013904223;
+      const int edge = (x / 9 + y / 7) % 2 * 60;
+      pixels.push_back(static_cast<uint8_t>((x * 5 + edge) % 256));
+      pixels.push_back(static_cast<uint8_t>((y * 3 + edge + static_cast<int>(noise >> 28)) % 256));
+      pixels.push_back(static_cast<uint8_t>((x + y * 2) % 256));
+    }
+  }
+  return pixels;
+}
+
+Bytes encode_own(int width, int height, int quality, bool grey) {
+  const Bytes pixels = sample_pixels(width, height);
+  TAVIRPELO_RAWINFO raw{};
+  raw.width = static_cast<uint32_t>(width);
+  raw.height = static_cast<uint32_t>(height);
+  raw.pData = const_cast<uint8_t*>(pixels.data());
+  raw.format = grey ? TAVIRPELO_GREY8 : TAVIRPELO_RGB888;
+  int size = 1024;
+  auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(1024));
+  if (!TAVIRPELO_EncodeJpegToBuffer(&raw, &buffer, &size, quality)) return {};
+  Bytes jpeg(buffer, buffer + size);
+  TAVIRPELO_OsFree(buffer);
+  return jpeg;
+}
+
+#ifdef TAVIR_HAVE_LIBJPEG
+namespace {
+
+// Each component in a scan of its own.
+const jpeg_scan_info kSeparate[3] = {
+    {1, {0, 0, 0, 0}, 0, 63, 0, 0}, {1, {1, 0, 0, 0}, 0, 63, 0, 0}, {1, {2, 0, 0, 0}, 0, 63, 0, 0}};
+
+}  // namespace
+
+Bytes encode_libjpeg(int width, int height, const JpegStyle& style) {
+  jpeg_compress_struct c;
+  jpeg_error_mgr errors;
+  c.err = jpeg_std_error(&errors);
+  jpeg_create_compress(&c);
+  unsigned char* memory = nullptr;
+  unsigned long size = 0;
+  jpeg_mem_dest(&c, &memory, &size);
+  c.image_width = static_cast<JDIMENSION>(width);
+  c.image_height = static_cast<JDIMENSION>(height);
+  c.input_components = 3;
+  c.in_color_space = JCS_RGB;
+  jpeg_set_defaults(&c);
+  jpeg_set_colorspace(&c, style.components == 1 ? JCS_GRAYSCALE : style.rgb ? JCS_RGB : JCS_YCbCr);
+  jpeg_set_quality(&c, style.quality, TRUE);
+  c.comp_info[0].h_samp_factor = style.h;
+  c.comp_info[0].v_samp_factor = style.v;
+  c.restart_interval = static_cast<unsigned>(style.restartInterval);
+  c.optimize_coding = style.optimise ? TRUE : FALSE;
+  if (style.separateScans) {
+    c.scan_info = kSeparate;
+    c.num_scans = 3;
+  }
+  jpeg_start_compress(&c, TRUE);
+  Bytes pixels = sample_pixels(width, height);
+  for (int y = 0; y < height; ++y) {
+    JSAMPROW row = pixels.data() + static_cast<size_t>(3 * width) * static_cast<size_t>(y);
+    jpeg_write_scanlines(&c, &row, 1);
+  }
+  jpeg_finish_compress(&c);
+  jpeg_destroy_compress(&c);
+  Bytes jpeg(memory, memory + size);
+  std::free(memory);
+  return jpeg;
+}
+
+Decoded decode_libjpeg(const Bytes& jpeg, int numerator) {
+  jpeg_decompress_struct d;
+  jpeg_error_mgr errors;
+  d.err = jpeg_std_error(&errors);
+  jpeg_create_decompress(&d);
+  jpeg_mem_src(&d, jpeg.data(), static_cast<unsigned long>(jpeg.size()));
+  jpeg_read_header(&d, TRUE);
+  d.scale_num = static_cast<unsigned>(numerator);
+  d.scale_denom = 8;
+  d.do_fancy_upsampling = FALSE;
+  jpeg_start_decompress(&d);
+  Decoded out{static_cast<int>(d.output_width), static_cast<int>(d.output_height), d.output_components, {}};
+  const size_t stride = static_cast<size_t>(out.width) * static_cast<size_t>(out.components);
+  out.pixels.resize(stride * static_cast<size_t>(out.height));
+  while (d.output_scanline < d.output_height) {
+    JSAMPROW row = out.pixels.data() + stride * d.output_scanline;
+    jpeg_read_scanlines(&d, &row, 1);
+  }
+  jpeg_finish_decompress(&d);
+  jpeg_destroy_decompress(&d);
+  return out;
+}
+
+std::vector<Plane> read_coefficients(const Bytes& jpeg) {
+  jpeg_decompress_struct d;
+  jpeg_error_mgr errors;
+  d.err = jpeg_std_error(&errors);
+  jpeg_create_decompress(&d);
+  jpeg_mem_src(&d, jpeg.data(), static_cast<unsigned long>(jpeg.size()));
+  jpeg_read_header(&d, TRUE);
+  jvirt_barray_ptr* arrays = jpeg_read_coefficients(&d);
+  std::vector<Plane> planes;
+  for (int c = 0; c < d.num_components; ++c) {
+    const jpeg_component_info& info = d.comp_info[c];
+    Plane plane{info.h_samp_factor, info.v_samp_factor, static_cast<int>(info.width_in_blocks),
+                static_cast<int>(info.height_in_blocks), {}, {}};
+    plane.quant.assign(info.quant_table->quantval, info.quant_table->quantval + 64);
+    for (JDIMENSION row = 0; row < info.height_in_blocks; ++row) {
+      JBLOCKARRAY blocks = d.mem->access_virt_barray(reinterpret_cast<j_common_ptr>(&d), arrays[c], row, 1, FALSE);
+      for (JDIMENSION column = 0; column < info.width_in_blocks; ++column) {
+        plane.coefficients.insert(plane.coefficients.end(), blocks[0][column], blocks[0][column] + 64);
+      }
+    }
+    planes.push_back(plane);
+  }
+  jpeg_finish_decompress(&d);
+  jpeg_destroy_decompress(&d);
+  return planes;
+}
+#endif
+
+double psnr(const Bytes& a, const Bytes& b) {
+  double sum = 0;
+  for (size_t i = 0; i < a.size(); ++i) sum += (a[i] - b[i]) * (a[i] - b[i]);
+  return sum == 0 ? 99 : 10 * std::log10(255.0 * 255.0 * static_cast<double>(a.size()) / sum);
+}
+
+}  // namespace tests
