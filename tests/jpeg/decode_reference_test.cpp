@@ -30,7 +30,7 @@ int last_position(const int32_t* block) {
   return last;
 }
 
-Grid reference_grid(const Plane& plane, int hMax, int vMax) {
+Grid reference_grid(const Plane& plane, int hMax, int vMax, bool progressive) {
   int32_t multiplier[64];
   for (size_t i = 0; i < 64; ++i) multiplier[i] = plane.quant[i] * pelo::jpeg::kAanScale[i] >> 2;
   const int width = plane.blocksWide * 8;
@@ -41,7 +41,8 @@ Grid reference_grid(const Plane& plane, int hMax, int vMax) {
     std::copy_n(plane.coefficients.data() + 64 * b, 64, block);
     uint8_t* rows[8];
     for (int r = 0; r < 8; ++r) rows[r] = small.data() + width * (b / plane.blocksWide * 8 + r);
-    pelo::jpeg::idct_full(last_position(block))(nullptr, multiplier, block, rows, b % plane.blocksWide * 8);
+    const auto transform = progressive ? PELOJ_DoIdct : pelo::jpeg::idct_full(last_position(block));
+    transform(nullptr, multiplier, block, rows, b % plane.blocksWide * 8);
   }
   Grid grid;
   const int fx = hMax / plane.h;
@@ -81,7 +82,7 @@ int sample(const Grid& grid, const Case& c, int x, int y, bool centre) {
 
 Bytes reference(const Case& c, const std::vector<Plane>& planes, bool centre) {
   std::vector<Grid> grids;
-  for (const Plane& plane : planes) grids.push_back(reference_grid(plane, planes[0].h, planes[0].v));
+  for (const Plane& plane : planes) grids.push_back(reference_grid(plane, planes[0].h, planes[0].v, c.style.progressive));
   Bytes out;
   for (int y = 0; y < c.outHeight; ++y) {
     for (int x = 0; x < c.outWidth; ++x) {
@@ -130,6 +131,11 @@ JpegStyle rgb() {
   return s;
 }
 
+JpegStyle progressive(JpegStyle s) {
+  s.progressive = true;
+  return s;
+}
+
 class FullSize : public testing::TestWithParam<Case> {};
 
 TEST_P(FullSize, EqualsTheFormulas) {
@@ -150,6 +156,14 @@ INSTANTIATE_TEST_SUITE_P(
                     Case{131, 67, rgb(), 131, 67}, Case{1, 1, style(2, 2), 1, 1},
                     Case{3, 200, style(2, 2), 3, 200}, Case{200, 5, style(2, 2, 1), 200, 5},
                     Case{131, 67, style(2, 2, 3), 131, 67}));
+INSTANTIATE_TEST_SUITE_P(
+    Progressive, FullSize,
+    testing::Values(Case{131, 67, progressive(style(2, 2)), 131, 67},
+                    Case{300, 200, progressive(style(1, 1)), 300, 200},
+                    Case{131, 167, progressive(style(2, 1, 4)), 131, 167},
+                    Case{200, 170, progressive(grey()), 200, 170},
+                    Case{7, 9, progressive(style(2, 2)), 7, 9},
+                    Case{700, 700, progressive(style(1, 2)), 700, 700}));
 INSTANTIATE_TEST_SUITE_P(
     Resampling, FullSize,
     testing::Values(Case{200, 200, style(1, 1), 130, 171}, Case{200, 200, grey(), 101, 199},

@@ -71,6 +71,7 @@ Bytes encode_libjpeg(int width, int height, const JpegStyle& style) {
   c.comp_info[0].v_samp_factor = style.v;
   c.restart_interval = static_cast<unsigned>(style.restartInterval);
   c.optimize_coding = style.optimise ? TRUE : FALSE;
+  if (style.progressive) jpeg_simple_progression(&c);
   if (style.separateScans) {
     c.scan_info = kSeparate;
     c.num_scans = 3;

@@ -24,6 +24,7 @@ struct JpegStyle {
   bool rgb = false;         // colour space RGB instead of YCbCr
   bool separateScans = false;
   bool optimise = false;
+  bool progressive = false;
 };
 Bytes encode_libjpeg(int width, int height, const JpegStyle& style);
 

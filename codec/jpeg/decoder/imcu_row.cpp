@@ -2,6 +2,7 @@
 
 #include "codec/jpeg/decoder/idct.h"
 #include "codec/jpeg/decoder/mcu_decode.h"
+#include "codec/jpeg/decoder/progressive.h"
 #include "codec/jpeg/decoder/scan_setup.h"
 #include "platform/android_log.h"
 
@@ -111,6 +112,8 @@ int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo) {
     return decode_imcu_row<QuarterSize>(*jdInfo, PELOJ_DecodeMcu_4to1,
                                         "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_4to1 fail");
   }
-  return decode_imcu_row<EighthSize>(*jdInfo, PELOJ_DecodeMcu8to1,
+  // A progressive picture's first scan is all that an eighth of its size needs.
+  const bool progressive = jdInfo->marker->frameType == FrameType::kProgressive;
+  return decode_imcu_row<EighthSize>(*jdInfo, progressive ? PELOJ_ProgDecodeMcu : PELOJ_DecodeMcu8to1,
                                      "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu8to1 fail");
 }

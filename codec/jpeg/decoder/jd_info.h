@@ -88,6 +88,21 @@ struct Scale {
 };
 constexpr Scale kFull{1, 0}, kHalf{1, 1}, kThreeEighths{3, 3}, kQuarter{1, 2}, kEighth{1, 3};
 
+// A scan of a progressive picture between visits: its header, and where its decoding stands.
+constexpr size_t kMaxScans = 30;
+struct ScanRecord {
+  int componentCount;
+  std::array<Component*, kMaxComponents> components;
+  int lastComponent;
+  int ss, se, ah, al;
+  int restartInterval;
+  EntropyState entropy;
+  uint32_t sourcePosition;  // next unread byte
+  uint32_t eobRun;
+  uint8_t nextRestart;
+  uint8_t unreadMarker;
+};
+
 // The row of full-grid samples that the converters read.
 struct GridRow {
   const uint8_t* plane[kMaxComponents];
@@ -133,6 +148,12 @@ struct PELOJ_JDINFO {
   pelo::OsBuffer<int32_t> coefficients;                           // one MCU
   std::array<int32_t*, pelo::jpeg::kMaxMcuBlocks> blocks;
   int requantise;         // AC coefficients are brought to the reference steps while decoding
+
+  // Progressive pictures.
+  std::array<pelo::OsPtr<pelo::jpeg::ScanRecord>, pelo::jpeg::kMaxScans> scans;
+  size_t scanCount;
+  uint32_t eobRun;        // blocks that an end-of-band code still covers (T.81 G.1.2.2)
+  std::array<pelo::OsBuffer<int32_t>, pelo::jpeg::kMaxComponents> rowCoefficients;  // one iMCU row
 
   // Progress.
   int mcusPerRow;         // of the current scan

@@ -215,6 +215,8 @@ int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status) {
   *status = PELOJ_FAIL;
   uint8_t code = 0;
   while (next_marker(*jdInfo->source, code)) {
+    // Behind a scan, EOI ends the picture; what follows is another file's.
+    if (code == kEoi && jdInfo->marker->sawSos) return code;
     if (!read_segment(*jdInfo, code)) return code;
     if (code == kSos) {
       *status = PELOJ_OK;

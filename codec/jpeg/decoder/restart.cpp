@@ -42,6 +42,7 @@ int PELOJ_ProcessRestartMarker(PELOJ_JDINFO* jdInfo) {
   if (jdInfo->unreadMarker == 0xD0 + marker.nextRestart) jdInfo->unreadMarker = 0;
   marker.nextRestart = (marker.nextRestart + 1) & 7;
   entropy.lastDc = {};
+  jdInfo->eobRun = 0;
   entropy.restartsToGo = static_cast<uint32_t>(jdInfo->restartInterval);
   if (jdInfo->unreadMarker == 0) entropy.insufficient = 0;
   return 1;

@@ -1,6 +1,7 @@
 #include "codec/jpeg/decoder/row_process.h"
 
 #include "codec/jpeg/decoder/imcu_row.h"
+#include "codec/jpeg/decoder/progressive.h"
 #include "codec/jpeg/decoder/upsample.h"
 #include "codec/jpeg/header_scan.h"
 #include "platform/android_log.h"
@@ -61,5 +62,20 @@ int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWant
   return process(*jdInfo,
                  {PELOJ_DecodeSingleiMcu_resize, "PELOJ_ProcessData_resize : pJDInfo->CheckFn fail",
                   "PELOJ_ProcessData_resize : PELOJ_DecodeSingleiMcu_resize fail"},
+                 rowCounter, rowsWanted);
+}
+
+int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+  return process(*jdInfo,
+                 {PELOJ_ProgDecodeSingleiMcu, "PELOJ_ProgProcessData : pJDInfo->CheckFn fail",
+                  "PELOJ_ProgCompleteProcessData : PELOJ_ProgIDct fail"},
+                 rowCounter, rowsWanted);
+}
+
+int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+  return process(*jdInfo,
+                 {PELOJ_ProgDecodeSingleiMcu,
+                  "PELOJ_ProgCompleteProcessData_resize : pJDInfo->CheckFn fail",
+                  "PELOJ_ProgCompleteProcessData_resize : PELOJ_ProgIDct fail"},
                  rowCounter, rowsWanted);
 }

@@ -8,3 +8,7 @@
 // its data has ended quietly; another value: more to come.
 TAVIRPELO_API int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
 TAVIRPELO_API int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
+
+// The same for progressive pictures.
+TAVIRPELO_API int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
+TAVIRPELO_API int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);

@@ -23,9 +23,49 @@ bool add_blocks(PELOJ_JDINFO& jd, int scanIndex, const Component& component) {
   return true;
 }
 
+// Which classes of tables a scan decodes with: all of them in sequential scans, one in progressive ones,
+// none where single DC bits are refined.
+bool uses_dc(const PELOJ_JDINFO& jd) { return jd.ss == 0 && jd.ah == 0; }
+bool uses_ac(const PELOJ_JDINFO& jd) { return jd.se > 0; }
+
+// Derives a table number unless this scan has it already.
+bool derive(PELOJ_JDINFO& jd, bool isDc, uint8_t number) {
+  if (number > 3) return false;
+  const DerivedTable*& table = isDc ? jd.entropy->dc[number] : jd.entropy->ac[number];
+  return table != nullptr ||
+         PELOJ_PrepareDerivedTbl(&jd, isDc, number, &table, jd.entropy.get()) == PELOJ_OK;
+}
+
+bool derive_tables(PELOJ_JDINFO& jd) {
+  EntropyState& entropy = *jd.entropy;
+  for (int i = 0; i < jd.scanComponentCount; ++i) {
+    const Component& component = *jd.scan[static_cast<size_t>(i)];
+    if (uses_dc(jd) && !derive(jd, true, component.dcTable)) return false;
+    if (uses_ac(jd) && !derive(jd, false, component.acTable)) return false;
+  }
+  for (size_t b = 0; b < static_cast<size_t>(jd.mcuBlocks); ++b) {
+    const Component& component = *jd.scan[jd.blockComponent[b]];
+    if (uses_dc(jd)) entropy.blockDc[b] = entropy.dc[component.dcTable];
+    if (!uses_ac(jd)) continue;
+    entropy.blockAc[b] = entropy.ac[component.acTable];
+    entropy.blockSkip[b] = entropy.skip[component.acTable];
+  }
+  return true;
+}
+
+// Coefficients of the largest MCU.
+bool allocate_blocks(PELOJ_JDINFO& jd) {
+  if (jd.coefficients) return true;
+  if (!jd.coefficients.allocate(kMaxMcuBlocks * 64)) return false;
+  for (size_t b = 0; b < kMaxMcuBlocks; ++b) jd.blocks[b] = jd.coefficients.data() + 64 * b;
+  return true;
+}
+
+}  // namespace
+
 // A single component is not interleaved: its MCU is one block, and its rows of MCUs are block rows
 // (T.81 A.2).
-bool set_geometry(PELOJ_JDINFO& jd) {
+bool set_scan_geometry(PELOJ_JDINFO& jd) {
   jd.mcuBlocks = 0;
   const bool interleaved = jd.scanComponentCount > 1;
   jd.mcusPerRow = interleaved ? (jd.imageWidth + 8 * jd.hMax - 1) / (8 * jd.hMax) : jd.scan[0]->blocksWide;
@@ -42,41 +82,6 @@ bool set_geometry(PELOJ_JDINFO& jd) {
   return true;
 }
 
-// Derives each table number of the scan once; true when all are there.
-bool derive_tables(PELOJ_JDINFO& jd) {
-  EntropyState& entropy = *jd.entropy;
-  for (int i = 0; i < jd.scanComponentCount; ++i) {
-    const Component& component = *jd.scan[static_cast<size_t>(i)];
-    if (component.dcTable > 3 || component.acTable > 3) return false;
-    const DerivedTable*& dc = entropy.dc[component.dcTable];
-    const DerivedTable*& ac = entropy.ac[component.acTable];
-    if (dc == nullptr &&
-        PELOJ_PrepareDerivedTbl(&jd, 1, component.dcTable, &dc, &entropy) != PELOJ_OK) {
-      return false;
-    }
-    if (ac == nullptr &&
-        PELOJ_PrepareDerivedTbl(&jd, 0, component.acTable, &ac, &entropy) != PELOJ_OK) {
-      return false;
-    }
-  }
-  for (size_t b = 0; b < static_cast<size_t>(jd.mcuBlocks); ++b) {
-    const Component& component = *jd.scan[jd.blockComponent[b]];
-    entropy.blockDc[b] = entropy.dc[component.dcTable];
-    entropy.blockAc[b] = entropy.ac[component.acTable];
-    entropy.blockSkip[b] = entropy.skip[component.acTable];
-  }
-  return true;
-}
-
-// Coefficients of the largest MCU.
-bool allocate_blocks(PELOJ_JDINFO& jd) {
-  if (jd.coefficients) return true;
-  if (!jd.coefficients.allocate(kMaxMcuBlocks * 64)) return false;
-  for (size_t b = 0; b < kMaxMcuBlocks; ++b) jd.blocks[b] = jd.coefficients.data() + 64 * b;
-  return true;
-}
-
-}  // namespace
 }  // namespace pelo::jpeg
 
 using namespace pelo;
@@ -95,7 +100,7 @@ int PELOJ_SetupScan(PELOJ_JDINFO* jdInfo) {
     const Component& component = *jdInfo->scan[static_cast<size_t>(i)];
     if (component.quantTable > 3 || !jdInfo->quant[component.quantTable]) return PELOJ_FAIL;
   }
-  if (!set_geometry(*jdInfo)) return fail("PELOJ_SetupScan : invalid block info");
+  if (!set_scan_geometry(*jdInfo)) return fail("PELOJ_SetupScan : invalid block info");
   if (!derive_tables(*jdInfo)) return fail("PELOJ_SetupScan : PELOJ_PrepareDerivedTbl fail");
   jdInfo->entropy->restartsToGo = static_cast<uint32_t>(jdInfo->restartInterval);
   return PELOJ_OK;

@@ -130,6 +130,7 @@ int PELOJ_InitUpsampler(PELOJ_JDINFO* jdInfo) {
   for (int c = 0; c < jdInfo->componentCount; ++c) {
     Component& component = (*jdInfo->components)[static_cast<size_t>(c)];
     if (!choose_method(*jdInfo, component)) return fail("PELOJ_InitUpsampler : invalid sampling");
+    if (component.samples) continue;  // prepared for an earlier scan
     // Whole MCUs wide: blocks beyond the last column are written too.
     component.samples.reset(
         PELOJ_AllocSampleArry(mcus * component.h * blockSize, component.v * blockSize));
