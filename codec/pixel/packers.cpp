@@ -18,15 +18,22 @@ struct Dithered565 {
   }
 };
 
-// R, G and B at the given bytes; the fourth, when there is one, is opaque alpha.
-template <int Bytes, int R, int G, int B>
-struct Bytewise {
-  static constexpr ptrdiff_t kBytes = Bytes;
+struct Rgb888 {
+  static constexpr ptrdiff_t kBytes = 3;
   static void store(uint8_t* out, uint8_t r, uint8_t g, uint8_t b) {
-    out[R] = r;
-    out[G] = g;
-    out[B] = b;
-    if constexpr (Bytes == 4) out[6 - R - G - B] = 255;
+    out[0] = r;
+    out[1] = g;
+    out[2] = b;
+  }
+};
+
+// Four bytes: R, G, B at the given ones, opaque alpha in the remaining one.
+template <int R, int G, int B>
+struct Opaque8888 {
+  static constexpr ptrdiff_t kBytes = 4;
+  static void store(uint8_t* out, uint32_t r, uint32_t g, uint32_t b) {
+    constexpr int kAlpha = 6 - R - G - B;
+    store_le32(out, r << 8 * R | g << 8 * G | b << 8 * B | 255u << 8 * kAlpha);
   }
 };
 
@@ -46,10 +53,10 @@ void pack_row(const uint8_t* __restrict r, const uint8_t* __restrict g, const ui
 PackRow opaque_packer(int format) {
   switch (format) {
     case TAVIRPELO_RGB565: return pack_row<Rgb565>;
-    case TAVIRPELO_RGB888: return pack_row<Bytewise<3, 0, 1, 2>>;
-    case TAVIRPELO_ARGB8888: return pack_row<Bytewise<4, 1, 2, 3>>;
-    case TAVIRPELO_RGBA8888: return pack_row<Bytewise<4, 0, 1, 2>>;
-    case TAVIRPELO_BGRA8888: return pack_row<Bytewise<4, 2, 1, 0>>;
+    case TAVIRPELO_RGB888: return pack_row<Rgb888>;
+    case TAVIRPELO_ARGB8888: return pack_row<Opaque8888<1, 2, 3>>;
+    case TAVIRPELO_RGBA8888: return pack_row<Opaque8888<0, 1, 2>>;
+    case TAVIRPELO_BGRA8888: return pack_row<Opaque8888<2, 1, 0>>;
     default: return nullptr;
   }
 }

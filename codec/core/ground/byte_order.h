@@ -1,7 +1,9 @@
 // Integers on disk and on the wire, byte by byte: the same on every host, at any alignment.
 #pragma once
 
+#include <bit>
 #include <cstdint>
+#include <cstring>
 
 namespace pelo {
 
@@ -20,13 +22,24 @@ constexpr void store_be16(uint8_t* p, uint32_t v) {
   p[0] = static_cast<uint8_t>(v >> 8);
   p[1] = static_cast<uint8_t>(v);
 }
-constexpr void store_le16(uint8_t* p, uint32_t v) {
-  p[0] = static_cast<uint8_t>(v);
-  p[1] = static_cast<uint8_t>(v >> 8);
+
+// One store where the host's order allows it, so that pixel loops vectorise.
+inline void store_le16(uint8_t* p, uint32_t v) {
+  if constexpr (std::endian::native == std::endian::little) {
+    const auto word = static_cast<uint16_t>(v);
+    std::memcpy(p, &word, sizeof word);
+  } else {
+    p[0] = static_cast<uint8_t>(v);
+    p[1] = static_cast<uint8_t>(v >> 8);
+  }
 }
-constexpr void store_le32(uint8_t* p, uint32_t v) {
-  store_le16(p, v);
-  store_le16(p + 2, v >> 16);
+inline void store_le32(uint8_t* p, uint32_t v) {
+  if constexpr (std::endian::native == std::endian::little) {
+    std::memcpy(p, &v, sizeof v);
+  } else {
+    store_le16(p, v);
+    store_le16(p + 2, v >> 16);
+  }
 }
 
 }  // namespace pelo

@@ -9,6 +9,8 @@ namespace {
 
 // Eight lanes: the columns of pass 1, then the rows of pass 2.
 typedef int32_t Lanes __attribute__((vector_size(32)));
+typedef int16_t ShortLanes __attribute__((vector_size(16)));
+typedef uint8_t ByteLanes __attribute__((vector_size(8)));
 
 inline Lanes load_lanes(const int32_t* p) {
   Lanes lanes;
@@ -16,61 +18,85 @@ inline Lanes load_lanes(const int32_t* p) {
   return lanes;
 }
 
-inline void transpose(Lanes (&m)[8]) {
-  Lanes a[8], b[8];
-  for (int i = 0; i < 4; ++i) {
-    a[2 * i] = __builtin_shuffle(m[i], m[i + 4], Lanes{0, 8, 1, 9, 2, 10, 3, 11});
-    a[2 * i + 1] = __builtin_shuffle(m[i], m[i + 4], Lanes{4, 12, 5, 13, 6, 14, 7, 15});
-  }
-  for (int i = 0; i < 4; ++i) {
-    b[2 * i] = __builtin_shuffle(a[i], a[i + 4], Lanes{0, 8, 1, 9, 2, 10, 3, 11});
-    b[2 * i + 1] = __builtin_shuffle(a[i], a[i + 4], Lanes{4, 12, 5, 13, 6, 14, 7, 15});
-  }
-  for (int i = 0; i < 4; ++i) {
-    m[2 * i] = __builtin_shuffle(b[i], b[i + 4], Lanes{0, 8, 1, 9, 2, 10, 3, 11});
-    m[2 * i + 1] = __builtin_shuffle(b[i], b[i + 4], Lanes{4, 12, 5, 13, 6, 14, 7, 15});
+// Three rounds of interleaving row i with row i + 4 exchange rows and columns.
+template <class Vector>
+inline void transpose(Vector (&m)[8]) {
+  using Mask = decltype(m[0] < m[0]);
+  for (int round = 0; round < 3; ++round) {
+    Vector t[8];
+    for (int i = 0; i < 4; ++i) {
+      t[2 * i] = __builtin_shuffle(m[i], m[i + 4], Mask{0, 8, 1, 9, 2, 10, 3, 11});
+      t[2 * i + 1] = __builtin_shuffle(m[i], m[i + 4], Mask{4, 12, 5, 13, 6, 14, 7, 15});
+    }
+    for (int i = 0; i < 8; ++i) m[i] = t[i];
   }
 }
 
-// Dequantises eight rows in 32 bits. False when a product or a result leaves the range in which that is
-// exact; no real picture does. |coefficient| < 1024 times the largest multiplier (255 x 31521 >> 2) stays
-// below 2^31.
+inline int32_t any_bit(const Lanes& lanes) {
+  int32_t bits = 0;
+  for (int i = 0; i < 8; ++i) bits |= lanes[i];
+  return bits;
+}
+
+// Dequantises the first N rows and columns, the others are zero, in 32 bits. False when a product or a
+// result leaves the range in which that is exact; no real picture does. A |coefficient| below 1024 times
+// the largest multiplier (255 x 31521 >> 2) stays below 2^31.
+template <int N>
 inline bool dequantise_lanes(const int32_t* multiplier, const int32_t* block, Lanes (&x)[8]) {
-  Lanes coefficients{};
-  Lanes results{};
-  for (int r = 0; r < 8; ++r) {
-    const Lanes c = load_lanes(block + 8 * r);
-    coefficients |= c ^ (c >> 31);
-    x[r] = c;
+  constexpr Lanes kColumns{-1, -(N > 1), -(N > 2), -(N > 3), -(N > 4), -(N > 5), -(N > 6), -(N > 7)};
+  Lanes magnitude{};
+  for (int r = 0; r < N; ++r) {
+    x[r] = load_lanes(block + 8 * r) & kColumns;
+    magnitude |= x[r] ^ (x[r] >> 31);
   }
-  int32_t magnitude = 0;
-  for (int i = 0; i < 8; ++i) magnitude |= coefficients[i];
-  if (magnitude >= 1024) return false;
-  for (int r = 0; r < 8; ++r) {
+  if (any_bit(magnitude) >= 1024) return false;
+  magnitude = Lanes{};
+  for (int r = 0; r < N; ++r) {
     x[r] = x[r] * load_lanes(multiplier + 8 * r) >> 10;
-    results |= x[r] ^ (x[r] >> 31);
+    magnitude |= x[r] ^ (x[r] >> 31);
   }
-  magnitude = 0;
-  for (int i = 0; i < 8; ++i) magnitude |= results[i];
-  return magnitude < kDequantisedMax;
+  return any_bit(magnitude) < kDequantisedMax;
+}
+
+// The one-dimensional transform of N inputs; up to three take the folded form.
+template <int N>
+inline void transform_lanes(Lanes (&x)[8]) {
+  for (int i = N; i < 8; ++i) x[i] = Lanes{};
+  if constexpr (N > 3) {
+    butterfly8(x);
+  } else {
+    butterfly3(x);
+  }
 }
 
 inline void store_samples(const Lanes (&x)[8], uint8_t* const* rows, int column) {
+  ShortLanes samples[8];
+  for (int i = 0; i < 8; ++i) {
+    Lanes v = (x[i] >> 5) + 128;
+    v &= ~(v >> 31);                // below 0
+    v |= (Lanes{} + 255 - v) >> 31; // above 255: all bits of the byte
+    samples[i] = __builtin_convertvector(v & 255, ShortLanes);
+  }
+  transpose(samples);
   for (int r = 0; r < 8; ++r) {
-    uint8_t* out = rows[r] + column;
-    for (int i = 0; i < 8; ++i) out[i] = to_sample(x[r][i]);
+    const ByteLanes bytes = __builtin_convertvector(samples[r], ByteLanes);
+    std::memcpy(rows[r] + column, &bytes, sizeof bytes);
   }
 }
 
-void transform_8x8(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+// Reads the first N x N coefficients.
+template <int N>
+void transform_square(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
   Lanes x[8];
-  if (!dequantise_lanes(multiplier, block, x)) {
-    for (int i = 0; i < 64; ++i) x[i / 8][i % 8] = dequantise(block[i], multiplier[i]);
+  if (!dequantise_lanes<N>(multiplier, block, x)) {
+    for (int r = 0; r < N; ++r) {
+      x[r] = Lanes{};
+      for (int c = 0; c < N; ++c) x[r][c] = dequantise(block[8 * r + c], multiplier[8 * r + c]);
+    }
   }
-  butterfly8(x);
+  transform_lanes<N>(x);
   transpose(x);
-  butterfly8(x);
-  transpose(x);
+  transform_lanes<N>(x);
   store_samples(x, rows, column);
 }
 
@@ -78,36 +104,11 @@ inline void fill_rows(uint8_t sample, uint8_t* const* rows, int column) {
   for (int r = 0; r < 8; ++r) std::memset(rows[r] + column, sample, 8);
 }
 
-// Reads the first Rows x Columns coefficients. The 1-D transform of up to three inputs is the folded one.
-template <int Rows, int Columns>
-void transform_sparse(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
-  int32_t work[8][8];  // by column, then row
-  for (int c = 0; c < Columns; ++c) {
-    int32_t x[8] = {};
-    for (int r = 0; r < Rows; ++r) x[r] = dequantise(block[8 * r + c], multiplier[8 * r + c]);
-    if constexpr (Rows > 3) {
-      butterfly8(x);
-    } else if constexpr (Rows > 1) {
-      butterfly3(x);
-    } else {
-      for (int32_t& value : x) value = x[0];
-    }
-    for (int r = 0; r < 8; ++r) work[c][r] = x[r];
-  }
-  for (int r = 0; r < 8; ++r) {
-    if constexpr (Columns == 1) {
-      std::memset(rows[r] + column, to_sample(work[0][r]), 8);
-    } else {
-      int32_t x[8] = {};
-      for (int c = 0; c < Columns; ++c) x[c] = work[c][r];
-      if constexpr (Columns > 3) {
-        butterfly8(x);
-      } else {
-        butterfly3(x);
-      }
-      for (int i = 0; i < 8; ++i) rows[r][column + i] = to_sample(x[i]);
-    }
-  }
+// Rows that are flat each: there is no horizontal detail.
+void transform_column(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+  int32_t x[8] = {dequantise(block[0], multiplier[0]), dequantise(block[8], multiplier[8])};
+  butterfly3(x);
+  for (int r = 0; r < 8; ++r) std::memset(rows[r] + column, to_sample(x[r]), 8);
 }
 
 // One row of samples for every output row: there is no vertical detail.
@@ -138,27 +139,27 @@ using namespace pelo::jpeg;
 
 void PELOJ_DoIdct8By8(const uint8_t*, const int32_t* multiplier, const int32_t* block,
                       uint8_t* const* rows, int column) {
-  transform_8x8(multiplier, block, rows, column);
+  transform_square<8>(multiplier, block, rows, column);
 }
 void PELOJ_DoIdct(const uint8_t*, const int32_t* multiplier, const int32_t* block, uint8_t* const* rows,
                   int column) {
-  transform_8x8(multiplier, block, rows, column);
+  transform_square<8>(multiplier, block, rows, column);
 }
 void PELOJ_DoIdct4By4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
                       uint8_t* const* rows, int column) {
-  transform_sparse<4, 4>(multiplier, block, rows, column);
+  transform_square<4>(multiplier, block, rows, column);
 }
 void PELOJ_DoIdct3By3(const uint8_t*, const int32_t* multiplier, const int32_t* block,
                       uint8_t* const* rows, int column) {
-  transform_sparse<3, 3>(multiplier, block, rows, column);
+  transform_square<3>(multiplier, block, rows, column);
 }
 void PELOJ_DoIdct2By2All(const uint8_t*, const int32_t* multiplier, const int32_t* block,
                          uint8_t* const* rows, int column) {
-  transform_sparse<2, 2>(multiplier, block, rows, column);
+  transform_square<2>(multiplier, block, rows, column);
 }
 void PELOJ_DoIdct1By2(const uint8_t*, const int32_t* multiplier, const int32_t* block,
                       uint8_t* const* rows, int column) {
-  transform_sparse<2, 1>(multiplier, block, rows, column);
+  transform_column(multiplier, block, rows, column);
 }
 void PELOJ_DoIdct2By2(const uint8_t* range, const int32_t* multiplier, const int32_t* block,
                       uint8_t* const* rows, int column) {

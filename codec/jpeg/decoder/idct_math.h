@@ -63,16 +63,17 @@ inline void butterfly8(Vector (&x)[8]) {
 
 // The same with x[3..7] zero and the constant chains of x[1] folded: 217 = 473 - 256, 145 = 362 - 217.
 // (a x 362 >> 8) - a is a x 106 >> 8 exactly.
-inline void butterfly3(int32_t (&x)[8]) {
-  const int32_t t12 = scaled(x[2], 106);
-  const int32_t e0 = x[0] + x[2];
-  const int32_t e3 = x[0] - x[2];
-  const int32_t e1 = x[0] + t12;
-  const int32_t e2 = x[0] - t12;
-  const int32_t o7 = x[1];
-  const int32_t o6 = scaled(x[1], 217);
-  const int32_t o5 = scaled(x[1], 145);
-  const int32_t o4 = scaled(x[1], 277) - scaled(x[1], 473) + o5;
+template <class Vector>
+inline void butterfly3(Vector (&x)[8]) {
+  const Vector t12 = scaled(x[2], 106);
+  const Vector e0 = x[0] + x[2];
+  const Vector e3 = x[0] - x[2];
+  const Vector e1 = x[0] + t12;
+  const Vector e2 = x[0] - t12;
+  const Vector o7 = x[1];
+  const Vector o6 = scaled(x[1], 217);
+  const Vector o5 = scaled(x[1], 145);
+  const Vector o4 = scaled(x[1], 277) - scaled(x[1], 473) + o5;
 
   x[0] = e0 + o7;
   x[7] = e0 - o7;
