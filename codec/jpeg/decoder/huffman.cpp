@@ -55,14 +55,14 @@ void fill_coefficients(DerivedTable& table) {
   }
 }
 
-// The AC codes that complete within kLookBits bits, from the first on.
+// The AC codes that complete within kSkipBits bits, from the first on.
 uint32_t skip_entry(const DerivedTable& table, uint32_t v) {
   uint32_t used = 0;
   uint32_t advance = 0;
-  while (used < kLookBits && advance < 64) {
-    const uint32_t code = table.lookup[v << used & (kLookSize - 1)];
+  while (used < kSkipBits && advance < 64) {
+    const uint32_t code = table.lookup[(v << used & (kSkipSize - 1)) >> (kSkipBits - kLookBits)];
     const uint32_t length = code >> 8;
-    if (length == 0 || used + length > kLookBits) break;
+    if (length == 0 || used + length > kSkipBits) break;
     const uint32_t size = code & 15;
     const uint32_t run = code >> 4 & 15;
     used += length;
@@ -77,7 +77,7 @@ bool build_skip_table(PELOJ_JDINFO& jd, size_t number, const DerivedTable& table
   if (jd.skipTables[number]) return true;
   jd.skipTables[number] = os_new<SkipTable>();
   if (!jd.skipTables[number]) return false;
-  for (uint32_t v = 0; v < kLookSize; ++v) (*jd.skipTables[number])[v] = skip_entry(table, v);
+  for (uint32_t v = 0; v < kSkipSize; ++v) (*jd.skipTables[number])[v] = skip_entry(table, v);
   return true;
 }
 

@@ -29,12 +29,15 @@ struct DerivedTable {
   std::array<int32_t, kLookSize> coefficient;
 };
 
-// By the next kLookBits bits: how far the complete AC codes in them move the position.
-//   bits 0-15   bits used, with the extra bits of the last code (may exceed kLookBits)
+// By the next kSkipBits bits: how far the complete AC codes in them move the position. Wider than a look
+// at single codes: the wait for one entry passes several of them.
+//   bits 0-15   bits used, with the extra bits of the last code (may exceed kSkipBits)
 //   bits 16-22  coefficient positions passed
 //   bit 23      an end-of-block code was reached
 // 0: not even the first code fits.
-using SkipTable = std::array<uint32_t, kLookSize>;
+constexpr int kSkipBits = 12;
+constexpr uint32_t kSkipSize = 1u << kSkipBits;
+using SkipTable = std::array<uint32_t, kSkipSize>;
 constexpr uint32_t kSkipEndOfBlock = 1u << 23;
 constexpr uint32_t skip_used(uint32_t entry) { return entry & 0xFFFF; }
 constexpr int skip_advance(uint32_t entry) { return static_cast<int>(entry >> 16 & 0x7F); }

@@ -84,11 +84,13 @@ inline void skip_rest(BitReader& reader, const BlockContext& context, int positi
   while (position < 63) {
     reader.fill();
     if (context.skip != nullptr) {
-      const uint32_t entry = (*context.skip)[reader.peek(kLookBits)];
+      const uint32_t entry = (*context.skip)[reader.peek(kSkipBits)];
       const int next = position + skip_advance(entry);
       const int used = static_cast<int>(skip_used(entry));
       const bool ends = (entry & kSkipEndOfBlock) != 0;
-      if (used != 0 && used <= reader.state.left && next <= (ends ? 62 : 63)) [[likely]] {
+      // Extra bits beyond a narrow buffer's content: one code at a time.
+      const bool held = kFilledBits >= kSkipBits + 15 || used <= reader.state.left;
+      if (used != 0 && held && next <= (ends ? 62 : 63)) [[likely]] {
         reader.drop(used);
         if (ends) return;
         position = next;
