@@ -1,0 +1,34 @@
+// The records of a container file: what each field is and where it stands (docs/container.md).
+#pragma once
+
+#include <cstdint>
+
+#include "slideshow/SlideShow.h"
+#include "slideshow/container_session.h"
+
+namespace pelo::slideshow {
+
+constexpr int kHeaderSize = 628;         // bytes; at offset musicSize
+constexpr int kSubfileHeaderSize = 540;  // bytes in front of each picture's JPEG data
+constexpr int kEndMarkSize = 12;         // bytes; the last ones of the file
+constexpr int32_t kVersion = 10000;
+
+struct EndMark {
+  bool magic;  // the four bytes "vssf" are there
+  int version;
+  int musicSize;  // bytes: the header's offset
+};
+
+// Each transfers one record at the session's position, field by field in file order; 32-bit numbers are
+// little-endian, text fields are terminated when read. Whether it worked is the session's good(); values
+// are as found and still to be checked.
+void write_header(ContainerSession& session, const SlideShow& show);
+void read_header(ContainerSession& session, SlideShow& show);
+
+void write_subfile_header(ContainerSession& session, const subfileInfo& entry);
+void read_subfile_header(ContainerSession& session, subfileInfo& entry);
+
+void write_end_mark(ContainerSession& session, int musicSize);
+EndMark read_end_mark(ContainerSession& session);
+
+}  // namespace pelo::slideshow

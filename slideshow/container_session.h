@@ -1,0 +1,47 @@
+// One open container: opened by the show's path into the show's `file`, closed and cleared on every way
+// out.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "slideshow/SlideShow.h"
+
+namespace pelo::slideshow {
+
+// After a step that does not complete the session does nothing more and close() answers false, so that a
+// caller may write its steps in a row and ask once.
+class ContainerSession {
+ public:
+  // Not good() unless the show is in file mode, no other operation holds its stream, and the file opens.
+  ContainerSession(SlideShow& show, const char* openMode);
+  ~ContainerSession();
+  ContainerSession(const ContainerSession&) = delete;
+  ContainerSession& operator=(const ContainerSession&) = delete;
+
+  bool good() const { return good_; }
+  void fail() { good_ = false; }
+
+  // Each answers good().
+  bool seek(int64_t position);  // from the start
+  bool skip(int64_t bytes);     // from the current position
+  bool read(void* destination, int64_t bytes);
+  bool write(const void* source, int64_t bytes);
+  bool flush();
+
+  // Seeks to the end; the file's length in bytes, -1 when it cannot be told or exceeds 31 bits.
+  int64_t seek_end();
+
+  // True when every step completed and the file's last bytes are written. The stream is closed in any
+  // case; the destructor closes what is left open.
+  [[nodiscard]] bool close();
+
+ private:
+  bool move(int64_t distance, int whence);
+
+  SlideShow& show_;
+  bool open_;
+  bool good_;
+};
+
+}  // namespace pelo::slideshow
