@@ -140,6 +140,16 @@ std::vector<Plane> read_coefficients(const Bytes& jpeg) {
 }
 #endif
 
+Bytes sample_jpeg(int width, int height, bool grey) {
+#ifdef TAVIR_HAVE_LIBJPEG
+  JpegStyle style;
+  style.components = grey ? 1 : 3;
+  return encode_libjpeg(width, height, style);
+#else
+  return encode_own(width, height, 90, grey);
+#endif
+}
+
 double psnr(const Bytes& a, const Bytes& b) {
   double sum = 0;
   for (size_t i = 0; i < a.size(); ++i) sum += (a[i] - b[i]) * (a[i] - b[i]);

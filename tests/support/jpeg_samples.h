@@ -15,6 +15,9 @@ Bytes sample_pixels(int width, int height);
 // The same picture from the library's encoder: 4:2:0 or grey.
 Bytes encode_own(int width, int height, int quality, bool grey = false);
 
+// The same picture from whichever encoder the build has.
+Bytes sample_jpeg(int width, int height, bool grey = false);
+
 #ifdef TAVIR_HAVE_LIBJPEG
 struct JpegStyle {
   int quality = 90;

@@ -1,0 +1,205 @@
+"""vss from the outside: what it prints and writes, what it refuses, and its exit codes."""
+import json
+import os
+import pathlib
+import resource
+import shutil
+import struct
+import subprocess
+import sys
+import tempfile
+import unittest
+
+sys.path.insert(0, str(pathlib.Path(__file__).parents[1] / "support"))
+import pictures  # noqa: E402
+
+DONE, USAGE, CANNOT_OPEN, REFUSED, WRITE_FAILURE = 0, 2, 3, 4, 5
+HEADER, RECORD, MARK = 628, 540, 12  # bytes of a container's parts
+
+
+class VssTest(unittest.TestCase):
+    def setUp(self):
+        self.folder = pathlib.Path(tempfile.mkdtemp())
+        self.addCleanup(shutil.rmtree, self.folder)
+        self.show = self.folder / "show.vss"
+        self.wide = self.picture("wide", 960, 480, (200, 30, 30))
+        self.tall = self.picture("tall", 300, 600, (30, 30, 200))
+        self.small = self.picture("small", 64, 48)
+
+    def picture(self, name, *style):
+        path = self.folder / f"{name}.jpg"
+        pictures.write_jpeg(path, *style)
+        return path
+
+    def vss(self, *arguments, expect=DONE, **options):
+        command = [os.environ["VSS"], *map(str, arguments)]
+        done = subprocess.run(command, stdout=options.pop("stdout", subprocess.PIPE),
+                              stderr=subprocess.PIPE, **options)
+        self.assertEqual(done.returncode, expect, f"{arguments}\n{done.stderr.decode()}")
+        # A message exactly when something is wrong.
+        self.assertEqual(bool(done.stderr), expect != DONE, done.stderr.decode())
+        return done.stdout
+
+    def listed(self, show=None):
+        return json.loads(self.vss("list", "--json", show or self.show))["pictures"]
+
+    def names(self, show=None):
+        return [entry["name"] for entry in self.listed(show)]
+
+    def create(self, *added):
+        self.vss("create", self.show)
+        if added:
+            self.vss("add", self.show, *added)
+
+    def test_pictures_go_in_and_come_back(self):
+        self.create(self.wide, self.tall)
+        self.vss("insert", self.show, 1, self.small, "--name", "between")
+        entries = self.listed()
+        self.assertEqual([(e["index"], e["name"], e["width"], e["height"]) for e in entries],
+                         [(0, "wide", 480, 240), (1, "between", 64, 48), (2, "tall", 240, 480)])
+        self.assertEqual([e["source"] for e in entries], [str(p) for p in (self.wide, self.small, self.tall)])
+        for entry, colour in ((entries[0], (200, 30, 30)), (entries[2], (30, 30, 200))):
+            jpeg = self.vss("get", self.show, entry["index"], "-")
+            self.assertEqual(len(jpeg), entry["bytes"])
+            seen = pictures.Picture(jpeg)
+            self.assertEqual((seen.width, seen.height), (entry["width"], entry["height"]))
+            self.assertTrue(all(abs(a - b) < 6 for a, b in zip(seen.pixel(100, 100), colour)))
+
+    def test_the_file_is_laid_out_as_documented(self):
+        self.create(self.wide, self.small)
+        data = self.show.read_bytes()
+        words = struct.unpack_from("<9i20i", data, 512)
+        self.assertEqual(words[:9], (1, 0, 0, 0, 0, 480, 480, 0, 2))
+        sizes = [RECORD + entry["bytes"] for entry in self.listed()]
+        self.assertEqual(words[9:], (HEADER, HEADER + sizes[0]) + (0,) * 18)
+        self.assertEqual(len(data), HEADER + sum(sizes) + MARK)
+        self.assertEqual(data[-MARK:], b"vssf" + struct.pack("<2i", 10000, 0))
+        self.assertEqual(data[:256].rstrip(b"\0"), str(self.show).encode())
+
+    def test_an_empty_show_opens(self):
+        self.create()
+        self.assertEqual(self.show.stat().st_size, HEADER + MARK)
+        self.assertEqual(self.listed(), [])
+        self.vss("sheet", self.show, self.folder / "sheet.jpg", expect=REFUSED)
+
+    def test_create_replaces_a_file_only_when_told(self):
+        self.create(self.small)
+        before = self.show.read_bytes()
+        self.vss("create", self.show, expect=REFUSED)
+        self.assertEqual(self.show.read_bytes(), before)
+        self.vss("create", "--force", "--size", "320x200", self.show)
+        self.assertEqual(self.listed(), [])
+        self.vss("create", "--force", self.folder, expect=REFUSED)
+        self.vss("create", self.folder / "missing" / "show.vss", expect=WRITE_FAILURE)
+
+    def test_a_moved_show_is_the_one_that_is_named(self):
+        self.create(self.small)
+        moved = self.folder / "moved.vss"
+        shutil.copy(self.show, moved)
+        original = self.show.read_bytes()
+        # Reading a copy works without its original and writes nothing.
+        self.show.unlink()
+        self.assertEqual(self.names(moved), ["small"])
+        self.assertEqual(pictures.Picture(self.vss("get", moved, 0, "-")).width, 64)
+        self.assertEqual(moved.read_bytes(), original)
+        # Editing a copy leaves the original alone.
+        self.show.write_bytes(original)
+        self.vss("add", moved, self.wide)
+        self.assertEqual(self.names(moved), ["small", "wide"])
+        self.assertEqual(self.show.read_bytes(), original)
+
+    def test_names(self):
+        odd = 'say "hi" \\ \u00e9\n'
+        self.create()
+        self.vss("add", self.show, self.small, self.wide, "--name", odd)
+        self.vss("add", self.show, self.small, "--name", b"\xff\xc3".decode("utf-8", "surrogateescape"))
+        self.assertEqual(self.names(), [odd, "wide", "\ufffd\ufffd"])
+        self.assertEqual(len(self.vss("list", self.show).splitlines()), 4)
+        self.vss("add", self.show, self.small, "--name", "a", "--name", "b", expect=USAGE)
+
+    def test_thumb_and_sheet(self):
+        self.create(self.wide, self.tall, self.small)
+        thumb = pictures.Picture(self.vss("thumb", self.show, 0, "100x100", "-", "--quality", 95))
+        self.assertEqual((thumb.width, thumb.height), (100, 100))
+        self.assertLess(max(thumb.pixel(50, 5)), 10)
+        self.assertGreater(thumb.pixel(50, 50)[0], 180)
+        sheet_file = self.folder / "sheet.jpg"
+        self.vss("sheet", self.show, sheet_file, "--cell", "80x60", "--columns", 2)
+        sheet = pictures.Picture(sheet_file.read_bytes())
+        self.assertEqual((sheet.width, sheet.height), (2 * 88 + 8, 2 * 68 + 8))
+        self.assertGreater(sheet.pixel(48, 38)[0], 180)
+        self.assertGreater(sheet.pixel(136, 38)[2], 180)
+        self.vss("sheet", self.show, sheet_file, "--cell", "4000x10", expect=REFUSED)
+
+    def test_settings_stay(self):
+        self.create(self.small)
+        before = self.show.read_bytes()
+        self.assertEqual(self.vss("settings", self.show).decode().split(),
+                         "interval 1 effect 0 shuffle 0 loop 0 direction 0".split())
+        self.assertEqual(self.show.read_bytes(), before)
+        changed = "interval 7 effect -3 shuffle 1 loop 1 direction 0".split()
+        self.assertEqual(self.vss("settings", self.show, "--interval", 7, "--effect", -3, "--shuffle", 1,
+                                  "--loop", 1).decode().split(), changed)
+        self.assertEqual(self.vss("settings", self.show).decode().split(), changed)
+        self.assertEqual(self.names(), ["small"])
+
+    def test_refusals_leave_the_show_as_it_was(self):
+        self.create(self.small)
+        before = self.show.read_bytes()
+        text = self.folder / "text.jpg"
+        text.write_text("not a picture")
+        thin = self.picture("thin", 1000, 2)
+        self.vss("add", self.show, text, expect=REFUSED)
+        self.vss("add", self.show, thin, expect=REFUSED)
+        self.vss("add", self.show, self.folder / "absent.jpg", expect=CANNOT_OPEN)
+        self.vss("insert", self.show, 2, self.small, expect=REFUSED)
+        self.vss("insert", self.show, -1, self.small, expect=REFUSED)
+        self.vss("get", self.show, 1, self.folder / "out.jpg", expect=REFUSED)
+        self.vss("thumb", self.show, -1, "10x10", self.folder / "out.jpg", expect=REFUSED)
+        self.vss("get", self.show, 0, self.show, expect=REFUSED)
+        self.assertEqual(self.show.read_bytes(), before)
+
+    def test_the_twenty_first_picture_is_refused(self):
+        self.create(*[self.small] * 19)
+        self.vss("add", self.show, self.wide, self.tall, expect=REFUSED)
+        self.assertEqual(self.names(), ["small"] * 19 + ["wide"])
+        self.vss("insert", self.show, 0, self.tall, expect=REFUSED)
+
+    def test_files_that_are_no_shows(self):
+        self.create(self.small)
+        data = bytearray(self.show.read_bytes())
+        wrong_version = self.folder / "version.vss"
+        data[-8] ^= 1
+        wrong_version.write_bytes(data)
+        for path in (wrong_version, self.small, self.folder, self.folder / "absent.vss"):
+            for command in (("list", path), ("add", path, self.small), ("settings", path, "--loop", "1")):
+                self.vss(*command, expect=CANNOT_OPEN)
+        self.assertFalse((self.folder / "absent.vss").exists())
+
+    def test_full_disks(self):
+        self.create(self.small)
+        before = self.show.read_bytes()
+        self.vss("get", self.show, 0, "/dev/full", expect=WRITE_FAILURE)
+        self.vss("get", self.show, 0, self.folder / "missing" / "out.jpg", expect=WRITE_FAILURE)
+        with open("/dev/full", "wb") as full:
+            self.vss("list", self.show, expect=WRITE_FAILURE, stdout=full)
+            self.vss("get", self.show, 0, "-", expect=WRITE_FAILURE, stdout=full)
+        limit = len(before) + 1000
+        self.vss("add", self.show, self.wide, expect=WRITE_FAILURE, restore_signals=False,
+                 preexec_fn=lambda: resource.setrlimit(resource.RLIMIT_FSIZE, (limit, limit)))
+        self.assertEqual(self.show.read_bytes(), before)
+
+    def test_help_version_and_usage(self):
+        self.assertIn(b"Exit codes", self.vss("--help"))
+        self.assertRegex(self.vss("--version"), rb"^vss \d+\.\d+\.\d+\n$")
+        for command in ("create", "add", "insert", "list", "get", "thumb", "sheet", "settings"):
+            self.assertIn(b"show", self.vss(command, "--help"))
+        for wrong in ((), ("paint",), ("add", self.show), ("create", self.show, "--size", "480"),
+                      ("create", self.show, "--size", "0x480"), ("create", "x" * 256),
+                      ("get", self.show, "one", "-"), ("settings", self.show, "--loop", "2")):
+            self.vss(*wrong, expect=USAGE)
+        self.assertFalse(self.show.exists())
+
+
+if __name__ == "__main__":
+    unittest.main()

@@ -1,0 +1,12 @@
+// Text as a JSON string.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace vss {
+
+// Quoted and escaped. Bytes that are not UTF-8 become U+FFFD, so that the output always parses.
+std::string json_text(std::string_view text);
+
+}  // namespace vss
