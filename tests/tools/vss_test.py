@@ -149,8 +149,8 @@ class VssTest(unittest.TestCase):
         text = self.folder / "text.jpg"
         text.write_text("not a picture")
         thin = self.picture("thin", 1000, 2)
-        self.vss("add", self.show, text, expect=REFUSED)
-        self.vss("add", self.show, thin, expect=REFUSED)
+        large = self.picture("large", 5008, 16)
+        self.vss("add", self.show, text, thin, large, expect=REFUSED)
         self.vss("add", self.show, self.folder / "absent.jpg", expect=CANNOT_OPEN)
         self.vss("insert", self.show, 2, self.small, expect=REFUSED)
         self.vss("insert", self.show, -1, self.small, expect=REFUSED)
@@ -158,6 +158,11 @@ class VssTest(unittest.TestCase):
         self.vss("thumb", self.show, -1, "10x10", self.folder / "out.jpg", expect=REFUSED)
         self.vss("get", self.show, 0, self.show, expect=REFUSED)
         self.assertEqual(self.show.read_bytes(), before)
+
+    def test_a_refused_picture_does_not_keep_out_the_next(self):
+        self.create()
+        self.vss("add", self.show, self.folder / "absent.jpg", self.small, expect=CANNOT_OPEN)
+        self.assertEqual(self.names(), ["small"])
 
     def test_the_twenty_first_picture_is_refused(self):
         self.create(*[self.small] * 19)

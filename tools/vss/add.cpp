@@ -22,7 +22,8 @@ Exit add_one(SlideShow& show, const Options& options, size_t i) {
                      [&] { return show.AddImageToFile(path.c_str(), name.c_str()); });
 }
 
-// Stops at the first picture that fails; those before it stay.
+// A picture that is refused does not keep out those behind it; a file that cannot be written does. The
+// first failure is the result.
 Exit run(const Options& options) {
   if (options.names.size() > options.pictures.size()) {
     return fail(Exit::kUsage, "more names than pictures");
@@ -31,8 +32,10 @@ Exit run(const Options& options) {
   Exit result = open_show(show, options.show, Access::kEdit);
   if (result != Exit::kDone) return result;
   print_added_heading();
-  for (size_t i = 0; i < options.pictures.size() && result == Exit::kDone; ++i) {
-    result = add_one(show, options, i);
+  for (size_t i = 0; i < options.pictures.size(); ++i) {
+    Exit added = add_one(show, options, i);
+    if (result == Exit::kDone) result = added;
+    if (added == Exit::kWriteFailure) break;
   }
   return result;
 }

@@ -15,6 +15,7 @@ namespace vss {
 namespace {
 
 constexpr size_t kMaxPathBytes = 255;  // what a picture's record holds
+constexpr int kMaxSourceSide = 5000;   // what the decoders take
 
 // The part of an addition that depends on the picture alone; true when it works.
 bool decodes(const SlideShow& show, const std::string& path, const TAVIRPELO_HINFO& header) {
@@ -39,7 +40,8 @@ Exit check_source(const SlideShow& show, const std::string& path, TAVIRPELO_HINF
     return fail(Exit::kRefused, "{}: longer than {} bytes", path, kMaxPathBytes);
   }
   if (TAVIRPELO_ParseFromFile(path.c_str(), &header) == TAVIRPELO_FORMAT_UNKNOWN) {
-    return fail(Exit::kRefused, "{}: not a picture that can be read", path);
+    return fail(Exit::kRefused, "{}: not a picture that can be read, or above {} pixels", path,
+                kMaxSourceSide);
   }
   return Exit::kDone;
 }
