@@ -58,7 +58,8 @@ class Show : public testing::Test {
     Bytes jpeg = encode_own(width, height, 80);
     return show.AddImageToBuffer(jpeg.data(), static_cast<int>(jpeg.size()), name);
   }
-  std::string path = temp("container");
+  // Tests run side by side: each has a file of its own.
+  std::string path = temp(testing::UnitTest::GetInstance()->current_test_info()->name());
 };
 
 TEST_F(Show, BytesOfACreatedContainer) {
