@@ -26,8 +26,10 @@ class DataShift {
   DataShift(SlideShow& show, int position, int distance)
       : show_(show), position_(position), distance_(distance), firstMoved_(show.subfileCount) {}
 
+  // False when a step fails; back_down() then undoes what was done.
   bool up() {
     ContainerSession session(show_, "r+b");
+    if (!keep_headers(session)) return false;
     for (int i = show_.subfileCount - 1; session.good() && i >= position_; --i) {
       pending_ = load(session, i, 0);
       if (!pending_) return false;
@@ -50,10 +52,28 @@ class DataShift {
       if (!data) return;
       store(session, i, 0, data.get());
     }
-    if (session.close()) (void)show_.writeSubfileHeader();
+    for (int i = position_; headers_ && i < show_.subfileCount; ++i) {
+      session.seek(show_.subfiles[i].offset);
+      session.write(header(i), kSubfileHeaderSize);
+    }
+    (void)session.close();
   }
 
  private:
+  // The headers as they stand in the file: new ones will overwrite them.
+  bool keep_headers(ContainerSession& session) {
+    const int count = show_.subfileCount - position_;
+    if (count == 0) return session.good();
+    headers_ = vss_bytes(int64_t{count} * kSubfileHeaderSize);
+    for (int i = position_; headers_ && i < show_.subfileCount; ++i) {
+      session.seek(show_.subfiles[i].offset);
+      session.read(header(i), kSubfileHeaderSize);
+    }
+    if (!session.good()) headers_.reset();  // half read, and nothing to undo yet
+    return headers_ != nullptr;
+  }
+  uint8_t* header(int index) { return headers_.get() + (index - position_) * kSubfileHeaderSize; }
+
   int64_t data_offset(int index, int distance) const {
     return int64_t{show_.subfiles[index].offset} + distance + kSubfileHeaderSize;
   }
@@ -73,6 +93,7 @@ class DataShift {
   SlideShow& show_;
   int position_;
   int distance_;
+  VssBytes headers_;
   int firstMoved_;    // this picture and the later ones have been moved
   VssBytes pending_;  // the one before, while it is written
   bool dirty_ = false;
