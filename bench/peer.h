@@ -1,0 +1,32 @@
+// The peer: libjpeg-turbo through its TurboJPEG interface.
+#pragma once
+
+#include <turbojpeg.h>
+
+#include <memory>
+
+#include "bench/job.h"
+
+namespace bench::peer {
+
+struct Size {
+  int width = 0;  // pixels
+  int height = 0;
+};
+
+// Pixel size of a JPEG; zero when its header cannot be read.
+Size size_of(const Bytes& jpeg);
+
+// Decodes at one of the peer's scales into packed pixels of `format`; `pixels` must hold them.
+bool decode(const Bytes& jpeg, Size scaled, TJPF format, int flags, uint8_t* pixels);
+
+// Encodes R G B pixels, 4:2:0, with the fixed Huffman tables; returns the size, 0 on failure.
+unsigned long encode(const uint8_t* rgb, Size size, int quality, int flags);
+
+// The smallest of the peer's scales, all eighths, at which the picture is at least `width` wide.
+Size scale_at_least(Size size, int width);
+
+// Bilinear reduction of R G B pixels, as callers of the peer have to bring along themselves.
+void reduce(const uint8_t* from, Size fromSize, uint8_t* to, Size toSize);
+
+}  // namespace bench::peer
