@@ -1,3 +1,4 @@
+// Detection by the first bytes, and what the parser learns from each format's header.
 #include "codec/core/format_detect.h"
 
 #include <cstring>
@@ -139,7 +140,7 @@ int PELO_Parse(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, TAVIRPELO_HINFO
   // Shorter sources reach their format's own checks; the buffer is zero behind them.
   if (PELOJ_CheckBuffer(source, 8) == 0) return unreadable();
   constexpr uint8_t kPngTail[7] = {'P', 'N', 'G', 0x0D, 0x0A, 0x1A, 0x0A};
-  const uint8_t* b = source->buffer;
+  const uint8_t* b = source->buffer + source->pos;
   if (b[0] == 'G' && b[1] == 'I' && b[2] == 'F') return __PELO_ParserGIF(decInfo, source, hinfo);
   if (b[0] == 0x89 && std::memcmp(b + 1, kPngTail, 7) == 0) return parse_png(*decInfo, *source, hinfo);
   if (b[0] == 0xFF && b[1] == 0xD8) return parse_jpeg(*decInfo, *source, hinfo);

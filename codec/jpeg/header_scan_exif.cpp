@@ -29,7 +29,8 @@ struct Exif {
   int64_t base;
   tiff::Header header;
 
-  bool inside(uint32_t offset) const { return base + offset <= segment.end; }
+  // True when a directory, which begins with a 16-bit count, can start there.
+  bool inside(uint32_t offset) const { return base + offset + 2 <= segment.end; }
 };
 
 // Takes over one entry; false for an offset that no source can have.

@@ -1,0 +1,171 @@
+// Callback streams as sources, and short memory in every step of opening and parsing one.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <climits>
+#include <cstring>
+
+#include "codec/core/ground/buffered_source.h"
+#include "platform/fault_injection.h"
+#include "tavirpelo/tavirpelo.h"
+#include "tests/support/jpeg_samples.h"
+
+namespace tests {
+namespace {
+
+// A stream over bytes that counts its calls and can misbehave.
+struct Stream {
+  Bytes bytes;
+  size_t at = 0;
+  int limit = INT_MAX;  // most bytes a read delivers
+  int lie = 0;          // added to what a read reports
+  int resets = 0, skips = 0;
+};
+
+int read(void* context, void* destination, int length) {
+  auto& s = *static_cast<Stream*>(context);
+  const size_t count = std::min({static_cast<size_t>(std::min(length, s.limit)), s.bytes.size() - s.at});
+  std::memcpy(destination, s.bytes.data() + s.at, count);
+  s.at += count;
+  return static_cast<int>(count) + s.lie;
+}
+
+int skip(void* context, int, int count) {
+  auto& s = *static_cast<Stream*>(context);
+  ++s.skips;
+  s.at = std::min(s.bytes.size(), s.at + static_cast<size_t>(count));
+  return static_cast<int>(s.at);
+}
+
+int reset(void* context, int, int) {
+  auto& s = *static_cast<Stream*>(context);
+  ++s.resets;
+  s.at = 0;
+  return -1;
+}
+
+TAVIRPELO_IO* open(Stream& s) {
+  return TAVIRPELO_Open_Stream(&s, read, skip, reset, static_cast<int>(s.bytes.size()));
+}
+
+TEST(Streams, SeekByResettingAndSkipping) {
+  Stream s{Bytes(100)};
+  for (size_t i = 0; i < 100; ++i) s.bytes[i] = static_cast<uint8_t>(i);
+  TAVIRPELO_IO* io = open(s);
+  uint8_t out[8];
+  EXPECT_EQ(8, TAVIRPELO_Read_IO(io, out, 8));
+  EXPECT_EQ(0, TAVIRPELO_Seek_IO(io, 0, SEEK_SET));
+  EXPECT_EQ(1, s.resets);
+  EXPECT_EQ(0, s.skips);
+  EXPECT_EQ(30, TAVIRPELO_Seek_IO(io, 30, SEEK_SET));
+  EXPECT_EQ(40, TAVIRPELO_Seek_IO(io, 10, SEEK_CUR));
+  EXPECT_EQ(95, TAVIRPELO_Seek_IO(io, -5, SEEK_END));
+  EXPECT_EQ(5, TAVIRPELO_Read_IO(io, out, 8));
+  EXPECT_EQ(95, out[0]);
+  EXPECT_EQ(100, TAVIRPELO_Tell_IO(io));
+  EXPECT_EQ(-1, TAVIRPELO_Seek_IO(io, -1, SEEK_SET));
+  EXPECT_EQ(-1, TAVIRPELO_Seek_IO(io, 1, SEEK_END));
+  EXPECT_EQ(-1, TAVIRPELO_Seek_IO(io, INT_MAX, SEEK_CUR));
+  EXPECT_EQ(100, TAVIRPELO_Tell_IO(io));
+  const int resets = s.resets;
+  EXPECT_EQ(1, TAVIRPELO_Close_IO(io));
+  EXPECT_EQ(resets + 1, s.resets);
+}
+
+// What callbacks report is not believed beyond what was asked for.
+TEST(Streams, LiesAndMissingCallbacks) {
+  Stream s{Bytes(100, 9)};
+  TAVIRPELO_IO* io = open(s);
+  uint8_t out[8];
+  s.lie = 50;
+  EXPECT_EQ(8, TAVIRPELO_Read_IO(io, out, 8));
+  EXPECT_EQ(8, TAVIRPELO_Tell_IO(io));
+  pelo::BufferedSource source;
+  ASSERT_TRUE(source.open(io));
+  EXPECT_EQ(1, PELOJ_CheckBuffer(source.get(), 1));
+  EXPECT_LE(source->avail, 4096u);
+  s.lie = -1000;
+  const int before = TAVIRPELO_Tell_IO(io);
+  EXPECT_GT(0, TAVIRPELO_Read_IO(io, out, 8));
+  EXPECT_EQ(before, TAVIRPELO_Tell_IO(io));
+  TAVIRPELO_Close_IO(io);
+
+  io = TAVIRPELO_Open_Stream(nullptr, nullptr, nullptr, nullptr, 10);
+  EXPECT_EQ(0, TAVIRPELO_Read_IO(io, out, 8));
+  EXPECT_EQ(-1, TAVIRPELO_Seek_IO(io, 0, SEEK_SET));
+  EXPECT_EQ(-1, TAVIRPELO_Seek_IO(io, 1, SEEK_CUR));
+  TAVIRPELO_Close_IO(io);
+  EXPECT_EQ(-1, TAVIRPELO_Read_IO(nullptr, out, 1));
+  EXPECT_EQ(0, TAVIRPELO_Close_IO(nullptr));
+}
+
+// A refill succeeds with fewer bytes than wanted; nobody may then consume more than there are, and bytes
+// that moved inside the window stay readable when the next read gives nothing.
+TEST(Streams, ShortReadsNeverInventBytes) {
+  Stream s{Bytes(6000)};
+  for (size_t i = 0; i < s.bytes.size(); ++i) s.bytes[i] = static_cast<uint8_t>(i % 251);
+  s.limit = 100;
+  TAVIRPELO_IO* io = open(s);
+  pelo::BufferedSource source;
+  ASSERT_TRUE(source.open(io));
+  EXPECT_EQ(1, PELOJ_CheckBuffer(source.get(), 300));
+  EXPECT_EQ(100u, source->avail);
+  EXPECT_FALSE(pelo::source_need(*source.get(), 300));
+  ASSERT_TRUE(pelo::source_skip(*source.get(), 60));
+  ASSERT_TRUE(pelo::source_need(*source.get(), 90)) << "60 freed bytes make room for the next ones";
+  EXPECT_EQ(60u, pelo::source_offset(*source.get()));
+  for (int i = 60; i < 150; ++i) ASSERT_EQ(i % 251, *pelo::source_take(*source.get(), 1)) << i;
+  s.limit = 0;
+  ASSERT_TRUE(pelo::source_reposition(*source.get(), 155));
+  EXPECT_FALSE(pelo::source_need(*source.get(), 50));
+  EXPECT_EQ(155 % 251, *pelo::source_take(*source.get(), 1));
+  EXPECT_EQ(2, PELOJ_CheckBuffer(source.get(), 0));
+  EXPECT_EQ(0, PELOJ_CheckBuffer(source.get(), 4097));
+  TAVIRPELO_Close_IO(io);
+}
+
+TEST(Streams, PicturesDecodeAsFromMemory) {
+  Stream s{sample_jpeg(50, 40)};
+  Bytes expected(50 * 40 * 3), actual(expected.size());
+  TAVIRPELO_DECINFO* info = TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, s.bytes.data(),
+                                                    static_cast<int>(s.bytes.size()), 1, 0);
+  EXPECT_EQ(1, TAVIRPELO_DecodeJPEG(info, expected.data(), 50, 40));
+  TAVIRPELO_DestroyDecInfo(info);
+  info =
+      TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), read, skip, reset, 1, 0);
+  TAVIRPELO_HINFO header;
+  EXPECT_EQ(TAVIRPELO_FORMAT_JPEG, TAVIRPELO_Parser(info, &header));
+  EXPECT_EQ(50, header.width);
+  EXPECT_EQ(static_cast<int>(s.bytes.size()), header.sourceSize);
+  EXPECT_EQ(1, TAVIRPELO_SetStreamReadSize(info, 512));
+  EXPECT_EQ(1, TAVIRPELO_DecodeJPEG(info, actual.data(), 50, 40));
+  EXPECT_EQ(expected, actual);
+  TAVIRPELO_DestroyDecInfo(info);
+}
+
+// Each allocation of create, callback and parse fails in turn; the error words say which kind it was.
+TEST(Streams, ShortMemoryAtEveryStep) {
+  Stream s{sample_jpeg(20, 10)};
+  int failures = 0;
+  for (long k = 1; k < 10; ++k) {
+    gTAVIRPELO_Error = 0;
+    pelo::faults::allocations.arm(k);
+    TAVIRPELO_DECINFO* info =
+        TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), read, skip, reset, 1, 0);
+    const bool callback = PELOJ_SetCallback(
+                              info, [](intptr_t, int) {}, 1) != 0;
+    TAVIRPELO_HINFO header;
+    const int format = info != nullptr ? TAVIRPELO_Parser(info, &header) : 0;
+    pelo::faults::allocations.arm(0);
+    if (info == nullptr)
+      EXPECT_TRUE(gTavirError == TAVIRPELO_ERROR_MEMORY || gTAVIRPELO_Error == TAVIRPELO_ERROR_MEMORY);
+    if (info != nullptr && !callback) EXPECT_EQ(nullptr, info->pCallback);
+    if (info != nullptr && format == 0) EXPECT_NE(0, gTAVIRPELO_Error);
+    failures += info == nullptr || !callback || format == 0;
+    if (info != nullptr) TAVIRPELO_DestroyDecInfo(info);
+  }
+  EXPECT_EQ(5, failures) << "object, source, record, the parser's buffer, the header scan's buffer";
+}
+
+}  // namespace
+}  // namespace tests
