@@ -27,7 +27,8 @@ struct FieldWriter {
   }
   void numbers(const int (&values)[kOffsetCount]) {
     uint8_t bytes[kOffsetCount * 4];
-    for (size_t i = 0; i < kOffsetCount; ++i) store_le32(bytes + i * 4, static_cast<uint32_t>(values[i]));
+    for (size_t i = 0; i < kOffsetCount; ++i)
+      store_le32(bytes + i * 4, static_cast<uint32_t>(values[i]));
     session.write(bytes, sizeof bytes);
   }
 };

@@ -13,7 +13,7 @@ struct PictureSource {
   int length;
 };
 
-// Width or height of a picture as the show displays it.
+// A picture as the show displays it, in pixels.
 struct DisplaySize {
   int width;
   int height;

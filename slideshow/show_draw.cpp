@@ -24,8 +24,10 @@ using Decode = int (*)(TAVIRPELO_DECINFO*, void*, int, int);
 // The decoders of drawable formats; any other code cannot be drawn.
 Decode decoder_of(int format) {
   switch (format) {
-    case TAVIRPELO_FORMAT_JPEG: return TAVIRPELO_DecodeJPEG;
-    default: return nullptr;
+    case TAVIRPELO_FORMAT_JPEG:
+      return TAVIRPELO_DecodeJPEG;
+    default:
+      return nullptr;
   }
 }
 
@@ -33,7 +35,9 @@ Decode decoder_of(int format) {
 size_t pixel_bytes(int width, int height) {
   if (width < 1 || height < 1) return 0;
   const int64_t pixels = int64_t{width} * height;
-  return pixels > INT_MAX || pixels > static_cast<int64_t>(SIZE_MAX / 4) ? 0 : static_cast<size_t>(pixels) * 4;
+  return pixels > INT_MAX || pixels > static_cast<int64_t>(SIZE_MAX / 4)
+             ? 0
+             : static_cast<size_t>(pixels) * 4;
 }
 
 int draw(int ioType, void* source, int size, void* pixels, int width, int height) {
@@ -70,7 +74,8 @@ int SlideShow::GetImage(int index, void* buffer) {
 }
 
 int SlideShow::GetDrawble(int index, void* pixels, int drawWidth, int drawHeight) {
-  if (!valid_index(*this, index) || pixels == nullptr || pixel_bytes(drawWidth, drawHeight) == 0) return 0;
+  if (!valid_index(*this, index) || pixels == nullptr || pixel_bytes(drawWidth, drawHeight) == 0)
+    return 0;
   int drawn;
   if (mode == kFileMode) {
     const int size = GetSizeOfSubfile(index);

@@ -14,7 +14,8 @@ using namespace pelo::slideshow;
 // The table is a plain block of records: it is copied about and freed without destructors.
 static_assert(std::is_trivially_copyable_v<subfileInfo>);
 static_assert(std::is_trivially_destructible_v<subfileInfo>);
-static_assert(sizeof(void*) != 4 || (sizeof(subfileInfo) == 544 && offsetof(subfileInfo, offset) == 540));
+static_assert(sizeof(void*) != 4 ||
+              (sizeof(subfileInfo) == 544 && offsetof(subfileInfo, offset) == 540));
 static_assert(sizeof(void*) != 4 ||
               (sizeof(SlideShow) == 644 && offsetof(SlideShowFields, subfileOffsets) == 540));
 

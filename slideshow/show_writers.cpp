@@ -8,8 +8,8 @@ using namespace pelo::slideshow;
 
 int SlideShow::writeVssHeader(const char* openMode) {
   ContainerSession session(*this, openMode);
-  // A stream opened for appending writes at the file's end whatever the seek says: only an empty file will
-  // do.
+  // A stream opened for appending writes at the file's end whatever the seek says: only an empty file
+  // will do.
   if (session.good() && openMode[0] == 'a' && session.seek_end() != 0) session.fail();
   session.seek(musicSize);
   write_header(session, *this);
@@ -29,6 +29,7 @@ int SlideShow::writeSubfileHeader() {
 int SlideShow::writeSubfile(int index, const void* data) {
   if (!valid_index(*this, index) || data == nullptr) return 0;
   const subfileInfo& entry = subfiles[index];
+  if (entry.size <= kSubfileHeaderSize) return 0;
   ContainerSession session(*this, "r+b");
   session.seek(entry.offset);
   write_subfile_header(session, entry);

@@ -22,8 +22,8 @@ inline bool usable_path(const char* path) {
   return length > 0 && length < kTextSize;
 }
 
-// Stores the text, cut at 255 bytes, and zeroes the rest so that no older text reaches a file. `text` may
-// lie in the field itself.
+// Stores the text, cut at 255 bytes, and zeroes the rest so that no older text reaches a file. `text`
+// may lie in the field itself.
 inline void set_text(char (&field)[kTextSize], const char* text) {
   const size_t whole = text_length(text);
   const size_t length = whole < kTextSize ? whole : kTextSize - 1;

@@ -1,0 +1,88 @@
+#include "slideshow/store_picture.h"
+
+#include <algorithm>
+#include <climits>
+#include <cstdint>
+
+#include "slideshow/container_format.h"
+#include "slideshow/container_undo.h"
+#include "slideshow/data_shift.h"
+#include "slideshow/subfile_table.h"
+#include "slideshow/text_field.h"
+
+namespace pelo::slideshow {
+namespace {
+
+// Keeps a source file open while its picture is read.
+class OpenSource {
+ public:
+  OpenSource(subfileInfo& entry, const PictureSource& source) : entry_(entry) {
+    if (source.path == nullptr) {
+      good_ = source.data != nullptr;
+    } else if (usable_path(source.path)) {
+      entry.sourceFile = vss_fopen(source.path, "rb");
+      good_ = entry.sourceFile != nullptr;
+    }
+  }
+  ~OpenSource() {
+    if (entry_.sourceFile != nullptr) (void)vss_fclose(entry_.sourceFile);
+    entry_.sourceFile = nullptr;
+  }
+  OpenSource(const OpenSource&) = delete;
+  OpenSource& operator=(const OpenSource&) = delete;
+
+  bool good() const { return good_; }
+
+ private:
+  subfileInfo& entry_;
+  bool good_ = false;
+};
+
+bool read_picture(const SlideShow& show, const PictureSource& source, const char* name, char flag,
+                  subfileInfo& entry, JpegBytes& jpeg) {
+  const OpenSource open(entry, source);
+  return open.good() && make_picture(show, source, name, flag, entry, jpeg);
+}
+
+// An edit appends two end marks; every offset in the file stays within 31 bits.
+bool file_stays_small(const SlideShow& show, int64_t fileLength, int64_t added) {
+  return std::max(fileLength, data_end(show) + added) + 2 * kEndMarkSize <= INT_MAX;
+}
+
+// The container's side, once the table holds the new picture. The mark behind the header keeps the
+// file's end valid while the picture is written; at the end of the data the picture covers every older
+// mark, and the last mark closes the file again.
+bool write_picture(SlideShow& show, DataShift& shift, int position, const uint8_t* jpeg) {
+  const bool last = position == show.subfileCount - 1;
+  return shift.up(show, position + 1, show.subfiles[position].size) && show.writeVssHeader("r+b") == 1 &&
+         show.writeEndMark() == 1 && show.writeSubfile(position, jpeg) == 1 &&
+         (last || show.writeSubfileHeader() == 1) && show.writeEndMark() == 1;
+}
+
+bool store_in_file(SlideShow& show, const subfileInfo& entry, const uint8_t* jpeg, int position) {
+  ContainerUndo undo;
+  if (!undo.remember(show, position < show.subfileCount, entry.size)) return false;
+  if (!file_stays_small(show, undo.length(), entry.size)) return false;
+
+  insert_entry(show, position, entry);
+  DataShift shift;
+  if (write_picture(show, shift, position, jpeg)) return true;
+  shift.back(show);
+  undo.put_back(show);
+  erase_entry(show, position);
+  return false;
+}
+
+}  // namespace
+
+int store_picture(SlideShow& show, const PictureSource& source, const char* name, int position,
+                  char flag) {
+  subfileInfo entry;
+  JpegBytes jpeg;
+  if (!has_room(show) || !read_picture(show, source, name, flag, entry, jpeg)) return 0;
+  if (show.mode == SlideShow::kFileMode) return store_in_file(show, entry, jpeg.get(), position) ? 1 : 0;
+  insert_entry(show, position, entry);
+  return 1;
+}
+
+}  // namespace pelo::slideshow
