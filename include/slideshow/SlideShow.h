@@ -19,30 +19,30 @@ struct subfileInfo {
   int flag = 0;                // 0 to 255, from the add or insert; 1 from the public operations
   FILE* sourceFile = nullptr;  // source file, open while the picture is being added
   int reserved = 0;
-  int width = 0;               // pixels: of the stored JPEG in file mode, of the source in memory mode
+  int width = 0;  // pixels: of the stored JPEG in file mode, of the source in memory mode
   int height = 0;
-  int state = 0;               // 0 added since the show was created or opened, 2 loaded from the file
-  int size = 0;                // bytes of header and JPEG data in the container; 0 in memory mode
-  int offset = 0;              // of the header in the container
+  int state = 0;   // 0 added since the show was created or opened, 2 loaded from the file
+  int size = 0;    // bytes of header and JPEG data in the container; 0 in memory mode
+  int offset = 0;  // of the header in the container
 };
 
 // The fields of a show, in the order that the Java bridge and native callers rely on.
 struct SlideShowFields {
-  char pathName[256] = {};    // container file; always terminated
-  char musicName[256] = {};   // music file that was copied into the container
-  FILE* file = nullptr;       // the container's stream while an operation runs
-  int mode = 0;               // SlideShow::kFree, kFileMode or kMemoryMode
-  int width = 0;              // target size of the show, pixels
+  char pathName[256] = {};   // container file; always terminated
+  char musicName[256] = {};  // music file that was copied into the container
+  FILE* file = nullptr;      // the container's stream while an operation runs
+  int mode = 0;              // SlideShow::kFree, kFileMode or kMemoryMode
+  int width = 0;             // target size of the show, pixels
   int height = 0;
-  int lastIndex = -1;         // picture drawn last, -1 before the first
-  int musicSize = 0;          // bytes of music, also the offset of the container's header
-  int subfileCount = 0;       // pictures
+  int lastIndex = -1;           // picture drawn last, -1 before the first
+  int musicSize = 0;            // bytes of music, also the offset of the container's header
+  int subfileCount = 0;         // pictures
   int subfileOffsets[20] = {};  // file mode: subfiles[i].offset, 0 behind the last
-  int interval = 1;           // settings; their units and codes are the application's
+  int interval = 1;             // settings; their units and codes are the application's
   int effectType = 0;
-  int shuffle = 0;            // 0 or 1
-  int loop = 0;               // 0 or 1
-  int screenDirection = 0;    // 0 or 1
+  int shuffle = 0;                  // 0 or 1
+  int loop = 0;                     // 0 or 1
+  int screenDirection = 0;          // 0 or 1
   subfileInfo* subfiles = nullptr;  // 20 (file mode) or 1024 (memory mode) entries, owned
 };
 
@@ -77,8 +77,8 @@ class SlideShow : public SlideShowFields {
   int CreateShow(const char* path, int showWidth, int showHeight);
 
   // Opens a container. Its header replaces the path, size and settings given so far. Returns 1, or with
-  // the object free: kNotContainer (no end mark), kWrongVersion, kGeneralFailure (bad arguments, missing,
-  // read-only, cut short or inconsistent file, no memory).
+  // the object free: kNotContainer (no end mark), kWrongVersion, kGeneralFailure (bad arguments,
+  // missing, read-only, cut short or inconsistent file, no memory).
   int OpenShow(const char* path, int showWidth, int showHeight);
 
   // Ends the show: the object is free again, the container stays as it is. Returns 1.
@@ -104,8 +104,8 @@ class SlideShow : public SlideShowFields {
   // ---- adding pictures ----
   // In any format that the codec reads. File mode stores a JPEG of the display size at quality 100;
   // memory mode notes size and path. `name` may be null and is cut at 255 bytes. `data` stays the
-  // caller's, but a decoder may rework it in place. 1, or 0: free object, show full, missing source, path
-  // not 1 to 255 bytes, unreadable or unsupported picture, no memory, container not writable.
+  // caller's, but a decoder may rework it in place. 1, or 0: free object, show full, missing source,
+  // path not 1 to 255 bytes, unreadable or unsupported picture, no memory, container not writable.
 
   int AddImageToFile(const char* imagePath, const char* imageName);
   int AddImageToBuffer(void* data, int length, const char* imageName);
