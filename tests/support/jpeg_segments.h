@@ -17,11 +17,11 @@ class ByteWriter {
   ByteWriter& u16(uint32_t v) { return put(v, 2); }
   ByteWriter& u32(uint32_t v) { return put(v, 4); }
   ByteWriter& text(std::string_view t) {
-    bytes_.insert(bytes_.end(), t.begin(), t.end());
+    for (const char c : t) bytes_.push_back(static_cast<uint8_t>(c));
     return *this;
   }
   ByteWriter& block(const Bytes& b) {
-    bytes_.insert(bytes_.end(), b.begin(), b.end());
+    for (const uint8_t byte : b) bytes_.push_back(byte);
     return *this;
   }
   size_t size() const { return bytes_.size(); }
