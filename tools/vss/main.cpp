@@ -1,5 +1,6 @@
 // vss: makes, edits and reads slide-show files from the command line.
 #include <cstdio>
+#include <exception>
 
 #include "tools/vss/commands.h"
 
@@ -34,6 +35,8 @@ int main(int argc, char** argv) {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {
     result = static_cast<vss::Exit>(report(app, error));
+  } catch (const std::exception& error) {  // no memory, a locale or file system that misbehaves
+    result = vss::fail(vss::Exit::kRefused, "{}", error.what());
   }
   // Results that did not reach standard output were not delivered.
   bool lost = std::ferror(stdout) != 0;
