@@ -20,12 +20,11 @@ inline Lanes load_lanes(const int32_t* p) {
 // Three rounds of interleaving row i with row i + 4 exchange rows and columns.
 template <class Vector>
 inline void transpose(Vector (&m)[8]) {
-  using Mask = decltype(m[0] < m[0]);
   for (int round = 0; round < 3; ++round) {
     Vector t[8];
     for (int i = 0; i < 4; ++i) {
-      t[2 * i] = __builtin_shuffle(m[i], m[i + 4], Mask{0, 8, 1, 9, 2, 10, 3, 11});
-      t[2 * i + 1] = __builtin_shuffle(m[i], m[i + 4], Mask{4, 12, 5, 13, 6, 14, 7, 15});
+      t[2 * i] = __builtin_shufflevector(m[i], m[i + 4], 0, 8, 1, 9, 2, 10, 3, 11);
+      t[2 * i + 1] = __builtin_shufflevector(m[i], m[i + 4], 4, 12, 5, 13, 6, 14, 7, 15);
     }
     for (int i = 0; i < 8; ++i) m[i] = t[i];
   }

@@ -10,6 +10,7 @@ enum class Marker : uint8_t {
   kSof2 = 0xC2,  // progressive frame
   kDht = 0xC4,
   kSoi = 0xD8,
+  kEoi = 0xD9,
   kSos = 0xDA,
   kDqt = 0xDB,
   kDnl = 0xDC,
@@ -17,6 +18,7 @@ enum class Marker : uint8_t {
   kApp0 = 0xE0,
   kApp1 = 0xE1,
   kApp13 = 0xED,
+  kApp14 = 0xEE,
   kApp15 = 0xEF,
   kCom = 0xFE
 };

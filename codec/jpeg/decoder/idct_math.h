@@ -29,6 +29,21 @@ inline uint8_t clamp_byte(int32_t value) {
 // A transform result as a sample: five fraction bits dropped, level shift.
 inline uint8_t to_sample(int32_t value) { return clamp_byte((value >> 5) + 128); }
 
+// The last step of the 8-point transforms: even part plus and minus odd part.
+template <class Vector>
+inline void join_halves(Vector (&x)[8], const Vector& e0, const Vector& e1, const Vector& e2,
+                        const Vector& e3, const Vector& o4, const Vector& o5, const Vector& o6,
+                        const Vector& o7) {
+  x[0] = e0 + o7;
+  x[7] = e0 - o7;
+  x[1] = e1 + o6;
+  x[6] = e1 - o6;
+  x[2] = e2 + o5;
+  x[5] = e2 - o5;
+  x[4] = e3 + o4;
+  x[3] = e3 - o4;
+}
+
 // The 8-point butterfly of Arai, Agui and Nakajima on x[0..7], in place.
 template <class Vector>
 inline void butterfly8(Vector (&x)[8]) {
@@ -51,14 +66,7 @@ inline void butterfly8(Vector (&x)[8]) {
   const Vector o5 = scaled(z11 - z13, 362) - o6;
   const Vector o4 = scaled(z12, 277) - z5 + o5;
 
-  x[0] = e0 + o7;
-  x[7] = e0 - o7;
-  x[1] = e1 + o6;
-  x[6] = e1 - o6;
-  x[2] = e2 + o5;
-  x[5] = e2 - o5;
-  x[4] = e3 + o4;
-  x[3] = e3 - o4;
+  join_halves(x, e0, e1, e2, e3, o4, o5, o6, o7);
 }
 
 // The same with x[3..7] zero and the constant chains of x[1] folded: 217 = 473 - 256, 145 = 362 - 217.
@@ -75,14 +83,7 @@ inline void butterfly3(Vector (&x)[8]) {
   const Vector o5 = scaled(x[1], 145);
   const Vector o4 = scaled(x[1], 277) - scaled(x[1], 473) + o5;
 
-  x[0] = e0 + o7;
-  x[7] = e0 - o7;
-  x[1] = e1 + o6;
-  x[6] = e1 - o6;
-  x[2] = e2 + o5;
-  x[5] = e2 - o5;
-  x[4] = e3 + o4;
-  x[3] = e3 - o4;
+  join_halves(x, e0, e1, e2, e3, o4, o5, o6, o7);
 }
 
 }  // namespace pelo::jpeg

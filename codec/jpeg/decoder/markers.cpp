@@ -5,16 +5,14 @@
 
 #include "codec/core/ground/byte_order.h"
 #include "codec/jpeg/header_scan.h"
+#include "codec/jpeg/marker_codes.h"
 
 using namespace pelo;
 using namespace pelo::jpeg;
 
 namespace {
 
-enum Marker : uint8_t {
-  kSof0 = 0xC0, kSof2 = 0xC2, kDht = 0xC4, kEoi = 0xD9, kSos = 0xDA, kDqt = 0xDB, kDnl = 0xDC,
-  kDri = 0xDD, kApp0 = 0xE0, kApp14 = 0xEE, kApp15 = 0xEF, kCom = 0xFE
-};
+using enum Marker;
 
 // Consumes n bytes into `bytes`; false when the source ends first.
 bool read(PELOJ_SOURCE& source, void* bytes, uint32_t n) {
@@ -24,7 +22,7 @@ bool read(PELOJ_SOURCE& source, void* bytes, uint32_t n) {
 }
 
 // SOF0, SOF2 (T.81 B.2.2).
-bool read_frame(PELOJ_JDINFO& jd, uint8_t code) {
+bool read_frame(PELOJ_JDINFO& jd, Marker code) {
   MarkerRecord& marker = *jd.marker;
   uint8_t head[8];
   if (marker.frameType != FrameType::kNone || !read(*jd.source, head, 8)) return false;
@@ -107,7 +105,7 @@ bool read_restart_interval(PELOJ_JDINFO& jd) {
 }
 
 // APPn, COM, DNL: skipped, but for what an APP14 ends with.
-bool read_application(PELOJ_JDINFO& jd, uint8_t code) {
+bool read_application(PELOJ_JDINFO& jd, Marker code) {
   uint32_t left;
   if (!segment_length(*jd.source, left)) return false;
   if (code == kApp0) jd.marker->sawApp0 = 1;
@@ -167,7 +165,7 @@ bool read_scan(PELOJ_JDINFO& jd) {
 }
 
 // One segment by its code; codes that are not listed are passed over, scanning goes on behind them.
-bool read_segment(PELOJ_JDINFO& jd, uint8_t code) {
+bool read_segment(PELOJ_JDINFO& jd, Marker code) {
   switch (code) {
     case kSof0:
     case kSof2: return read_frame(jd, code);
@@ -201,7 +199,7 @@ bool parse_header(PELOJ_JDINFO& jd) {
   if (!jd.marker) return false;
   jd.marker->transform = 1;
   int status = PELOJ_FAIL;
-  if (!find_soi(*jd.source) || PELOJ_ParseNextMarker(&jd, &status) == kEoi || status != PELOJ_OK) {
+  if (!find_soi(*jd.source) || PELOJ_ParseNextMarker(&jd, &status) == static_cast<int>(kEoi) || status != PELOJ_OK) {
     return false;
   }
   jd.colourSpace = colour_space(jd);
@@ -216,9 +214,10 @@ int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status) {
   uint8_t code = 0;
   while (next_marker(*jdInfo->source, code)) {
     // Behind a scan, EOI ends the picture; what follows is another file's.
-    if (code == kEoi && jdInfo->marker->sawSos) return code;
-    if (!read_segment(*jdInfo, code)) return code;
-    if (code == kSos) {
+    const auto marker = static_cast<Marker>(code);
+    if (marker == kEoi && jdInfo->marker->sawSos) return code;
+    if (!read_segment(*jdInfo, marker)) return code;
+    if (marker == kSos) {
       *status = PELOJ_OK;
       return code;
     }

@@ -59,19 +59,30 @@ struct YccModel {
   static constexpr bool kPlanar = true;
   static constexpr bool kGrey = false;
   static Run rgb(const Run& in, int count, const RowOutput& output, RunBuffer& buffer) {
+    if (output.dither) {
+      const uint8_t* matrix = kDither[output.emitted & 3];
+      convert(in, count, buffer, [matrix](int i) { return int{matrix[i & 3]}; });
+    } else {
+      convert(in, count, buffer, [](int) { return 0; });
+    }
+    return buffer.view();
+  }
+
+ private:
+  // `dither` tells what is added to pixel i; half of it to green.
+  template <class Dither>
+  static void convert(const Run& in, int count, RunBuffer& buffer, Dither dither) {
     uint8_t* __restrict r = buffer.channel[0];
     uint8_t* __restrict g = buffer.channel[1];
     uint8_t* __restrict b = buffer.channel[2];
-    const uint8_t* dither = kDither[output.emitted & 3];
     for (int i = 0; i < count; ++i) {
       const int y = in.channel[0][i];
       const ChromaOffsets offsets = chroma_offsets(in.channel[1][i], in.channel[2][i]);
-      const int d = output.dither ? dither[i & 3] : 0;
+      const int d = dither(i);
       r[i] = clamp_channel(y + d + offsets.r);
       g[i] = clamp_channel(y + (d >> 1) + offsets.g);
       b[i] = clamp_channel(y + d + offsets.b);
     }
-    return buffer.view();
   }
 };
 struct GreyModel {
