@@ -25,16 +25,6 @@ struct State {
 
   explicit State(const SlideShow& show)
       : fields(show), entries(show.subfiles, show.subfiles + SlideShow::kMaxFileSubfiles) {}
-  // By fields: what padding holds is nobody's promise.
-  bool operator==(const State& other) const {
-    return settings(fields) == settings(other.fields) &&
-           std::equal(std::begin(fields.subfileOffsets), std::end(fields.subfileOffsets),
-                      std::begin(other.fields.subfileOffsets)) &&
-           std::equal(entries.begin(), entries.end(), other.entries.begin(), other.entries.end(),
-                      [](const subfileInfo& x, const subfileInfo& y) { return facts(x) == facts(y); });
-  }
-
- private:
   static auto settings(const SlideShowFields& f) {
     return std::tuple(std::to_array(f.pathName), std::to_array(f.musicName), f.file, f.mode, f.width, f.height,
                       f.lastIndex, f.musicSize, f.subfileCount, f.interval, f.effectType, f.shuffle, f.loop,
@@ -43,6 +33,15 @@ struct State {
   static auto facts(const subfileInfo& e) {
     return std::tuple(std::to_array(e.name), std::to_array(e.path), e.flag, e.sourceFile, e.reserved, e.width,
                       e.height, e.state, e.size, e.offset);
+  }
+
+  // By fields: what padding holds is nobody's promise.
+  bool operator==(const State& other) const {
+    return settings(fields) == settings(other.fields) &&
+           std::equal(std::begin(fields.subfileOffsets), std::end(fields.subfileOffsets),
+                      std::begin(other.fields.subfileOffsets)) &&
+           std::equal(entries.begin(), entries.end(), other.entries.begin(), other.entries.end(),
+                      [](const subfileInfo& x, const subfileInfo& y) { return facts(x) == facts(y); });
   }
 };
 
