@@ -5,6 +5,7 @@
 #include "codec/core/ground/byte_order.h"
 #include "codec/core/ground/os_memory.h"
 #include "codec/pixel/packers.h"
+#include "codec/pixel/pixel_layout.h"
 #include "tavirpelo/raw.h"
 
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_RAWINFO) == 16);

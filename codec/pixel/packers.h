@@ -24,8 +24,4 @@ constexpr int bytes_per_pixel(int format) {
   return format >= 0 && format < 13 ? kBytes[format] : 0;
 }
 
-constexpr uint16_t rgb565(int r, int g, int b) {
-  return static_cast<uint16_t>((r >> 3) << 11 | (g >> 2) << 5 | b >> 3);
-}
-
 }  // namespace pelo

@@ -15,9 +15,9 @@ constexpr ChromaOffsets chroma_offsets(int cb, int cr) {
   const auto u = static_cast<int16_t>(cb - 128);
   const auto v = static_cast<int16_t>(cr - 128);
   ChromaOffsets offsets{};
-  offsets.r = v + (v * 26345 >> 16);                       // 91881 = 65536 + 26345
-  offsets.g = -(v + ((u * 22554 + v * -18734) >> 16));     // 46802 = 65536 - 18734
-  offsets.b = 2 * u + (u * -14942 >> 16);                  // 116130 = 131072 - 14942
+  offsets.r = v + (v * 26345 >> 16);                    // 91881 = 65536 + 26345
+  offsets.g = -(v + ((u * 22554 + v * -18734) >> 16));  // 46802 = 65536 - 18734
+  offsets.b = 2 * u + (u * -14942 >> 16);               // 116130 = 131072 - 14942
   return offsets;
 }
 static_assert(chroma_offsets(255, 0).r == (-128 * 91881 >> 16) &&

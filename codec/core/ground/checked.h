@@ -9,6 +9,10 @@
 
 namespace pelo {
 
+// The largest block that the size fields of a picture may ask for: bigger canvases and rows are refused
+// as if memory were short.
+constexpr int64_t kMaxPictureBlock = int64_t{256} << 20;
+
 // a * b, or nothing when it exceeds size_t.
 [[nodiscard]] constexpr std::optional<size_t> checked_mul(size_t a, size_t b) {
   if (b != 0 && a > std::numeric_limits<size_t>::max() / b) return std::nullopt;
