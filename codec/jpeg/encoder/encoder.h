@@ -1,119 +1,141 @@
-// The JPEG encoder's state and steps: one pass, baseline, Annex K tables, chroma 4:2:0 or grey.
+// The state of one JPEG encoding, its steps in calling order, and the band interface.
 #pragma once
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 
 #include "codec/core/ground/os_memory.h"
+#include "codec/jpeg/encoder/bit_writer.h"
+#include "codec/jpeg/encoder/destination.h"
+#include "codec/jpeg/encoder/huffman_codes.h"
+#include "codec/jpeg/encoder/quantise.h"
 #include "codec/jpeg/tables.h"
 #include "tavirpelo/encode.h"
 
-// Where the stream goes. Memory output owns the caller's buffer until the end; file output a working
-// buffer that is flushed.
-typedef struct ELO_DESTINATION {
-  int toMemory;
-  int capacity;     // bytes of the working buffer
-  int used;
-  int64_t total;    // bytes flushed before those
-  FILE* file;
-  uint8_t* buffer;
-} ELO_DESTINATION;
-
-// Coding parameters taken from a source picture instead of a quality; none are known yet.
-typedef struct ELO_ENCPARAMETERS ELO_ENCPARAMETERS;
-
 namespace pelo::jpeg {
 
-// Codes of elo_SetError.
-enum EncodeError { kNoMemory = 3, kBadFormat = 6, kBadSampling = 7, kBadSize = 14 };
+constexpr int kEncoderComponents = 3;
+constexpr int kQuantTables = 4;
+constexpr int kEncoderMcuBlocks = 10;  // T.81 B.2.3
+constexpr int kMaxEncodedSide = 4999;
 
-constexpr int kEncoderMaxSide = 4999;
-constexpr int kEncoderMaxBlocks = 10;
+// Quantised coefficients in natural order.
+using CoefficientBlock = std::array<int32_t, 64>;
 
-struct EncoderQuant {
-  std::array<uint8_t, 64> value;       // natural order
-  std::array<int32_t, 64> reciprocal;  // 65536 / (value x scale factor / 2048), 0 for no divisor
+// Coding parameters taken from another JPEG instead of a quality.
+struct CodingParameters {
+  struct Component {
+    uint8_t quantTable;  // 0 to 3
+    uint8_t h, v;        // sampling factors, 1 or 2
+  };
+  int componentCount;
+  std::array<Component, kEncoderComponents> components;
+  std::array<std::array<uint8_t, 64>, kQuantTables> quant;  // by table number, natural order
+  bool restartPerRow;  // announce a restart interval of one MCU row; the caller writes the markers
 };
 
 struct EncoderComponent {
-  int id, h, v, table;
-  int width, height;          // samples
+  uint8_t id;
+  uint8_t h, v;  // sampling factors
+  uint8_t quantTable, dcTable, acTable;
   int blocksWide, blocksHigh;
-  int stride;                 // samples of a buffered row: whole MCUs
-  OsBuffer<uint8_t> samples;  // one MCU row
+  int width, height;          // samples
+  OsBuffer<uint8_t> samples;  // one MCU row: 8 * v rows of 8 * blocksWide
+
+  int stride() const { return 8 * blocksWide; }
+  uint8_t* row(int y) { return samples.data() + static_cast<ptrdiff_t>(y) * stride(); }
 };
 
-// Code and length by symbol; length 0 for symbols outside the table.
-struct CodeTable {
-  std::array<uint16_t, 256> code;
-  std::array<uint8_t, 256> length;
+// What the entropy coder carries from one MCU to the next. Copyable: a caller that codes several streams
+// in turn keeps one for each.
+struct EntropyCoderState {
+  PendingBits pending;
+  std::array<int32_t, kEncoderComponents> lastDc;
 };
 
 }  // namespace pelo::jpeg
 
-typedef struct ELO_ENCODER {
-  int width, height, format, quality;
-  int componentCount;
-  int hMax, vMax;
-  int mcusWide, mcusHigh, mcuBlocks;
-  int mcuRow;
-  std::array<pelo::jpeg::EncoderComponent, 3> components;
-  std::array<pelo::jpeg::EncoderQuant, 2> quant;
-  std::array<const pelo::jpeg::HuffmanSpec*, 2> dcSpec, acSpec;
-  std::array<pelo::jpeg::CodeTable, 2> dc, ac;
-  uint64_t bits;              // pending bits, the lowest bitCount ones
-  int bitCount;
-  std::array<int, 3> lastDc;
-  ELO_DESTINATION* destination;
-  const TAVIRPELO_APP1* app1;
-  int failed;                 // the destination ran out
-} ELO_ENCODER;
+struct ELO_ENCODER {
+  int width, height;  // pixels
+  uint32_t format;    // of the input image
+  const uint8_t* pixels;
+  int row;  // first pixel row of the next MCU row
 
-// ---- state (encoder.cpp) ----
-TAVIRPELO_API void elo_SetError(int code);
+  int componentCount;
+  std::array<pelo::jpeg::EncoderComponent, pelo::jpeg::kEncoderComponents> components;
+  int hMax, vMax;
+  int mcusAcross, mcusDown;
+  int mcuBlocks;
+  std::array<uint8_t, pelo::jpeg::kEncoderMcuBlocks> blockComponent;  // of each block of an MCU
+  bool restartPerRow;
+
+  std::array<pelo::jpeg::QuantiseTable, pelo::jpeg::kQuantTables> quant;
+  std::array<const pelo::jpeg::HuffmanSpec*, 2> dcSpecs, acSpecs;
+  std::array<pelo::jpeg::HuffmanCodes, 2> dcCodes, acCodes;
+
+  pelo::jpeg::EntropyCoderState entropy;
+  ELO_DESTINATION* destination;  // the caller's
+  const TAVIRPELO_APP1* app1;    // the caller's, or null
+
+  int mcu_width() const { return 8 * hMax; }
+  int mcu_height() const { return 8 * vMax; }
+};
+
+// ---- the steps ----
+
+// A new state for an image of these sides and format, writing to `destination`, which must outlive it.
+// Without parameters: 4:2:0 (or grey) at the quality of the options. Null on failure.
 TAVIRPELO_API ELO_ENCODER* __elo_jpeg_enc_initiaize(const TAVIRPELO_RAWINFO* image,
                                                     ELO_DESTINATION* destination,
                                                     const TAVIRPELO_ENCOPTION* options,
-                                                    const ELO_ENCPARAMETERS* parameters);
-// Frees what the state owns and the state. Null is ignored.
+                                                    const pelo::jpeg::CodingParameters* parameters);
+
+// The steps below return 1, or 0 when the destination fails.
+
+// Everything before the entropy-coded data.
+TAVIRPELO_API int __elo_jpeg_enc_make_header(ELO_ENCODER* encoder);
+
+// Encodes the next MCU row of the image.
+TAVIRPELO_API int __elo_jpeg_enc_process_image_data(ELO_ENCODER* encoder);
+
+// Fills the sample rows of the next MCU row from planes that start at its first row and are packed
+// (component width samples a row); columns and rows beyond the image repeat the last ones.
+TAVIRPELO_API void __elo_jpeg_enc_get_raw_data(ELO_ENCODER* encoder, const uint8_t* const* planes);
+
+// Transforms and codes the MCU row in the sample buffers, and moves on to the next.
+TAVIRPELO_API int __elo_jpeg_enc_compress_data(ELO_ENCODER* encoder);
+
+// One block of 8 x 8 samples, `stride` bytes from row to row, to quantised coefficients.
+TAVIRPELO_API void __elo_jpeg_enc_do_forward_dct(const uint8_t* samples, ptrdiff_t stride,
+                                                 const pelo::jpeg::QuantiseTable* table,
+                                                 int32_t* coefficients);
+
+// Codes one MCU of encoder->mcuBlocks blocks. Values beyond what baseline codes can express (AC
+// -1023..1023, DC -1024..1023) are clamped; zig-zag position 63 is never coded.
+TAVIRPELO_API int __elo_jpeg_enc_encode_1mcu_blk(ELO_ENCODER* encoder,
+                                                 const pelo::jpeg::CoefficientBlock* blocks);
+
+// EOI, and the end of the destination.
+TAVIRPELO_API int __elo_jpeg_enc_make_end_mark(ELO_ENCODER* encoder);
+
+// Frees what the state holds, and a file destination's working buffer; the state itself stays.
 TAVIRPELO_API void __elo_jpeg_enc_release_mem(ELO_ENCODER* encoder);
 
-// ---- tables (encoder_tables.cpp) ----
-TAVIRPELO_API void __elo_jpeg_enc_set_quality(ELO_ENCODER* encoder, int quality);
-TAVIRPELO_API void __elo_jpeg_enc_set_quant_table(ELO_ENCODER* encoder, int number, const uint8_t* values);
-TAVIRPELO_API void __elo_jpeg_enc_prepare_huffman_code(ELO_ENCODER* encoder);
-TAVIRPELO_API void __elo_jpeg_enc_prepare_derived_tbl(const pelo::jpeg::HuffmanSpec* spec,
-                                                      pelo::jpeg::CodeTable* table);
+// ---- data that arrives in bands ----
 
-// ---- destination (destination.cpp): 1, or 0 when it ran out ----
-// Makes room for `bytes` more by growing or flushing.
-TAVIRPELO_API int elo_jpeg_enc_reserve(ELO_ENCODER* encoder, int bytes);
-// A copy of `old` with `extra` more bytes; `old` is released. Null, with `old` kept, when memory is short.
-TAVIRPELO_API uint8_t* elo_jpeg_enc_realloc(uint8_t* old, int oldSize, int extra);
-
-// ---- stream ----
-TAVIRPELO_API int __elo_jpeg_enc_make_header(ELO_ENCODER* encoder);
-TAVIRPELO_API int __elo_jpeg_enc_make_end_mark(ELO_ENCODER* encoder);
-TAVIRPELO_API void __elo_jpeg_enc_write_bits(ELO_ENCODER* encoder, uint32_t code, int length);
-TAVIRPELO_API int __elo_jpeg_enc_finish_compression(ELO_ENCODER* encoder);
-
-// ---- picture ----
-// Fills the sample buffers of the current MCU row from the image, or from planes that begin with it.
-TAVIRPELO_API int __elo_jpeg_enc_process_image_data(ELO_ENCODER* encoder, const void* pixels);
-TAVIRPELO_API void __elo_jpeg_enc_get_raw_data(ELO_ENCODER* encoder, const uint8_t* const* planes,
-                                               int rowsAvailable);
-// Codes the buffered MCU row and moves on to the next.
-TAVIRPELO_API int __elo_jpeg_enc_compress_data(ELO_ENCODER* encoder);
-TAVIRPELO_API void __elo_jpeg_enc_do_forward_dct(const pelo::jpeg::EncoderQuant* quant,
-                                                 const uint8_t* samples, int stride, int32_t* block);
-TAVIRPELO_API void __elo_jpeg_enc_encode_1mcu_blk(ELO_ENCODER* encoder, int component,
-                                                  const int32_t* block);
-
-// ---- band interface: planar 4:2:0 data, 16 rows a call ----
+// Starts an encoding and writes the headers. The image's pixels are not read. Null on failure, with the
+// destination still the caller's.
 TAVIRPELO_API ELO_ENCODER* elo_jpeg_enc_mcu_init(const TAVIRPELO_RAWINFO* image,
                                                  ELO_DESTINATION* destination,
                                                  const TAVIRPELO_ENCOPTION* options,
-                                                 const ELO_ENCPARAMETERS* parameters);
+                                                 const pelo::jpeg::CodingParameters* parameters);
+
+// Encodes one MCU row from a band of planar 4:2:0 rows: 16 rows of Y, then 8 of Cb at 16 * width bytes
+// and 8 of Cr behind them, chroma rows of (width + 1) / 2. Rows of the last band that lie below the
+// image are not read. Stores the new row position (pixels, the height at the end) unless null; 1 or 0.
 TAVIRPELO_API int elo_jpeg_enc_muc_process(ELO_ENCODER* encoder, const uint8_t* band, int* position);
-// Writes EOI, reports buffer and total size (either pointer may be null), releases the state.
+
+// Ends the image, reports the working buffer and the bytes produced (either may be null), and frees the
+// state. 1 or 0.
 TAVIRPELO_API int elo_jpeg_enc_mcu_finish(ELO_ENCODER* encoder, uint8_t** buffer, int* size);

@@ -1,107 +1,157 @@
-// The marker segments around the entropy-coded data (ITU-T T.81 Annex B).
+// The marker segments of the output (ITU-T T.81 Annex B), each built whole and appended.
 #include <cstring>
 
 #include "codec/core/ground/byte_order.h"
 #include "codec/jpeg/encoder/encoder.h"
 
-using namespace pelo;
 using namespace pelo::jpeg;
 
 namespace {
 
-// Appends whole pieces, each after making room for it.
-class Appender {
- public:
-  explicit Appender(ELO_ENCODER& encoder) : encoder_(encoder) {}
+enum Marker : uint8_t {
+  kSof0 = 0xC0,
+  kDht = 0xC4,
+  kSoi = 0xD8,
+  kEoi = 0xD9,
+  kSos = 0xDA,
+  kDqt = 0xDB,
+  kDri = 0xDD,
+  kApp0 = 0xE0
+};
 
-  void bytes(const uint8_t* data, int count) {
-    if (!elo_jpeg_enc_reserve(&encoder_, count)) return;
-    ELO_DESTINATION& destination = *encoder_.destination;
-    std::memcpy(destination.buffer + destination.used, data, static_cast<size_t>(count));
-    destination.used += count;
+// One segment under construction; the largest is a DHT of 256 symbols.
+class Segment {
+ public:
+  explicit Segment(Marker marker) {
+    u8(0xFF);
+    u8(marker);
+    u16(0);
   }
-  void byte(int value) {
-    const auto b = static_cast<uint8_t>(value);
-    bytes(&b, 1);
+  void u8(int value) { bytes_[size_++] = static_cast<uint8_t>(value); }
+  void u16(int value) {
+    u8(value >> 8);
+    u8(value);
   }
-  void word(int value) {
-    uint8_t b[2];
-    store_be16(b, static_cast<uint32_t>(value));
-    bytes(b, 2);
+  void copy(const void* data, size_t count) {
+    std::memcpy(bytes_.data() + size_, data, count);
+    size_ += count;
+  }
+  // The length counts itself but not the marker.
+  bool write(ELO_ENCODER& encoder) {
+    pelo::store_be16(bytes_.data() + 2, static_cast<uint32_t>(size_ - 2));
+    return append(*encoder.destination, bytes_.data(), size_);
   }
 
  private:
-  ELO_ENCODER& encoder_;
+  std::array<uint8_t, 2 + 2 + 1 + 16 + 256> bytes_;
+  size_t size_ = 0;
 };
 
-constexpr uint8_t kStart[] = {0xFF, 0xD8, 0xFF, 0xE0, 0x00, 0x10, 'J', 'F', 'I', 'F', 0,
-                              1,    1,    0,    0,    1,    0,    1,   0,   0};
-
-void quant_table(Appender& out, const EncoderQuant& quant, int number) {
-  out.word(0xFFDB);
-  out.word(67);
-  out.byte(number);
-  for (size_t i = 0; i < 64; ++i) out.byte(quant.value[PELOJ_NATURAL_ORDER[i]]);
+bool write_bare(ELO_ENCODER& encoder, Marker marker) {
+  const uint8_t bytes[2] = {0xFF, marker};
+  return append(*encoder.destination, bytes, sizeof bytes);
 }
 
-void frame(Appender& out, const ELO_ENCODER& encoder) {
-  out.word(0xFFC0);
-  out.word(8 + 3 * encoder.componentCount);
-  out.byte(8);
-  out.word(encoder.height);
-  out.word(encoder.width);
-  out.byte(encoder.componentCount);
-  for (int c = 0; c < encoder.componentCount; ++c) {
-    const EncoderComponent& component = encoder.components[static_cast<size_t>(c)];
-    out.byte(component.id);
-    out.byte(component.h << 4 | component.v);
-    out.byte(component.table);
+bool write_app0(ELO_ENCODER& encoder) {
+  Segment app0(kApp0);
+  app0.copy("JFIF", 5);
+  app0.u16(0x0101);  // version 1.1
+  app0.u8(0);        // densities are an aspect ratio: 1 to 1
+  app0.u16(1);
+  app0.u16(1);
+  app0.u16(0);  // no thumbnail
+  return app0.write(encoder);
+}
+
+bool write_app1(ELO_ENCODER& encoder) {
+  const TAVIRPELO_APP1* app1 = encoder.app1;
+  if (app1 == nullptr || app1->data == nullptr || app1->length < 1) return true;
+  return append(*encoder.destination, app1->data, static_cast<size_t>(app1->length));
+}
+
+bool write_dqt(ELO_ENCODER& encoder, uint8_t number) {
+  Segment dqt(kDqt);
+  dqt.u8(number);  // precision 0: eight bits
+  for (int k = 0; k < 64; ++k) dqt.u8(encoder.quant[number].value[PELOJ_NATURAL_ORDER[k]]);
+  return dqt.write(encoder);
+}
+
+// Each table in use once, in the order of first use.
+bool write_quant_tables(ELO_ENCODER& encoder) {
+  uint32_t written = 0;
+  for (size_t i = 0; i < static_cast<size_t>(encoder.componentCount); ++i) {
+    const uint8_t number = encoder.components[i].quantTable;
+    if ((written >> number & 1) != 0) continue;
+    written |= 1u << number;
+    if (!write_dqt(encoder, number)) return false;
   }
+  return true;
 }
 
-void huffman_table(Appender& out, const HuffmanSpec& spec, int classAndNumber) {
-  int symbols = 0;
-  for (const uint8_t count : spec.counts) symbols += count;
-  out.word(0xFFC4);
-  out.word(19 + symbols);
-  out.byte(classAndNumber);
-  out.bytes(spec.counts.data() + 1, 16);
-  out.bytes(spec.symbols.data(), symbols);
-}
-
-void scan(Appender& out, const ELO_ENCODER& encoder) {
-  out.word(0xFFDA);
-  out.word(6 + 2 * encoder.componentCount);
-  out.byte(encoder.componentCount);
-  for (int c = 0; c < encoder.componentCount; ++c) {
-    const EncoderComponent& component = encoder.components[static_cast<size_t>(c)];
-    out.byte(component.id);
-    out.byte(component.table << 4 | component.table);
+bool write_sof0(ELO_ENCODER& encoder) {
+  Segment sof(kSof0);
+  sof.u8(8);  // bits a sample
+  sof.u16(encoder.height);
+  sof.u16(encoder.width);
+  sof.u8(encoder.componentCount);
+  for (size_t i = 0; i < static_cast<size_t>(encoder.componentCount); ++i) {
+    const EncoderComponent& component = encoder.components[i];
+    sof.u8(component.id);
+    sof.u8(component.h << 4 | component.v);
+    sof.u8(component.quantTable);
   }
-  out.byte(0);
-  out.byte(63);
-  out.byte(0);
+  return sof.write(encoder);
+}
+
+bool write_dht(ELO_ENCODER& encoder, const HuffmanSpec& spec, int classAndNumber) {
+  size_t symbols = 0;
+  for (size_t length = 1; length <= 16; ++length) symbols += spec.counts[length];
+  Segment dht(kDht);
+  dht.u8(classAndNumber);
+  dht.copy(spec.counts.data() + 1, 16);
+  dht.copy(spec.symbols.data(), symbols);
+  return dht.write(encoder);
+}
+
+bool write_huffman_tables(ELO_ENCODER& encoder) {
+  const int tables = encoder.componentCount > 1 ? 2 : 1;
+  for (int i = 0; i < tables; ++i) {
+    if (!write_dht(encoder, *encoder.dcSpecs[static_cast<size_t>(i)], i)) return false;
+    if (!write_dht(encoder, *encoder.acSpecs[static_cast<size_t>(i)], 0x10 | i)) return false;
+  }
+  return true;
+}
+
+bool write_dri(ELO_ENCODER& encoder) {
+  if (!encoder.restartPerRow) return true;
+  Segment dri(kDri);
+  dri.u16(encoder.mcusAcross);
+  return dri.write(encoder);
+}
+
+bool write_sos(ELO_ENCODER& encoder) {
+  Segment sos(kSos);
+  sos.u8(encoder.componentCount);
+  for (size_t i = 0; i < static_cast<size_t>(encoder.componentCount); ++i) {
+    const EncoderComponent& component = encoder.components[i];
+    sos.u8(component.id);
+    sos.u8(component.dcTable << 4 | component.acTable);
+  }
+  sos.u8(0);  // the whole spectrum,
+  sos.u8(63);
+  sos.u8(0);  // without approximation
+  return sos.write(encoder);
 }
 
 }  // namespace
 
 int __elo_jpeg_enc_make_header(ELO_ENCODER* encoder) {
-  Appender out(*encoder);
-  out.bytes(kStart, sizeof kStart);
-  const TAVIRPELO_APP1* app1 = encoder->app1;
-  if (app1 != nullptr && app1->data != nullptr && app1->length > 0) out.bytes(app1->data, app1->length);
-  const int tables = encoder->componentCount > 1 ? 2 : 1;
-  for (int i = 0; i < tables; ++i) quant_table(out, encoder->quant[static_cast<size_t>(i)], i);
-  frame(out, *encoder);
-  for (int i = 0; i < tables; ++i) {
-    huffman_table(out, *encoder->dcSpec[static_cast<size_t>(i)], i);
-    huffman_table(out, *encoder->acSpec[static_cast<size_t>(i)], 0x10 + i);
-  }
-  scan(out, *encoder);
-  return !encoder->failed;
+  return write_bare(*encoder, kSoi) && write_app0(*encoder) && write_app1(*encoder) &&
+         write_quant_tables(*encoder) && write_sof0(*encoder) && write_huffman_tables(*encoder) &&
+         write_dri(*encoder) && write_sos(*encoder);
 }
 
 int __elo_jpeg_enc_make_end_mark(ELO_ENCODER* encoder) {
-  Appender(*encoder).word(0xFFD9);
-  return !encoder->failed;
+  return keep_margin(*encoder->destination, 10, 10) && write_bare(*encoder, kEoi) &&
+         finish(*encoder->destination);
 }

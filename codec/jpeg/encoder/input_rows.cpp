@@ -1,120 +1,147 @@
-// One MCU row of samples from the image: colour conversion, or copies of planes. Rows and columns beyond
-// the picture repeat its last ones, so that the output depends on nothing else.
+#include "codec/jpeg/encoder/input_rows.h"
+
 #include <algorithm>
 #include <cstring>
 
 #include "codec/core/ground/byte_order.h"
-#include "codec/jpeg/encoder/encoder.h"
 
-using namespace pelo;
 using namespace pelo::jpeg;
 
+namespace pelo::jpeg {
 namespace {
 
 struct Rgb {
   int r, g, b;
 };
-struct Rgb888 {
-  static constexpr size_t kBytes = 3;
-  static Rgb load(const uint8_t* p) { return {p[0], p[1], p[2]}; }
-};
-struct Rgb565 {
-  static constexpr size_t kBytes = 2;
-  static Rgb load(const uint8_t* p) {
+
+// Pixel layouts.
+struct Rgb565Pixel {
+  static constexpr int kBytes = 2;
+  static Rgb read(const uint8_t* p) {
     const int word = load_le16(p);
     return {word >> 8 & 0xF8, word >> 3 & 0xFC, word << 3 & 0xF8};
   }
 };
+struct Rgb888Pixel {
+  static constexpr int kBytes = 3;
+  static Rgb read(const uint8_t* p) { return {p[0], p[1], p[2]}; }
+};
 
-// BT.601 with 12 fraction bits.
-template <class Pixel>
-void luma_row(const uint8_t* __restrict in, int width, uint8_t* __restrict out) {
-  for (int x = 0; x < width; ++x) {
-    const Rgb p = Pixel::load(in + Pixel::kBytes * static_cast<size_t>(x));
-    out[x] = static_cast<uint8_t>((1225 * p.r + 2404 * p.g + 467 * p.b) >> 12);
-  }
+// ITU-R BT.601 at full range with 12 fraction bits. The chroma offset keeps results within 0..255.
+constexpr uint8_t luma(Rgb c) {
+  return static_cast<uint8_t>((1225 * c.r + 2404 * c.g + 467 * c.b) >> 12);
+}
+constexpr uint8_t chroma_blue(Rgb c) {
+  return static_cast<uint8_t>(((2048 * c.b - 1357 * c.g - 691 * c.r) >> 12) + 128);
+}
+constexpr uint8_t chroma_red(Rgb c) {
+  return static_cast<uint8_t>(((2048 * c.r - 1715 * c.g - 333 * c.b) >> 12) + 128);
 }
 
-// Chroma is that of the upper left pixel of each 2 x 2.
 template <class Pixel>
-void chroma_row(const uint8_t* __restrict in, int count, uint8_t* __restrict cb, uint8_t* __restrict cr) {
+void luma_row(const uint8_t* __restrict pixels, int count, uint8_t* __restrict y) {
+  for (int x = 0; x < count; ++x) y[x] = luma(Pixel::read(pixels + x * Pixel::kBytes));
+}
+
+// Chroma of every other pixel: of each 2 x 2 pixels the top left one counts.
+template <class Pixel>
+void chroma_row(const uint8_t* __restrict pixels, int count, uint8_t* __restrict cb,
+                uint8_t* __restrict cr) {
   for (int x = 0; x < count; ++x) {
-    const Rgb p = Pixel::load(in + 2 * Pixel::kBytes * static_cast<size_t>(x));
-    cb[x] = static_cast<uint8_t>(((2048 * p.b - 1357 * p.g - 691 * p.r) >> 12) + 128);
-    cr[x] = static_cast<uint8_t>(((2048 * p.r - 1715 * p.g - 333 * p.b) >> 12) + 128);
+    const Rgb c = Pixel::read(pixels + 2 * x * Pixel::kBytes);
+    cb[x] = chroma_blue(c);
+    cr[x] = chroma_red(c);
   }
 }
 
-uint8_t* row_of(EncoderComponent& component, int row) {
-  return component.samples.data() + static_cast<size_t>(component.stride) * static_cast<size_t>(row);
+// Rows of the current MCU row that lie in the image.
+int valid_rows(const ELO_ENCODER& encoder, const EncoderComponent& component) {
+  const int first = encoder.row / encoder.mcu_height() * 8 * component.v;
+  return std::clamp(component.height - first, 1, 8 * component.v);
 }
 
-// Repeats the last column to the right, the last of `rows` valid rows downwards.
+// Repeats the last column up to whole blocks, then the last row.
 void pad(EncoderComponent& component, int rows) {
-  for (int y = 0; y < rows; ++y) {
-    uint8_t* row = row_of(component, y);
-    std::memset(row + component.width, row[component.width - 1],
-                static_cast<size_t>(component.stride - component.width));
+  const int extra = component.stride() - component.width;
+  for (int y = 0; extra > 0 && y < rows; ++y) {
+    uint8_t* end = component.row(y) + component.width;
+    std::memset(end, end[-1], static_cast<size_t>(extra));
   }
   for (int y = rows; y < 8 * component.v; ++y) {
-    std::memcpy(row_of(component, y), row_of(component, rows - 1), static_cast<size_t>(component.stride));
+    std::memcpy(component.row(y), component.row(rows - 1), static_cast<size_t>(component.stride()));
   }
-}
-
-// Sample rows of a component that the current MCU row holds.
-int valid_rows(const ELO_ENCODER& encoder, const EncoderComponent& component) {
-  return std::min(8 * component.v, component.height - encoder.mcuRow * 8 * component.v);
 }
 
 template <class Pixel>
-void convert_rows(ELO_ENCODER& encoder, const uint8_t* pixels) {
+void convert_rows(ELO_ENCODER& encoder) {
   auto& [y, cb, cr] = encoder.components;
-  const size_t stride = Pixel::kBytes * static_cast<size_t>(encoder.width);
-  const uint8_t* first = pixels + stride * static_cast<size_t>(encoder.mcuRow) * 16;
+  const ptrdiff_t rowBytes = ptrdiff_t{encoder.width} * Pixel::kBytes;
+  const uint8_t* pixels = encoder.pixels + encoder.row * rowBytes;
   const int rows = valid_rows(encoder, y);
-  for (int r = 0; r < rows; ++r) {
-    const uint8_t* row = first + stride * static_cast<size_t>(r);
-    luma_row<Pixel>(row, encoder.width, row_of(y, r));
-    if (r % 2 == 0) chroma_row<Pixel>(row, cb.width, row_of(cb, r / 2), row_of(cr, r / 2));
+  for (int i = 0; i < rows; ++i, pixels += rowBytes) {
+    luma_row<Pixel>(pixels, y.width, y.row(i));
+    if (i % 2 == 0) chroma_row<Pixel>(pixels, cb.width, cb.row(i / 2), cr.row(i / 2));
   }
   pad(y, rows);
-  pad(cb, (rows + 1) / 2);
-  pad(cr, (rows + 1) / 2);
+  pad(cb, valid_rows(encoder, cb));
+  pad(cr, valid_rows(encoder, cr));
 }
 
-// Planes of a packed picture, moved to the current MCU row.
-void read_planes(ELO_ENCODER& encoder, const uint8_t* pixels) {
-  const uint8_t* planes[3] = {};
-  for (size_t c = 0; c < static_cast<size_t>(encoder.componentCount); ++c) {
-    const EncoderComponent& component = encoder.components[c];
-    const auto width = static_cast<size_t>(component.width);
-    planes[c] = pixels + width * static_cast<size_t>(encoder.mcuRow * 8 * component.v);
-    pixels += width * static_cast<size_t>(component.height);
+bool is_420(const ELO_ENCODER& encoder) {
+  const auto& [y, cb, cr] = encoder.components;
+  return encoder.componentCount == 3 && y.h == 2 && y.v == 2 && cb.h == 1 && cb.v == 1 && cr.h == 1 &&
+         cr.v == 1;
+}
+
+// Where the current MCU row starts in each plane of the image.
+void read_planes(ELO_ENCODER& encoder) {
+  std::array<const uint8_t*, kEncoderComponents> planes{};
+  const uint8_t* plane = encoder.pixels;
+  for (size_t i = 0; i < static_cast<size_t>(encoder.componentCount); ++i) {
+    const EncoderComponent& component = encoder.components[i];
+    const int first = encoder.row / encoder.mcu_height() * 8 * component.v;
+    planes[i] = plane + static_cast<ptrdiff_t>(first) * component.width;
+    plane += static_cast<ptrdiff_t>(component.height) * component.width;
   }
-  __elo_jpeg_enc_get_raw_data(&encoder, planes, 8 * encoder.vMax);
+  __elo_jpeg_enc_get_raw_data(&encoder, planes.data());
 }
 
 }  // namespace
 
-void __elo_jpeg_enc_get_raw_data(ELO_ENCODER* encoder, const uint8_t* const* planes, int rowsAvailable) {
-  for (size_t c = 0; c < static_cast<size_t>(encoder->componentCount); ++c) {
-    EncoderComponent& component = encoder->components[c];
-    const int available = rowsAvailable * component.v / encoder->vMax;
-    const int rows = std::min(valid_rows(*encoder, component), available);
-    const auto width = static_cast<size_t>(component.width);
-    for (int y = 0; y < rows; ++y) {
-      std::memcpy(row_of(component, y), planes[c] + width * static_cast<size_t>(y), width);
-    }
-    pad(component, rows);
+bool takes_planes(const ELO_ENCODER& encoder) {
+  return encoder.componentCount == 1 || is_420(encoder);
+}
+
+bool read_input_rows(ELO_ENCODER& encoder) {
+  if (encoder.pixels == nullptr || !takes_planes(encoder)) return false;
+  switch (encoder.format) {
+    case TAVIRPELO_RGB565:
+      if (!is_420(encoder)) return false;
+      convert_rows<Rgb565Pixel>(encoder);
+      return true;
+    case TAVIRPELO_RGB888:
+      if (!is_420(encoder)) return false;
+      convert_rows<Rgb888Pixel>(encoder);
+      return true;
+    case TAVIRPELO_GREY8:
+      if (encoder.componentCount != 1) return false;
+      [[fallthrough]];
+    default:
+      read_planes(encoder);
+      return true;
   }
 }
 
-int __elo_jpeg_enc_process_image_data(ELO_ENCODER* encoder, const void* pixels) {
-  const auto* bytes = static_cast<const uint8_t*>(pixels);
-  switch (encoder->format) {
-    case TAVIRPELO_RGB565: convert_rows<Rgb565>(*encoder, bytes); break;
-    case TAVIRPELO_RGB888: convert_rows<Rgb888>(*encoder, bytes); break;
-    default: read_planes(*encoder, bytes); break;
+}  // namespace pelo::jpeg
+
+void __elo_jpeg_enc_get_raw_data(ELO_ENCODER* encoder, const uint8_t* const* planes) {
+  for (size_t i = 0; i < static_cast<size_t>(encoder->componentCount); ++i) {
+    EncoderComponent& component = encoder->components[i];
+    const auto width = static_cast<size_t>(component.width);
+    const int rows = valid_rows(*encoder, component);
+    for (int y = 0; y < rows; ++y) {
+      std::memcpy(component.row(y), planes[i] + static_cast<size_t>(y) * width, width);
+    }
+    pad(component, rows);
   }
-  return __elo_jpeg_enc_compress_data(encoder);
 }

@@ -1,41 +1,56 @@
-// The blocks of one MCU row: transformed, padded with dummies at the picture's edges, coded.
+// One MCU row: samples in, blocks transformed and completed by dummies, MCUs coded.
 #include "codec/jpeg/encoder/encoder.h"
+#include "codec/jpeg/encoder/input_rows.h"
 
 using namespace pelo::jpeg;
 
 namespace {
 
-// Blocks of one component in one MCU: inside the picture they are transformed; a dummy at the right
-// repeats the DC of the block to its left, one below that of the block above.
-void code_component(ELO_ENCODER& encoder, int index, int mcu) {
-  const EncoderComponent& component = encoder.components[static_cast<size_t>(index)];
-  int32_t blocks[4][64];
+// A block outside the image: no detail, and the DC of a neighbour, which costs the fewest bits.
+void make_dummy(CoefficientBlock& block, const CoefficientBlock& neighbour) {
+  const int32_t dc = neighbour[0];
+  block = {};
+  block[0] = dc;
+}
+
+// The blocks of one component in the MCU at column `mcu` of the current row. Returns the next free
+// block.
+CoefficientBlock* make_blocks(ELO_ENCODER& encoder, EncoderComponent& component, int mcu,
+                              CoefficientBlock* out) {
+  const QuantiseTable& table = encoder.quant[component.quantTable];
+  const int top = encoder.row / encoder.mcu_height() * component.v;
   for (int y = 0; y < component.v; ++y) {
-    for (int x = 0; x < component.h; ++x) {
-      int32_t(&block)[64] = blocks[2 * y + x];
+    for (int x = 0; x < component.h; ++x, ++out) {
       const int column = mcu * component.h + x;
-      if (encoder.mcuRow * component.v + y >= component.blocksHigh) {
-        for (int32_t& value : block) value = 0;
-        block[0] = blocks[2 * (y - 1) + x][0];
+      if (top + y >= component.blocksHigh) {
+        make_dummy(*out, *(out - component.h));
       } else if (column >= component.blocksWide) {
-        for (int32_t& value : block) value = 0;
-        block[0] = blocks[2 * y + x - 1][0];
+        make_dummy(*out, *(out - 1));
       } else {
-        const ptrdiff_t offset = static_cast<ptrdiff_t>(component.stride) * 8 * y + 8 * column;
-        __elo_jpeg_enc_do_forward_dct(&encoder.quant[static_cast<size_t>(component.table)],
-                                      component.samples.data() + offset, component.stride, block);
+        __elo_jpeg_enc_do_forward_dct(component.row(8 * y) + 8 * column, component.stride(), &table,
+                                      out->data());
       }
-      __elo_jpeg_enc_encode_1mcu_blk(&encoder, index, block);
     }
   }
+  return out;
 }
 
 }  // namespace
 
 int __elo_jpeg_enc_compress_data(ELO_ENCODER* encoder) {
-  for (int mcu = 0; mcu < encoder->mcusWide && !encoder->failed; ++mcu) {
-    for (int c = 0; c < encoder->componentCount; ++c) code_component(*encoder, c, mcu);
+  alignas(16) std::array<CoefficientBlock, kEncoderMcuBlocks> blocks;
+  for (int mcu = 0; mcu < encoder->mcusAcross; ++mcu) {
+    CoefficientBlock* next = blocks.data();
+    for (size_t i = 0; i < static_cast<size_t>(encoder->componentCount); ++i) {
+      next = make_blocks(*encoder, encoder->components[i], mcu, next);
+    }
+    if (!__elo_jpeg_enc_encode_1mcu_blk(encoder, blocks.data())) return 0;
   }
-  ++encoder->mcuRow;
-  return !encoder->failed;
+  encoder->row += encoder->mcu_height();
+  return 1;
+}
+
+int __elo_jpeg_enc_process_image_data(ELO_ENCODER* encoder) {
+  return encoder->row < encoder->height && read_input_rows(*encoder) &&
+         __elo_jpeg_enc_compress_data(encoder);
 }

@@ -1,0 +1,53 @@
+// Where encoded bytes go: a memory block that grows, or a file behind a working buffer.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
+
+#include "tavirpelo/api.h"
+
+enum ELO_DESTINATION_KIND { ELO_TO_FILE = 0, ELO_TO_MEMORY = 1 };
+
+// Belongs to the caller, who also releases the buffer of a memory destination. An encoder appends to it
+// and replaces the buffer when it must grow.
+struct ELO_DESTINATION {
+  int kind;
+  int capacity;     // bytes of the working buffer
+  int used;         // bytes in it
+  int total;        // bytes produced; memory: known when the image has ended
+  FILE* file;       // file kind only
+  uint8_t* buffer;  // memory: from the codec's allocator; file: made by the first append
+};
+
+// The block moved into one `extra` bytes larger; null, with the old block untouched, when memory is
+// short or the new size exceeds an int.
+TAVIRPELO_API uint8_t* elo_jpeg_enc_realloc(uint8_t* old, int oldSize, int extra);
+
+// Takes the reason of a failure; keeps none.
+TAVIRPELO_API void elo_SetError(int code);
+
+namespace pelo::jpeg {
+
+constexpr int kDestinationStep = 4096;  // growth of a memory block, size of a file's working buffer
+
+// Reasons given to elo_SetError.
+constexpr int kErrorMemory = 3;
+constexpr int kErrorFormat = 6;
+constexpr int kErrorSampling = 7;
+constexpr int kErrorSize = 14;
+
+// Appends `count` bytes, growing or flushing as often as needed: the only way into the buffer.
+[[nodiscard]] bool append(ELO_DESTINATION& destination, const uint8_t* bytes, size_t count);
+
+// Makes room ahead of need: when no more than `margin` bytes are free, a memory block grows by `step`
+// bytes and a file's buffer is flushed.
+[[nodiscard]] bool keep_margin(ELO_DESTINATION& destination, int margin, int step);
+
+// Settles `total`, and writes what a file's working buffer still holds.
+[[nodiscard]] bool finish(ELO_DESTINATION& destination);
+
+// Frees the buffer and empties the record.
+void discard(ELO_DESTINATION& destination);
+
+}  // namespace pelo::jpeg

@@ -1,0 +1,31 @@
+// Quantisation tables for writing: from a quality, and the reciprocals by which coefficients are
+// divided.
+#pragma once
+
+#include <array>
+#include <cstdint>
+
+#include "tavirpelo/api.h"
+
+struct ELO_ENCODER;
+
+namespace pelo::jpeg {
+
+struct QuantiseTable {
+  std::array<uint8_t, 64> value;        // natural order, as the DQT segment carries it
+  std::array<uint32_t, 64> reciprocal;  // 65536 / divisor of the scaled transform; 0 for a zero value
+  // The reciprocal in two parts for 16-bit arithmetic: reciprocal = 65536 * (upper & 1) + lower, with
+  // lower read as signed and upper 0 or -1. Divisors 1 and 2 are those that need the upper part.
+  alignas(16) std::array<int16_t, 64> lower;
+  alignas(16) std::array<int16_t, 64> upper;
+};
+
+}  // namespace pelo::jpeg
+
+// Installs tables 0 and 1 for a quality, clamped to 1..100: the Annex K tables scaled to
+// 5000 / quality percent below 50, 200 - 2 * quality from there.
+TAVIRPELO_API void __elo_jpeg_enc_set_quality(ELO_ENCODER* encoder, int quality);
+
+// Installs the 64 values (natural order) of table `number` (0 to 3).
+TAVIRPELO_API void __elo_jpeg_enc_set_quant_table(ELO_ENCODER* encoder, int number,
+                                                  const uint8_t* values);

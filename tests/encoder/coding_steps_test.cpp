@@ -1,0 +1,264 @@
+// The encoder's single steps on blocks and parameters that pixels alone do not reach.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstdlib>
+#include <random>
+
+#include "codec/core/ground/byte_order.h"
+#include "codec/jpeg/encoder/encoder.h"
+#include "tests/support/jpeg_samples.h"
+
+namespace tests {
+namespace {
+
+using namespace pelo::jpeg;
+
+// An encoder without pixels that takes blocks; its stream is read when it ends.
+class BlockEncoder {
+ public:
+  BlockEncoder(uint32_t width, uint32_t height, uint32_t format, const CodingParameters* parameters) {
+    const TAVIRPELO_RAWINFO image{width, height, nullptr, format};
+    const TAVIRPELO_ENCOPTION options{100, nullptr, 0};
+    encoder_ = elo_jpeg_enc_mcu_init(&image, &destination_, &options, parameters);
+  }
+  ~BlockEncoder() {
+    if (encoder_ != nullptr) elo_jpeg_enc_mcu_finish(encoder_, nullptr, nullptr);
+    TAVIRPELO_OsFree(destination_.buffer);
+  }
+  ELO_ENCODER* get() { return encoder_; }
+  Bytes finish() {
+    uint8_t* buffer = nullptr;
+    int size = 0;
+    const int done = elo_jpeg_enc_mcu_finish(std::exchange(encoder_, nullptr), &buffer, &size);
+    return done ? Bytes(buffer, buffer + size) : Bytes();
+  }
+
+ private:
+  ELO_DESTINATION destination_{ELO_TO_MEMORY, 0, 0, 0, nullptr, nullptr};
+  ELO_ENCODER* encoder_ = nullptr;
+};
+
+// Where the segment of a marker starts, from `from` on; the stream's size when there is none.
+size_t find_marker(const Bytes& jpeg, int marker, size_t from = 2) {
+  for (size_t at = from; at + 4 <= jpeg.size() && jpeg[at] == 0xFF && jpeg[at + 1] != 0xDA;
+       at += 2u + pelo::load_be16(&jpeg[at + 2])) {
+    if (jpeg[at + 1] == marker) return at;
+  }
+  return jpeg.size();
+}
+
+TEST(ForwardDct, EqualsTheReciprocalFormulaAtEveryQuality) {
+  std::mt19937 random(5);
+  ELO_ENCODER encoder{}, unit{};
+  // All divisors 1: the transform's own outputs.
+  unit.quant[0].reciprocal.fill(65536);
+  unit.quant[0].upper.fill(-1);
+  for (int quality = 1; quality <= 100; ++quality) {
+    __elo_jpeg_enc_set_quality(&encoder, quality);
+    std::array<uint8_t, 64> samples;
+    for (uint8_t& s : samples) s = static_cast<uint8_t>(quality % 2 ? random() : random() % 2 * 255);
+    CoefficientBlock raw, quantised;
+    __elo_jpeg_enc_do_forward_dct(samples.data(), 8, &unit.quant[0], raw.data());
+    for (const QuantiseTable& table : {encoder.quant[0], encoder.quant[1]}) {
+      __elo_jpeg_enc_do_forward_dct(samples.data(), 8, &table, quantised.data());
+      for (size_t i = 0; i < 64; ++i) {
+        const int64_t divisor = (table.value[i] * int64_t{kAanScale[i]} + 1024) / 2048;
+        const int64_t product = raw[i] * (65536 / divisor);
+        ASSERT_EQ((product + (raw[i] < 0 ? 32768 : 0)) >> 16, quantised[i]) << quality << " " << i;
+      }
+    }
+  }
+}
+
+TEST(ForwardDct, ZeroQuantiserGivesZeroCoefficients) {
+  ELO_ENCODER encoder{};
+  const std::array<uint8_t, 64> none{};
+  __elo_jpeg_enc_set_quant_table(&encoder, 3, none.data());
+  CoefficientBlock block;
+  __elo_jpeg_enc_do_forward_dct(sample_pixels(8, 8).data(), 8, &encoder.quant[3], block.data());
+  EXPECT_TRUE(std::all_of(block.begin(), block.end(), [](int32_t c) { return c == 0; }));
+}
+
+TEST(Blocks, LastPositionIsNeverCodedAndTheBlockStaysAsItWas) {
+  CoefficientBlock block{};
+  block[0] = 5;
+  const CoefficientBlock plain = block;
+  block[63] = 77;
+  const CoefficientBlock before = block;
+  BlockEncoder with(8, 8, TAVIRPELO_GREY8, nullptr), without(8, 8, TAVIRPELO_GREY8, nullptr);
+  ASSERT_EQ(1, __elo_jpeg_enc_encode_1mcu_blk(with.get(), &block));
+  ASSERT_EQ(1, __elo_jpeg_enc_encode_1mcu_blk(without.get(), &plain));
+  EXPECT_EQ(before, block);
+  EXPECT_EQ(without.finish(), with.finish());
+}
+
+// Ten blocks of the costliest values fill several times the margin that is kept free.
+TEST(Blocks, CostliestMcusNeverOverrunTheBuffer) {
+  constexpr CodingParameters kTenBlocks{3, {{{0, 2, 2}, {1, 2, 2}, {1, 1, 2}}}, {}, false};
+  BlockEncoder encoder(4999, 16, TAVIRPELO_YUV420, &kTenBlocks);
+  ASSERT_NE(nullptr, encoder.get());
+  ASSERT_EQ(10, encoder.get()->mcuBlocks);
+  std::array<CoefficientBlock, kEncoderMcuBlocks> blocks;
+  for (int mcu = 0; mcu < 200; ++mcu) {
+    for (CoefficientBlock& block : blocks) block.fill(mcu % 2 == 0 ? 1023 : -1023);
+    ASSERT_EQ(1, __elo_jpeg_enc_encode_1mcu_blk(encoder.get(), blocks.data()));
+  }
+  EXPECT_GT(encoder.finish().size(), 200u * 10 * 190);
+}
+
+// Streams are coded in turn by exchanging destination and entropy state.
+TEST(Blocks, StreamsInTurnEqualStreamsOneAfterAnother) {
+  BlockEncoder encoder(8, 8, TAVIRPELO_GREY8, nullptr);
+  std::array<ELO_DESTINATION, 2> streams{};
+  std::array<EntropyCoderState, 2> states{};
+  std::array<Bytes, 2> single;
+  ELO_DESTINATION* const own = encoder.get()->destination;
+  const auto block_of = [](int stream, int i) {
+    CoefficientBlock block{};
+    for (int k = 0; k < 64; k += 1 + stream)
+      block[static_cast<size_t>(k)] = (k * 37 + i * 11 + stream) % 63 - 31;
+    return block;
+  };
+  for (size_t s = 0; s < 2; ++s) streams[s].kind = ELO_TO_MEMORY;
+  for (int i = 0; i < 40; ++i) {
+    for (size_t s = 0; s < 2; ++s) {
+      const CoefficientBlock block = block_of(static_cast<int>(s), i);
+      encoder.get()->destination = &streams[s];
+      encoder.get()->entropy = states[s];
+      ASSERT_EQ(1, __elo_jpeg_enc_encode_1mcu_blk(encoder.get(), &block));
+      states[s] = encoder.get()->entropy;
+    }
+  }
+  for (size_t s = 0; s < 2; ++s) {
+    encoder.get()->destination = &streams[s];
+    encoder.get()->entropy = states[s];
+    ASSERT_EQ(1, __elo_jpeg_enc_finish_compression(encoder.get()));
+    ELO_DESTINATION alone{ELO_TO_MEMORY, 0, 0, 0, nullptr, nullptr};
+    encoder.get()->destination = &alone;
+    for (int i = 0; i < 40; ++i) {
+      const CoefficientBlock block = block_of(static_cast<int>(s), i);
+      ASSERT_EQ(1, __elo_jpeg_enc_encode_1mcu_blk(encoder.get(), &block));
+    }
+    ASSERT_EQ(1, __elo_jpeg_enc_finish_compression(encoder.get()));
+    EXPECT_EQ(Bytes(alone.buffer, alone.buffer + alone.used),
+              Bytes(streams[s].buffer, streams[s].buffer + streams[s].used));
+    discard(alone);
+    discard(streams[s]);
+  }
+  encoder.get()->destination = own;
+}
+
+// The stream's entropy-coded data.
+Bytes encode_scan(uint32_t width, uint32_t height, uint32_t format, Bytes pixels) {
+  const TAVIRPELO_RAWINFO raw{width, height, pixels.data(), format};
+  int size = 1024;
+  auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(1024));
+  if (!TAVIRPELO_EncodeJpegToBuffer(&raw, &buffer, &size, 95)) return {};
+  Bytes scan(buffer + (format == TAVIRPELO_GREY8 ? 328 : 623), buffer + size);
+  TAVIRPELO_OsFree(buffer);
+  return scan;
+}
+
+// Partly covered blocks code as those of a picture whose last column and row are drawn on.
+TEST(Edges, RepeatTheLastColumnAndRow) {
+  struct Case {
+    uint32_t format;
+    int pixelBytes;
+  };
+  for (const Case c : {Case{TAVIRPELO_RGB565, 2}, {TAVIRPELO_RGB888, 3}, {TAVIRPELO_GREY8, 1}}) {
+    const int width = 17, height = 9, wide = 24, high = 16;
+    const Bytes small = sample_pixels(width, height);
+    Bytes large;
+    for (int y = 0; y < high; ++y) {
+      for (int x = 0; x < wide; ++x) {
+        const int at = (std::min(y, height - 1) * width + std::min(x, width - 1)) * c.pixelBytes;
+        large.insert(large.end(), small.begin() + at, small.begin() + at + c.pixelBytes);
+      }
+    }
+    EXPECT_EQ(encode_scan(24, 16, c.format, large), encode_scan(17, 9, c.format, small)) << c.format;
+  }
+}
+
+TEST(Parameters, OfAnotherPictureReachTheHeaders) {
+  CodingParameters parameters{3, {{{2, 2, 1}, {3, 1, 1}, {2, 1, 1}}}, {}, true};
+  for (size_t t = 0; t < kQuantTables; ++t) parameters.quant[t].fill(static_cast<uint8_t>(t + 1));
+  BlockEncoder encoder(33, 9, TAVIRPELO_YUV420, &parameters);
+  const Bytes jpeg = encoder.finish();
+  const size_t first = find_marker(jpeg, 0xDB), second = find_marker(jpeg, 0xDB, first + 69);
+  ASSERT_LT(second, jpeg.size());
+  EXPECT_EQ(2, jpeg[first + 4]);
+  EXPECT_EQ(3, jpeg[first + 5]);
+  EXPECT_EQ(3, jpeg[second + 4]);
+  EXPECT_EQ(jpeg.size(), find_marker(jpeg, 0xDB, second + 69));
+  const size_t frame = find_marker(jpeg, 0xC0);
+  EXPECT_EQ((Bytes{1, 0x21, 2, 2, 0x11, 3, 3, 0x11, 2}), Bytes(&jpeg[frame + 10], &jpeg[frame + 19]));
+  const size_t restart = find_marker(jpeg, 0xDD);
+  ASSERT_LT(restart, jpeg.size());
+  EXPECT_EQ(3, pelo::load_be16(&jpeg[restart + 4]));  // MCUs of 16 pixels in 33
+}
+
+TEST(Parameters, BeyondBaselineAreRefused) {
+  const auto refused = [](const CodingParameters& parameters) {
+    return BlockEncoder(8, 8, TAVIRPELO_YUV420, &parameters).get() == nullptr;
+  };
+  EXPECT_TRUE(refused({4, {}, {}, false}));
+  EXPECT_TRUE(refused({0, {}, {}, false}));
+  EXPECT_TRUE(refused({3, {{{0, 3, 1}, {1, 1, 1}, {1, 1, 1}}}, {}, false}));
+  EXPECT_TRUE(refused({3, {{{0, 2, 0}, {1, 1, 1}, {1, 1, 1}}}, {}, false}));
+  EXPECT_TRUE(refused({3, {{{4, 2, 2}, {1, 1, 1}, {1, 1, 1}}}, {}, false}));
+  EXPECT_TRUE(refused({3, {{{0, 2, 2}, {1, 2, 2}, {1, 2, 2}}}, {}, false}));  // 12 blocks
+}
+
+#ifdef TAVIR_HAVE_LIBJPEG
+TEST(Blocks, ValuesBeyondTheTablesAreClampedNotMiscoded) {
+  BlockEncoder encoder(24, 8, TAVIRPELO_GREY8, nullptr);
+  std::array<CoefficientBlock, 3> blocks{};
+  blocks[0][0] = INT32_MAX;
+  blocks[1][0] = INT32_MIN;
+  for (size_t i = 1; i < 63; ++i) {
+    blocks[0][i] = i % 2 ? INT32_MAX : INT32_MIN;
+    blocks[1][i] = i % 3 ? 0 : 1024;
+    blocks[2][i] = static_cast<int32_t>(i) - 31;
+  }
+  for (const CoefficientBlock& block : blocks) {
+    ASSERT_EQ(1, __elo_jpeg_enc_encode_1mcu_blk(encoder.get(), &block));
+  }
+  const auto planes = read_coefficients(encoder.finish());
+  for (size_t b = 0; b < 3; ++b) {
+    for (size_t i = 0; i < 63; ++i) {
+      const int32_t low = i == 0 ? -1024 : -1023;
+      ASSERT_EQ(std::clamp(blocks[b][i], low, 1023), planes[0].coefficients[64 * b + i])
+          << b << " " << i;
+    }
+  }
+}
+
+// Where the picture ends inside an MCU, the missing blocks hold no detail and a neighbour's DC. A frame
+// header that claims whole MCUs makes them visible.
+TEST(Blocks, DummiesTakeTheDcOfTheirOwnNeighbour) {
+  Bytes pixels = sample_pixels(40, 24);
+  const TAVIRPELO_RAWINFO raw{40, 24, pixels.data(), TAVIRPELO_RGB888};
+  int size = 1024;
+  auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(1024));
+  ASSERT_EQ(1, TAVIRPELO_EncodeJpegToBuffer(&raw, &buffer, &size, 90));
+  Bytes jpeg(buffer, buffer + size);
+  TAVIRPELO_OsFree(buffer);
+  const size_t frame = find_marker(jpeg, 0xC0);
+  pelo::store_be16(&jpeg[frame + 5], 32);
+  pelo::store_be16(&jpeg[frame + 7], 48);
+  const Plane luma = read_coefficients(jpeg)[0];
+  ASSERT_TRUE(luma.blocksWide == 6 && luma.blocksHigh == 4);
+  const auto block = [&](int x, int y) { return luma.coefficients.begin() + 64 * (6 * y + x); };
+  const auto expect_dummy = [&](int x, int y, int dc) {
+    EXPECT_EQ(dc, *block(x, y)) << x << " " << y;
+    EXPECT_TRUE(std::all_of(block(x, y) + 1, block(x, y) + 64, [](int c) { return c == 0; }));
+  };
+  for (int y = 0; y < 3; ++y) expect_dummy(5, y, *block(4, y));
+  for (int x = 0; x < 6; ++x) expect_dummy(x, 3, *block(x, 2));
+  EXPECT_NE(*block(0, 2), *block(1, 2));  // a coder that repeats one neighbour would be seen
+}
+#endif
+
+}  // namespace
+}  // namespace tests
