@@ -2,64 +2,78 @@
 
 #include <algorithm>
 
-#include "slideshow/container_format.h"
 #include "slideshow/container_session.h"
 
 namespace pelo::slideshow {
-namespace {
 
-int64_t data_offset(const subfileInfo& entry) {
-  return int64_t{entry.offset} + kSubfileHeaderSize;
+void DataShift::add(int64_t from, int64_t to, int64_t size) {
+  runs_[runCount_++] = {from, to, size};
 }
 
-int64_t data_size(const subfileInfo& entry) {
-  return int64_t{entry.size} - kSubfileHeaderSize;
+int64_t DataShift::piece_size() const {
+  return std::min(piece_, runs_[run_].size - done_);
 }
 
-}  // namespace
-
-bool DataShift::up(SlideShow& show, int first, int64_t distance) {
-  distance_ = distance;
-  moved_ = show.subfileCount;
-  if (first >= moved_) return true;
-
+bool DataShift::forth(SlideShow& show, int64_t piece, int tries) {
+  if (moved_all()) return true;
   int64_t largest = 0;
-  for (int i = first; i < moved_; ++i) largest = std::max(largest, data_size(show.subfiles[i]));
-  buffer_ = vss_bytes(largest);
+  for (int i = 0; i < runCount_; ++i) largest = std::max(largest, runs_[i].size);
+  piece_ = std::min(piece, largest);
+  buffer_ = vss_bytes(piece_);
   if (buffer_ == nullptr) return false;
 
-  ContainerSession session(show, "r+b");
-  while (moved_ > first && move_up(session, show.subfiles[moved_ - 1])) --moved_;
-  return session.close() && moved_ == first;
+  for (int failures = 0; failures < tries; ++failures) {
+    ContainerSession session(show, "r+b");
+    while (!moved_all() && move_piece(session)) failures = 0;
+    if (session.close() && moved_all()) return true;
+  }
+  return false;
 }
 
-// Flushed while the copy is still at hand: a full disk shows here, not at the next seek.
-bool DataShift::move_up(ContainerSession& session, const subfileInfo& entry) {
-  session.seek(data_offset(entry) - distance_);
-  if (!session.read(buffer_.get(), data_size(entry))) return false;
-  session.seek(data_offset(entry));
-  held_ = true;
-  session.write(buffer_.get(), data_size(entry));
-  held_ = !session.flush();
-  return !held_;
+// Flushed while the piece is still at hand: a full disk shows here, not at the next seek.
+bool DataShift::move_piece(ContainerSession& session) {
+  const Run& run = runs_[run_];
+  const int64_t size = piece_size();
+  if (!held_) {
+    session.seek(run.from + done_);
+    held_ = session.read(buffer_.get(), size);
+  }
+  session.seek(run.to + done_);
+  session.write(buffer_.get(), size);
+  if (!session.flush()) return false;
+  held_ = false;
+  done_ += size;
+  if (done_ == run.size) {
+    ++run_;
+    done_ = 0;
+  }
+  return true;
 }
 
 void DataShift::back(SlideShow& show) {
   if (buffer_ == nullptr) return;
-  ContainerSession session(show, "r+b");
-  if (held_) {
-    const subfileInfo& entry = show.subfiles[moved_ - 1];
-    session.seek(data_offset(entry) - distance_);
-    held_ = !session.write(buffer_.get(), data_size(entry));
+  if (held_) return_piece(show);
+  while (run_ > 0 || done_ > 0) {
+    step_back();
+    return_piece(show);
   }
-  while (moved_ < show.subfileCount && move_back(session, show.subfiles[moved_])) ++moved_;
 }
 
-bool DataShift::move_back(ContainerSession& session, const subfileInfo& entry) {
-  session.seek(data_offset(entry));
-  session.read(buffer_.get(), data_size(entry));
-  session.seek(data_offset(entry) - distance_);
-  return session.write(buffer_.get(), data_size(entry));
+void DataShift::step_back() {
+  if (done_ == 0) done_ = runs_[--run_].size;
+  done_ = (done_ - 1) / piece_ * piece_;
+}
+
+void DataShift::return_piece(SlideShow& show) {
+  ContainerSession session(show, "r+b");
+  const Run& run = runs_[run_];
+  if (!held_) {
+    session.seek(run.to + done_);
+    session.read(buffer_.get(), piece_size());
+  }
+  session.seek(run.from + done_);
+  session.write(buffer_.get(), piece_size());
+  held_ = false;
 }
 
 }  // namespace pelo::slideshow

@@ -1,4 +1,4 @@
-// Moves the JPEG data of a container's later pictures up to make room in front of them, and back again.
+// Moves runs of bytes to another place in a container, and back again.
 #pragma once
 
 #include <cstdint>
@@ -12,23 +12,40 @@ class ContainerSession;
 
 class DataShift {
  public:
-  // Moves the data of the pictures from `first` on by `distance` bytes to the offsets that the table
-  // holds already. Only data moves: the pictures' headers are to be written after. Goes from the last
-  // picture down, so that nothing is overwritten before it was read. True when all arrived.
-  [[nodiscard]] bool up(SlideShow& show, int first, int64_t distance);
+  // Plans one more run, one a picture at the most. In the order of add() no run's new place may cover a
+  // run that is still to be moved; a run that overlaps its own new place and is longer than a piece must
+  // move down.
+  void add(int64_t from, int64_t to, int64_t size);
 
-  // Undoes up(), however far it came; the table still holds the upper offsets. Needs no memory.
+  // Moves the runs, at most `piece` bytes at a time through one buffer of that size. Each step is tried
+  // `tries` times before the whole is given up. True when all arrived; without memory nothing moves.
+  [[nodiscard]] bool forth(SlideShow& show, int64_t piece, int tries);
+
+  // Undoes forth(), however far it came, as long as the file was not cut since. Needs no memory; each
+  // piece is tried even when another fails.
   void back(SlideShow& show);
 
  private:
-  bool move_up(ContainerSession& session, const subfileInfo& entry);
-  bool move_back(ContainerSession& session, const subfileInfo& entry);
+  struct Run {
+    int64_t from;
+    int64_t to;
+    int64_t size;
+  };
 
-  VssBytes buffer_;       // room for the largest picture's data
-  int64_t distance_ = 0;  // bytes
-  int moved_ = 0;         // pictures from here on lie at their new place
-  // buffer_ holds the only whole copy of the data of picture moved_ - 1: its write was begun, and the
-  // new place may overlap the old one.
+  bool moved_all() const { return run_ == runCount_; }
+  int64_t piece_size() const;
+  bool move_piece(ContainerSession& session);
+  void step_back();
+  void return_piece(SlideShow& show);
+
+  Run runs_[SlideShow::kMaxFileSubfiles] = {};
+  int runCount_ = 0;
+  int64_t piece_ = 0;  // bytes
+  VssBytes buffer_;    // room for a piece
+  int run_ = 0;        // the next piece belongs to this run
+  int64_t done_ = 0;   // bytes of it that have moved
+  // buffer_ holds the only whole copy of the next piece: its write was begun, and the new place may
+  // overlap the old one.
   bool held_ = false;
 };
 

@@ -1,10 +1,7 @@
 #include "slideshow/store_picture.h"
 
-#include <algorithm>
-#include <climits>
 #include <cstdint>
 
-#include "slideshow/container_format.h"
 #include "slideshow/container_undo.h"
 #include "slideshow/data_shift.h"
 #include "slideshow/subfile_table.h"
@@ -44,17 +41,13 @@ bool read_picture(const SlideShow& show, const PictureSource& source, const char
   return open.good() && make_picture(show, source, name, flag, entry, jpeg);
 }
 
-// An edit appends two end marks; every offset in the file stays within 31 bits.
-bool file_stays_small(const SlideShow& show, int64_t fileLength, int64_t added) {
-  return std::max(fileLength, data_end(show) + added) + 2 * kEndMarkSize <= INT_MAX;
-}
-
 // The container's side, once the table holds the new picture. The mark behind the header keeps the
 // file's end valid while the picture is written; at the end of the data the picture covers every older
 // mark, and the last mark closes the file again.
 bool write_picture(SlideShow& show, DataShift& shift, int position, const uint8_t* jpeg) {
   const bool last = position == show.subfileCount - 1;
-  return shift.up(show, position + 1, show.subfiles[position].size) && show.writeVssHeader("r+b") == 1 &&
+  plan_data_up(shift, show, position + 1, show.subfiles[position].size);
+  return shift.forth(show, INT64_MAX, 1) && show.writeVssHeader("r+b") == 1 &&
          show.writeEndMark() == 1 && show.writeSubfile(position, jpeg) == 1 &&
          (last || show.writeSubfileHeader() == 1) && show.writeEndMark() == 1;
 }

@@ -1,8 +1,10 @@
 #include "slideshow/subfile_table.h"
 
 #include <algorithm>
+#include <climits>
 
 #include "slideshow/container_format.h"
+#include "slideshow/data_shift.h"
 
 namespace pelo::slideshow {
 
@@ -21,6 +23,10 @@ int64_t data_end(const SlideShow& show) {
   if (show.subfileCount == 0) return int64_t{show.musicSize} + kHeaderSize;
   const subfileInfo& last = show.subfiles[show.subfileCount - 1];
   return int64_t{last.offset} + last.size;
+}
+
+bool file_stays_small(const SlideShow& show, int64_t fileLength, int64_t added) {
+  return std::max(fileLength, data_end(show) + added) + 2 * kEndMarkSize <= INT_MAX;
 }
 
 // In memory mode the offsets mean nothing, and the size of the music may make them wrap.
@@ -48,6 +54,13 @@ void erase_entry(SlideShow& show, int position) {
   show.subfiles[show.subfileCount] = subfileInfo{};
   if (show.mode == SlideShow::kFileMode) show.subfileOffsets[show.subfileCount] = 0;
   place_subfiles(show, position);
+}
+
+void plan_data_up(DataShift& shift, const SlideShow& show, int first, int64_t distance) {
+  for (int i = show.subfileCount - 1; i >= first; --i) {
+    const int64_t to = int64_t{show.subfiles[i].offset} + kSubfileHeaderSize;
+    shift.add(to - distance, to, int64_t{show.subfiles[i].size} - kSubfileHeaderSize);
+  }
 }
 
 }  // namespace pelo::slideshow

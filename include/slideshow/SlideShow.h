@@ -6,7 +6,7 @@
 // file: it notes up to 1024 pictures, which are decoded from their source each time.
 //
 // One caller at a time; no locks, no logging. A file that an operation fails to change is put back as it
-// was, and so is the object.
+// was, and so is the object; only what was to be removed may be damaged then, see RemoveSubfile.
 #ifndef SLIDESHOW_SLIDESHOW_H
 #define SLIDESHOW_SLIDESHOW_H
 
@@ -21,7 +21,7 @@ struct subfileInfo {
   int reserved = 0;
   int width = 0;  // pixels: of the stored JPEG in file mode, of the source in memory mode
   int height = 0;
-  int state = 0;   // 0 added since the show was created or opened, 2 loaded from the file
+  int state = 0;   // 0 added, 2 loaded from the file; bit 0 set when marked for removal
   int size = 0;    // bytes of header and JPEG data in the container; 0 in memory mode
   int offset = 0;  // of the header in the container
 };
@@ -119,6 +119,37 @@ class SlideShow : public SlideShowFields {
   int AddBuffer(void* data, int length, const char* imageName, char imageFlag);
   int InsertFile(const char* imagePath, const char* imageName, int position, char imageFlag);
   int InsertBuffer(void* data, int length, const char* imageName, int position, char imageFlag);
+
+  // ---- removing pictures ----
+  // File mode only. Removing goes in two phases, so that several pictures go at the price of one.
+
+  // Marks picture `index`: nothing is written, and it can still be drawn. 1, or 0 for a bad index.
+  int RemoveImage(int index);
+
+  // `state` of picture `index`; 0 as well for a bad index and in memory mode.
+  int GetImageState(int index) const;
+
+  // Takes the marked pictures out of the file: moves the others together, rewrites the headers and cuts
+  // the file. The rest keeps its order, its indices begin at 0; each gets the name, path and state that
+  // its header in the file holds. 1, or 0 with file and object as they were. A step that fails once is
+  // repeated; when it fails again after pictures have moved, only the marked ones, which are all still
+  // listed and marked, may have lost their data.
+  int RemoveSubfile();
+
+  // ---- music ----
+
+  // Takes in a music file (1 byte to 2 GiB): file mode copies it in front of everything else, memory
+  // mode notes its path and size. 1, or 0 with file and object as they were: music is there already,
+  // path not 1 to 255 bytes, file missing or empty, no memory, container not writable or too large.
+  int AddMusic(const char* musicPath);
+
+  // Takes the music out again. 1, or 0 with file and object as they were; as with RemoveSubfile the
+  // music may be damaged when a step fails twice. 0 also when there is none.
+  int RemoveMusic();
+
+  // Copies the path of the music with its terminator (`buffer` holds 256 bytes) and returns its length;
+  // 0 when there is none.
+  int GetMusic(char* buffer) const;
 
   // ---- getting pictures back ----
 

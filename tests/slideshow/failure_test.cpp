@@ -2,14 +2,12 @@
 #include <gtest/gtest.h>
 #include <sys/resource.h>
 
-#include <algorithm>
-#include <array>
 #include <csignal>
 #include <functional>
-#include <tuple>
 
 #include "platform/android_log.h"
 #include "platform/fault_injection.h"
+#include "tests/slideshow/show_state.h"
 #include "tests/support/slideshow_files.h"
 
 namespace tests {
@@ -17,33 +15,6 @@ namespace {
 
 using pelo::faults::allocations;
 using pelo::faults::containerCalls;
-
-// A copy of everything that a failed edit must leave alone.
-struct State {
-  SlideShowFields fields;
-  std::vector<subfileInfo> entries;
-
-  explicit State(const SlideShow& show)
-      : fields(show), entries(show.subfiles, show.subfiles + SlideShow::kMaxFileSubfiles) {}
-  static auto settings(const SlideShowFields& f) {
-    return std::tuple(std::to_array(f.pathName), std::to_array(f.musicName), f.file, f.mode, f.width, f.height,
-                      f.lastIndex, f.musicSize, f.subfileCount, f.interval, f.effectType, f.shuffle, f.loop,
-                      f.screenDirection, f.subfiles);
-  }
-  static auto facts(const subfileInfo& e) {
-    return std::tuple(std::to_array(e.name), std::to_array(e.path), e.flag, e.sourceFile, e.reserved, e.width,
-                      e.height, e.state, e.size, e.offset);
-  }
-
-  // By fields: what padding holds is nobody's promise.
-  bool operator==(const State& other) const {
-    return settings(fields) == settings(other.fields) &&
-           std::equal(std::begin(fields.subfileOffsets), std::end(fields.subfileOffsets),
-                      std::begin(other.fields.subfileOffsets)) &&
-           std::equal(entries.begin(), entries.end(), other.entries.begin(), other.entries.end(),
-                      [](const subfileInfo& x, const subfileInfo& y) { return facts(x) == facts(y); });
-  }
-};
 
 class Failure : public testing::Test {
  protected:

@@ -1,0 +1,72 @@
+#include "slideshow/compact.h"
+
+#include <algorithm>
+#include <cstdint>
+#include <iterator>
+#include <utility>
+
+#include "slideshow/container_format.h"
+#include "slideshow/container_session.h"
+#include "slideshow/container_undo.h"
+#include "slideshow/data_shift.h"
+#include "slideshow/edit_end.h"
+#include "slideshow/subfile_table.h"
+
+namespace pelo::slideshow {
+namespace {
+
+// The pictures of a show in file mode.
+struct Table {
+  subfileInfo entries[SlideShow::kMaxFileSubfiles];
+  int count = 0;
+};
+
+void exchange(SlideShow& show, Table& table) {
+  std::swap_ranges(std::begin(table.entries), std::end(table.entries), show.subfiles);
+  std::swap(table.count, show.subfileCount);
+  std::fill(std::begin(show.subfileOffsets), std::end(show.subfileOffsets), 0);
+  place_subfiles(show, 0);
+}
+
+// What the file says of a picture, as far as it may be believed.
+void read_stored(ContainerSession& session, const subfileInfo& entry, subfileInfo& stored) {
+  session.seek(entry.offset);
+  read_subfile_header(session, stored);
+  if (stored.size != entry.size) session.fail();
+  stored.state &= ~kMarked;
+}
+
+// Lists the pictures to keep and the moves that close the gaps. Pictures in front of the first marked
+// one stay where they are.
+bool plan(SlideShow& show, Table& kept, DataShift& shift) {
+  ContainerSession session(show, "rb");
+  int64_t end = int64_t{show.musicSize} + kHeaderSize;
+  for (int i = 0; i < show.subfileCount; ++i) {
+    const subfileInfo& entry = show.subfiles[i];
+    if ((entry.state & kMarked) != 0) continue;
+    read_stored(session, entry, kept.entries[kept.count++]);
+    if (entry.offset != end) shift.add(entry.offset, end, entry.size);
+    end += entry.size;
+  }
+  return session.close();
+}
+
+}  // namespace
+
+bool compact(SlideShow& show) {
+  ContainerUndo undo;
+  Table table;
+  DataShift shift;
+  if (!undo.remember(show, true, kEndMarkSize) || !plan(show, table, shift)) return false;
+
+  if (shift.forth(show, INT64_MAX, kTries)) {
+    exchange(show, table);
+    if (finish_file(show, data_end(show))) return true;
+    exchange(show, table);
+  }
+  shift.back(show);
+  undo.put_back(show);
+  return false;
+}
+
+}  // namespace pelo::slideshow

@@ -1,0 +1,34 @@
+#include "slideshow/edit_end.h"
+
+#include "slideshow/container_format.h"
+#include "slideshow/container_session.h"
+#include "slideshow/vss_wrappers.h"
+
+namespace pelo::slideshow {
+namespace {
+
+template <class Step>
+bool persist(Step step) {
+  for (int i = 0; i < kTries; ++i) {
+    if (step()) return true;
+  }
+  return false;
+}
+
+bool write_end_mark_at(SlideShow& show, int64_t end) {
+  ContainerSession session(show, "r+b");
+  session.seek(end);
+  write_end_mark(session, show.musicSize);
+  return session.close();
+}
+
+}  // namespace
+
+bool finish_file(SlideShow& show, int64_t end) {
+  return persist([&] { return show.writeVssHeader("r+b") == 1; }) &&
+         persist([&] { return show.writeSubfileHeader() == 1; }) &&
+         persist([&] { return write_end_mark_at(show, end); }) &&
+         persist([&] { return truncate_file(show.pathName, end + kEndMarkSize); });
+}
+
+}  // namespace pelo::slideshow
