@@ -39,18 +39,6 @@ constexpr ScanPolicy kEverything{read_jfif, read_exif, read_photoshop};
 constexpr ScanPolicy kExifOnly{nullptr, read_exif, nullptr};
 constexpr ScanPolicy kSizeOnly{nullptr, nullptr, nullptr};
 
-// Markers that a length follows; the others stand alone or are of no concern, and what follows them is
-// searched for the next marker.
-bool has_segment(Marker code) {
-  return (code >= Marker::kApp0 && code <= Marker::kApp15) || code == Marker::kDht ||
-         code == Marker::kDqt || code == Marker::kDri || code == Marker::kCom || code == Marker::kDnl;
-}
-
-bool skip_segment(PELOJ_SOURCE& source) {
-  uint32_t remaining;
-  return segment_length(source, remaining) && source_skip(source, remaining);
-}
-
 bool valid_side(int side) {
   return side >= 1 && side <= kMaxSide;
 }

@@ -4,6 +4,7 @@
 #include <cstdint>
 
 #include "codec/core/ground/buffered_source.h"
+#include "codec/jpeg/marker_codes.h"
 #include "tavirpelo/parse.h"
 
 // Results of the decoder's internal stages.
@@ -65,6 +66,13 @@ constexpr int kMaxSide = 5000;  // pixels, both directions
 
 // Reads a segment's 16-bit length and gives the bytes that follow it; false below 2 or at the end.
 [[nodiscard]] bool segment_length(PELOJ_SOURCE& source, uint32_t& remaining);
+
+// True for the application, comment and table markers that a length follows; frames and scans, which it
+// follows too, are each caller's own concern. Behind other codes the search for markers just goes on.
+[[nodiscard]] bool has_segment(Marker code);
+
+// Passes over a segment by its length.
+[[nodiscard]] bool skip_segment(PELOJ_SOURCE& source);
 
 // True when the thumbnail's bytes can lie inside a source of `sourceSize` bytes.
 [[nodiscard]] bool thumbnail_in_source(const PELOJ_THUMBNAIL& thumbnail, uint32_t sourceSize);

@@ -36,4 +36,14 @@ bool segment_length(PELOJ_SOURCE& source, uint32_t& remaining) {
   return true;
 }
 
+bool has_segment(Marker code) {
+  return (code >= Marker::kApp0 && code <= Marker::kApp15) || code == Marker::kDht ||
+         code == Marker::kDqt || code == Marker::kDri || code == Marker::kCom || code == Marker::kDnl;
+}
+
+bool skip_segment(PELOJ_SOURCE& source) {
+  uint32_t remaining;
+  return segment_length(source, remaining) && source_skip(source, remaining);
+}
+
 }  // namespace pelo::jpeg

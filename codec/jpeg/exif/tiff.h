@@ -1,4 +1,4 @@
-// TIFF 6.0 structure in either byte order, as EXIF uses it: header, directory entries, values.
+// TIFF 6.0 structure in either byte order, as EXIF uses it: header, directories, entries, values.
 #pragma once
 
 #include <cstdint>
@@ -97,6 +97,38 @@ struct Entry {
 // The twelve bytes of a directory entry, which must outlive it.
 constexpr Entry parse_entry(const uint8_t* p, ByteOrder order) {
   return {load16(p, order), load16(p + 2, order), load32(p + 4, order), p + 8, order};
+}
+
+// A TIFF structure in memory. Offsets count from its header, and what they lead to is checked against
+// its size; sums of offsets and lengths have 64 bits.
+struct Structure {
+  const uint8_t* data;
+  uint32_t size;  // bytes
+  ByteOrder order;
+  uint32_t base;  // offset of the header in the source that the structure was read from
+
+  constexpr bool holds(uint64_t offset, uint64_t length) const {
+    return offset <= size && length <= size - offset;
+  }
+};
+
+// A directory: 16-bit count, entries, offset of the next directory.
+struct Directory {
+  const uint8_t* entries;
+  uint32_t count;
+  uint32_t next;  // 0: none, or the structure ends before it
+
+  constexpr const uint8_t* entry(uint32_t i) const { return entries + i * kEntrySize; }
+};
+
+// The directory at an offset; nothing when its entries do not fit in the structure.
+constexpr std::optional<Directory> directory_at(const Structure& tiff, uint32_t offset) {
+  if (!tiff.holds(offset, 2)) return std::nullopt;
+  const uint32_t count = load16(tiff.data + offset, tiff.order);
+  const uint64_t next = uint64_t{offset} + 2 + count * kEntrySize;
+  if (next > tiff.size) return std::nullopt;
+  return Directory{tiff.data + offset + 2, count,
+                   tiff.holds(next, 4) ? load32(tiff.data + next, tiff.order) : 0};
 }
 
 }  // namespace pelo::tiff

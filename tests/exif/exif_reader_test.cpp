@@ -1,0 +1,289 @@
+// What the EXIF reader takes from a segment: every member, both byte orders, and which entries it
+// ignores.
+#include "codec/jpeg/exif/exif_reader.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <memory>
+#include <string_view>
+
+#include "platform/android_log.h"
+#include "tests/support/exif_builder.h"
+#include "tests/support/jpeg_segments.h"
+#include "tests/support/slideshow_files.h"
+
+namespace tests {
+namespace {
+
+struct Destroy {
+  void operator()(TAVIRPELO_EXIFINFO* info) const { TAVIRPELO_DestroyJpegExifInfo(info); }
+};
+using Exif = std::unique_ptr<TAVIRPELO_EXIFINFO, Destroy>;
+
+Exif read(Bytes jpeg) {
+  jpeg.shrink_to_fit();
+  return Exif(TAVIRPELO_CreateJpegExifInfoFromBuffer(jpeg.data(), static_cast<int>(jpeg.size())));
+}
+Exif read(const ExifBuilder& exif) {
+  return read(exif.jpeg(header_of({frame(9, 9)})));
+}
+
+testing::AssertionResult is(TAVIRPELO_RATIONAL r, uint32_t numerator, uint32_t denominator) {
+  if (r.numerator == numerator && r.denominator == denominator) return testing::AssertionSuccess();
+  return testing::AssertionFailure() << r.numerator << "/" << r.denominator;
+}
+
+class ExifReader : public testing::Test {
+ protected:
+  void SetUp() override {
+    log_.clear();
+    pelo::platform::set_log_sink([](const char* line) { log_ = line; });
+  }
+  void TearDown() override { pelo::platform::set_log_sink(nullptr); }
+  static std::string log_;
+};
+std::string ExifReader::log_;
+
+class ExifOrder : public testing::TestWithParam<bool> {};
+INSTANTIATE_TEST_SUITE_P(BothOrders, ExifOrder, testing::Bool());
+
+TEST_P(ExifOrder, EveryMember) {
+  const Bytes jpeg = full_exif_jpeg(GetParam());
+  const Exif exif = read(jpeg);
+  ASSERT_TRUE(exif);
+  EXPECT_EQ(8u, exif->bitsPerSample[0]);
+  EXPECT_EQ(7u, exif->bitsPerSample[1]);
+  EXPECT_EQ(6u, exif->bitsPerSample[2]);
+  EXPECT_EQ(6u, exif->compression);
+  EXPECT_STREQ("Abc", exif->make);
+  EXPECT_STREQ("Model of five words, outside", exif->model);
+  EXPECT_EQ(6u, exif->orientation);
+  EXPECT_TRUE(is(exif->xResolution, 300, 1));
+  EXPECT_TRUE(is(exif->yResolution, 301, 2));
+  EXPECT_EQ(3u, exif->resolutionUnit);
+  EXPECT_STREQ("soft 1.0", exif->software);
+  EXPECT_EQ(2u, exif->ycbcrPositioning);
+  EXPECT_STREQ("all rights", exif->rights);
+  EXPECT_TRUE(is(exif->exposureTime, 1, 125));
+  EXPECT_EQ("0231", std::string_view(reinterpret_cast<const char*>(exif->exifVersion), 4));
+  EXPECT_STREQ("2021:02:03 04:05:06", exif->captureTime);
+  EXPECT_STREQ("2022:03:04 05:06:07", exif->digitizingTime);
+  EXPECT_EQ(16u, exif->flash);
+  EXPECT_EQ(1u, exif->colourSpace);
+  EXPECT_EQ(70000u, exif->pixelXDimension);
+  EXPECT_EQ(48u, exif->pixelYDimension);
+  EXPECT_EQ(1u, exif->exposureMode);
+  EXPECT_EQ(1u, exif->whiteBalance);
+  EXPECT_TRUE(is(exif->digitalZoom, 3, 2));
+  EXPECT_TRUE(is(exif->focalLength, 50, 1));
+  EXPECT_EQ(400u, exif->isoSpeed);
+  EXPECT_EQ(-1, exif->exposureBias.numerator);
+  EXPECT_EQ(3, exif->exposureBias.denominator);
+  EXPECT_TRUE(is(exif->fNumber, 28, 10));
+  EXPECT_EQ(-7, exif->shutterSpeed.numerator);
+
+  const TAVIRPELO_GPSINFO* gps = exif->gps;
+  ASSERT_TRUE(gps);
+  EXPECT_EQ(2, gps->version[0]);
+  EXPECT_EQ(3, gps->version[1]);
+  EXPECT_STREQ("N", gps->latitudeRef);
+  EXPECT_STREQ("W", gps->longitudeRef);
+  EXPECT_TRUE(is(gps->latitude[0], 48, 1) && is(gps->latitude[2], 1234, 100));
+  EXPECT_TRUE(is(gps->longitude[1], 34, 1));
+  EXPECT_EQ(1, gps->altitudeRef);
+  EXPECT_TRUE(is(gps->altitude, 5195, 10));
+  EXPECT_TRUE(is(gps->timeStamp[2], 7, 1));
+  EXPECT_STREQ("WGS-84", gps->mapDatum);
+  ASSERT_EQ(11u, gps->processingMethodLength);
+  EXPECT_EQ("GPS", std::string_view(reinterpret_cast<const char*>(gps->processingMethod) + 8, 3));
+  EXPECT_STREQ("2021:02:03", gps->dateStamp);
+
+  const TAVIRPELO_EXIFTHUMBNAIL& thumbnail = exif->thumbnail;
+  const Bytes expected = sample_thumbnail();
+  EXPECT_EQ(1u, thumbnail.present);
+  EXPECT_EQ(20u, thumbnail.width);
+  EXPECT_EQ(12u, thumbnail.height);
+  EXPECT_EQ(6u, thumbnail.compression);
+  EXPECT_EQ(6u, thumbnail.photometric);
+  EXPECT_EQ(1u, thumbnail.planarConfig);
+  EXPECT_EQ(9u, thumbnail.tag4173);
+  ASSERT_EQ(expected.size(), thumbnail.length);
+  EXPECT_TRUE(std::equal(expected.begin(), expected.end(), jpeg.begin() + thumbnail.offset));
+}
+
+TEST_F(ExifReader, FileAndSegmentAndBufferAgree) {
+  const Bytes jpeg = full_exif_jpeg(true);
+  TempFile file(".jpg");
+  file.write(jpeg);
+  const Exif fromFile(TAVIRPELO_CreateJpegExifInfoFromFile(file.c_str()));
+  const Exif fromSegment(
+      PELOJ_CreatExifInfoUseExifBuffer(jpeg.data() + 2, static_cast<int>(jpeg.size()) - 2));
+  ASSERT_TRUE(fromFile && fromSegment);
+  EXPECT_STREQ("Model of five words, outside", fromFile->model);
+  EXPECT_STREQ("WGS-84", fromSegment->gps->mapDatum);
+  // Offsets count from the start of what was read.
+  EXPECT_EQ(read(jpeg)->thumbnail.offset, fromFile->thumbnail.offset);
+  EXPECT_EQ(fromFile->thumbnail.offset, fromSegment->thumbnail.offset + 2);
+}
+
+TEST_P(ExifOrder, EntriesOfOtherTypesAndCountsAreIgnored) {
+  ExifBuilder exif(GetParam());
+  exif.shorts(Ifd::k0, 274, {6, 6})  // two SHORTs are never read
+      .shorts(Ifd::k0, 258, {8, 8})
+      .longs(Ifd::k0, 296, {2})
+      .entry(Ifd::k0, 271, 13, 3, {'a', 'b', 0})  // no type of TIFF
+      .entry(Ifd::k0, 272, 0, 3, {'a', 'b', 0})
+      .entry(Ifd::k0, 282, 5, 1, {0, 0, 0, 0})  // at offset 0: the header's own bytes
+      .rationals(Ifd::k0, 283, {1, 2}, 10)
+      .bytes(Ifd::k0, 305, {'x', 'y'}, 2)  // no terminator: one is added
+      .shorts(Ifd::k0, 65000, {1})
+      .text(Ifd::kExif, 36867, "2021:02:03 04:05")
+      .shorts(Ifd::kExif, 34855, {100, 200})
+      .shorts(Ifd::kExif, 271, {5})  // a tag of another directory
+      .text(Ifd::kGps, 29, "2021:2:3")
+      .rationals(Ifd::kGps, 2, {1, 1, 2, 1})
+      .text(Ifd::kGps, 1, "NN");
+  const Exif info = read(exif);
+  ASSERT_TRUE(info && info->gps);
+  EXPECT_EQ(0u, info->orientation);
+  EXPECT_EQ(0u, info->bitsPerSample[0]);
+  EXPECT_EQ(0u, info->resolutionUnit);
+  EXPECT_EQ(nullptr, info->make);
+  EXPECT_EQ(nullptr, info->model);
+  EXPECT_NE(0u, info->xResolution.numerator);
+  EXPECT_EQ(0u, info->yResolution.numerator);
+  EXPECT_STREQ("xy", info->software);
+  EXPECT_EQ(nullptr, info->captureTime);
+  EXPECT_EQ(0u, info->isoSpeed);
+  EXPECT_EQ(0, info->gps->dateStamp[0]);
+  EXPECT_EQ(0u, info->gps->latitude[0].numerator);
+  EXPECT_EQ(0, info->gps->latitudeRef[0]);
+  EXPECT_EQ(0u, info->thumbnail.present);
+}
+
+// The last of repeated tags stands; directories are walked once each, whatever points at them.
+TEST_P(ExifOrder, RepeatedTagsAndPointers) {
+  ExifBuilder exif(GetParam());
+  exif.text(Ifd::k0, 271, "first maker").text(Ifd::k0, 271, "second");
+  exif.longs(Ifd::k0, 34853, {8}).longs(Ifd::k0, 34665, {8}).longs(Ifd::k0, 34665, {8});
+  exif.shorts(Ifd::kExif, 37385, {1});
+  exif.text(Ifd::kGps, 18, "unused").text(Ifd::kGps, 18, "datum");
+  const Exif info = read(exif);
+  ASSERT_TRUE(info);
+  EXPECT_STREQ("second", info->make);
+  EXPECT_EQ(0u, info->flash);  // the first pointer led back to IFD0, which has no such tags
+  ASSERT_TRUE(info->gps);
+  EXPECT_EQ(nullptr, info->gps->mapDatum);
+}
+
+TEST_P(ExifOrder, ASubDirectoryWithASuccessorEndsTheWalk) {
+  for (const Ifd ifd : {Ifd::kExif, Ifd::kGps}) {
+    ExifBuilder exif(GetParam());
+    exif.shorts(Ifd::kExif, 37385, {7}).text(Ifd::kGps, 18, "datum").thumbnail(sample_thumbnail());
+    EXPECT_EQ(1u, read(exif)->thumbnail.present);
+    exif.successor(ifd, 8);
+    const Exif info = read(exif);
+    EXPECT_EQ(0u, info->thumbnail.present);
+    EXPECT_EQ(7u, info->flash);
+    EXPECT_EQ(ifd == Ifd::kGps, info->gps != nullptr);
+  }
+}
+
+TEST_P(ExifOrder, ThumbnailEntriesApplyInTheirOrder) {
+  ExifBuilder strips(GetParam());
+  strips.shorts(Ifd::k1, 256, {160}).longs(Ifd::k1, 257, {120}).shorts(Ifd::k1, 259, {1});
+  strips.longs(Ifd::k1, 273, {500}).shorts(Ifd::k1, 279, {600});
+  Exif info = read(strips);
+  EXPECT_EQ(1u, info->thumbnail.present);
+  EXPECT_EQ(160u, info->thumbnail.width);
+  EXPECT_EQ(120u, info->thumbnail.height);
+  EXPECT_EQ(0u, info->thumbnail.compression);
+  EXPECT_EQ(12u + 500, info->thumbnail.offset);  // SOI, marker, length, identifier
+  EXPECT_EQ(600u, info->thumbnail.length);
+
+  strips.longs(Ifd::k1, 513, {0xFFFFFFFF}).longs(Ifd::k1, 514, {7}).shorts(Ifd::k1, 259, {9});
+  info = read(strips);
+  EXPECT_EQ(0u, info->thumbnail.offset);
+  EXPECT_EQ(9u, info->thumbnail.compression);
+  EXPECT_EQ(160u, info->thumbnail.width);
+}
+
+TEST_F(ExifReader, FindsTheSegmentBehindOthers) {
+  ExifBuilder exif(false);
+  exif.text(Ifd::k0, 271, "maker");
+  const Bytes xmp =
+      segment(0xE1, ByteWriter().text("http://ns.adobe.com/xap/1.0/").u8(0).block(Bytes(9000, 7)));
+  const Bytes tiny = segment(0xE1, ByteWriter().text("Exi"));
+  const Bytes found = header_of(
+      {segment(0xE0, Bytes(14)), tiny, xmp, Bytes{0xFF, 0xFF, 0x01}, frame(9, 9), exif.segment()});
+  const Exif info = read(found);
+  ASSERT_TRUE(info);
+  EXPECT_STREQ("maker", info->make);
+
+  EXPECT_FALSE(read(header_of({frame(9, 9), xmp})));
+  EXPECT_NE(std::string::npos, log_.find("PELOJ_CreatExifInfo : PELOJ_GetExifInfo fail"));
+  Bytes garbage = found;
+  garbage.insert(garbage.begin(), 0);
+  EXPECT_FALSE(read(garbage));  // only a source that begins with SOI
+  EXPECT_FALSE(read(header_of({Bytes{0xFF, 0xE1, 0, 1}, exif.segment()})));
+}
+
+TEST_F(ExifReader, RefusesWhatIsNoTiff) {
+  const Bytes head = ByteWriter().text({"Exif\0\0", 6});
+  const Bytes bad[] = {{},
+                       {'I', 'I', 42, 0, 8, 0, 0},
+                       {'I', 'I', 42, 0, 8, 0, 0, 0},
+                       {'I', 'M', 42, 0, 2, 0, 0, 0},
+                       {'I', 'I', 43, 0, 2, 0, 0, 0},
+                       {'M', 'M', 42, 0, 0, 0, 0, 2}};
+  for (const Bytes& tiff : bad) {
+    const Bytes app1 = segment(0xE1, ByteWriter().block(head).block(tiff));
+    EXPECT_FALSE(read(header_of({app1})));
+    EXPECT_EQ(nullptr, PELOJ_CreatExifInfoUseExifBuffer(app1.data(), static_cast<int>(app1.size())));
+  }
+  // A sound header whose directory does not fit is EXIF without fields.
+  const Exif info =
+      read(header_of({segment(0xE1, ByteWriter().block(head).block({'I', 'I', 42, 0, 7, 0, 0, 0}))}));
+  ASSERT_TRUE(info);
+  EXPECT_EQ(0u, info->orientation);
+}
+
+TEST_F(ExifReader, MissingArguments) {
+  EXPECT_EQ(nullptr, TAVIRPELO_CreateJpegExifInfoFromFile(nullptr));
+  EXPECT_EQ(nullptr, TAVIRPELO_CreateJpegExifInfoFromFile("/nonexistent"));
+  EXPECT_EQ(nullptr, TAVIRPELO_CreateJpegExifInfoFromBuffer(nullptr, 5));
+  EXPECT_EQ(nullptr, TAVIRPELO_CreateJpegExifInfoFromBuffer("x", 0));
+  EXPECT_EQ(nullptr, TAVIRPELO_CreateJpegExifInfoFromBuffer("x", -1));
+  EXPECT_EQ(nullptr, PELOJ_CreatExifInfo(nullptr));
+  EXPECT_EQ(nullptr, PELOJ_CreatExifInfoUseExifBuffer(nullptr, 100));
+  EXPECT_EQ(0, TAVIRPELO_DestroyJpegExifInfo(nullptr));
+  EXPECT_EQ("", log_);
+  EXPECT_EQ(0, PELOJ_DestroyExifInfo(nullptr));
+  EXPECT_NE(std::string::npos, log_.find("PELOJ_DestroyExifInfo : TAVIRPELO_EXIFINFO is null"));
+}
+
+TEST(JpegResolution, NeedsAWholeHeader) {
+  uint32_t width = 1, height = 2;
+  const auto size = [&](const Bytes& jpeg) {
+    return PELOJ_GetJPEGResolution(jpeg.data(), static_cast<uint32_t>(jpeg.size()), &width, &height);
+  };
+  const Bytes good =
+      header_of({segment(0xDB, Bytes(65)), segment(0xE5, Bytes(5000)), frame(6000, 11, 0xC2)});
+  for (size_t cut = 0; cut + 28 < good.size(); cut += cut < 5080 ? 97 : 1) {
+    EXPECT_EQ(201, size(Bytes(good.begin(), good.begin() + static_cast<ptrdiff_t>(cut)))) << cut;
+  }
+  EXPECT_EQ(1u, width);
+  EXPECT_EQ(2u, height);
+  EXPECT_EQ(200, size(good));
+  EXPECT_EQ(6000u, width);
+  EXPECT_EQ(11u, height);
+  Bytes twelveBit = header_of({frame(5, 5)});
+  twelveBit[6] = 12;
+  EXPECT_EQ(201, size(twelveBit));
+  EXPECT_EQ(201, size(header_of({Bytes{0xFF, 0xC0, 0, 4, 8, 0}})));
+  EXPECT_EQ(201, size(header_of({Bytes{0xFF, 0xDB, 0, 1}})));
+}
+
+}  // namespace
+}  // namespace tests
