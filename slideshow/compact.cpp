@@ -10,6 +10,7 @@
 #include "slideshow/container_undo.h"
 #include "slideshow/data_shift.h"
 #include "slideshow/edit_end.h"
+#include "slideshow/persist.h"
 #include "slideshow/subfile_table.h"
 
 namespace pelo::slideshow {

@@ -4,6 +4,7 @@
 
 #include "slideshow/container_format.h"
 #include "slideshow/container_session.h"
+#include "slideshow/persist.h"
 #include "slideshow/subfile_table.h"
 
 namespace pelo::slideshow {
@@ -38,12 +39,15 @@ bool ContainerUndo::remember(SlideShow& show, bool withSubfileHeaders, int64_t t
 void ContainerUndo::put_back(SlideShow& show) const {
   const uint8_t* source = bytes_.get();
   for (int i = 0; i < pieceCount_; ++i) {
-    ContainerSession session(show, "r+b");
-    session.seek(pieces_[i].offset);
-    session.write(source, pieces_[i].size);
+    (void)persist([&] {
+      ContainerSession session(show, "r+b");
+      session.seek(pieces_[i].offset);
+      session.write(source, pieces_[i].size);
+      return session.close();
+    });
     source += pieces_[i].size;
   }
-  (void)truncate_file(show.pathName, length_);
+  (void)persist([&] { return truncate_file(show.pathName, length_); });
 }
 
 }  // namespace pelo::slideshow

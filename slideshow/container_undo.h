@@ -20,7 +20,7 @@ class ContainerUndo {
   int64_t length() const { return length_; }
 
   // Writes the copies back and cuts the file to its old length. Needs no memory and no room on the disk;
-  // each step is tried even when another fails.
+  // each step is tried twice, even when another failed.
   void put_back(SlideShow& show) const;
 
  private:

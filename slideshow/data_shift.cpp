@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "slideshow/container_session.h"
+#include "slideshow/persist.h"
 
 namespace pelo::slideshow {
 
@@ -52,28 +53,32 @@ bool DataShift::move_piece(ContainerSession& session) {
 
 void DataShift::back(SlideShow& show) {
   if (buffer_ == nullptr) return;
-  if (held_) return_piece(show);
-  while (run_ > 0 || done_ > 0) {
-    step_back();
-    return_piece(show);
+  for (bool more = held_ || step_back(); more; more = step_back()) {
+    (void)persist([&] { return return_piece(show); });
+    held_ = false;
   }
 }
 
-void DataShift::step_back() {
-  if (done_ == 0) done_ = runs_[--run_].size;
+bool DataShift::step_back() {
+  if (done_ == 0) {
+    if (run_ == 0) return false;
+    done_ = runs_[--run_].size;
+  }
   done_ = (done_ - 1) / piece_ * piece_;
+  return true;
 }
 
-void DataShift::return_piece(SlideShow& show) {
+// A second try has the piece at hand: the first may have written over its copy in the file.
+bool DataShift::return_piece(SlideShow& show) {
   ContainerSession session(show, "r+b");
   const Run& run = runs_[run_];
   if (!held_) {
     session.seek(run.to + done_);
-    session.read(buffer_.get(), piece_size());
+    held_ = session.read(buffer_.get(), piece_size());
   }
   session.seek(run.from + done_);
   session.write(buffer_.get(), piece_size());
-  held_ = false;
+  return session.close();
 }
 
 }  // namespace pelo::slideshow

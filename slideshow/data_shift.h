@@ -22,7 +22,7 @@ class DataShift {
   [[nodiscard]] bool forth(SlideShow& show, int64_t piece, int tries);
 
   // Undoes forth(), however far it came, as long as the file was not cut since. Needs no memory; each
-  // piece is tried even when another fails.
+  // piece is tried twice, even when another failed.
   void back(SlideShow& show);
 
  private:
@@ -35,8 +35,8 @@ class DataShift {
   bool moved_all() const { return run_ == runCount_; }
   int64_t piece_size() const;
   bool move_piece(ContainerSession& session);
-  void step_back();
-  void return_piece(SlideShow& show);
+  bool step_back();
+  bool return_piece(SlideShow& show);
 
   Run runs_[SlideShow::kMaxFileSubfiles] = {};
   int runCount_ = 0;

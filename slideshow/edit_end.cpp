@@ -2,18 +2,11 @@
 
 #include "slideshow/container_format.h"
 #include "slideshow/container_session.h"
+#include "slideshow/persist.h"
 #include "slideshow/vss_wrappers.h"
 
 namespace pelo::slideshow {
 namespace {
-
-template <class Step>
-bool persist(Step step) {
-  for (int i = 0; i < kTries; ++i) {
-    if (step()) return true;
-  }
-  return false;
-}
 
 bool write_end_mark_at(SlideShow& show, int64_t end) {
   ContainerSession session(show, "r+b");

@@ -7,13 +7,9 @@
 
 namespace pelo::slideshow {
 
-// How often a step is tried behind the point from which an edit cannot be undone without loss: a call
-// that fails once does not decide.
-constexpr int kTries = 2;
-
 // Writes the header, the pictures' headers and an end mark at `end`, then cuts the file behind the mark.
 // Until the cut everything can be put back, and when it is made nothing is left to fail. False when a
-// step fails for good.
+// step fails twice.
 [[nodiscard]] bool finish_file(SlideShow& show, int64_t end);
 
 }  // namespace pelo::slideshow

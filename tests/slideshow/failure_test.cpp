@@ -1,12 +1,11 @@
 // Every file call and every allocation failing in turn, and a disk that is full: nothing is lost.
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
-#include <csignal>
 #include <functional>
 
 #include "platform/android_log.h"
 #include "platform/fault_injection.h"
+#include "tests/slideshow/file_limit.h"
 #include "tests/slideshow/show_state.h"
 #include "tests/support/slideshow_files.h"
 
@@ -112,17 +111,11 @@ TEST_F(Failure, UndoingNeedsNoMemory) {
 TEST_F(Failure, OfAFullDisk) {
   fill();
   const Bytes before = file.read();
-  rlimit unlimited;
-  ASSERT_EQ(0, getrlimit(RLIMIT_FSIZE, &unlimited));
-  std::signal(SIGXFSZ, SIG_IGN);
   int refused = 0;
   for (const int position : {0, 2, 4}) {
     const State state(show);
-    for (rlim_t room = 0;; room += 53) {
-      const rlimit limit{before.size() + room, unlimited.rlim_max};
-      ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &limit));
-      const int result = edit(position);
-      ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &unlimited));
+    for (size_t room = 0;; room += 53) {
+      const int result = (FileLimit(before.size() + room), edit(position));
       if (result == 1) break;
       ++refused;
       ASSERT_TRUE(state == State(show)) << position << " " << room;
@@ -131,7 +124,6 @@ TEST_F(Failure, OfAFullDisk) {
     file.write(before);
     ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
   }
-  std::signal(SIGXFSZ, SIG_DFL);
   EXPECT_GT(refused, 20);
 }
 

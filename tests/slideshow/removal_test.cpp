@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include "platform/fault_injection.h"
+#include "tests/slideshow/file_limit.h"
 #include "tests/slideshow/show_state.h"
 #include "tests/support/slideshow_files.h"
 
@@ -176,7 +177,29 @@ TEST_F(Removal, SurvivesAFailingCall) {
 }
 
 TEST_F(Removal, SurvivesACallFailingTwice) {
-  for (const auto& marks : kMarkings) fail_each(marks, 2);
+  for (const auto& marks : kMarkings) {
+    fail_each(marks, 2);
+    fail_each(marks, 3);
+  }
+}
+
+// A part of the file cannot be written any more.
+TEST_F(Removal, KeepsThePicturesWhereWritingEnds) {
+  const std::vector<int> marks{1, 3};
+  for (size_t limit = 0; limit < image.bytes().size(); limit += 31) {
+    open(marks);
+    const State state(show);
+    const int result = (FileLimit(limit), show.RemoveSubfile());
+    if (result == 1) {
+      ASSERT_EQ(without(marks).bytes(), file.read()) << limit;
+      continue;
+    }
+    ASSERT_TRUE(state == State(show)) << limit;
+    const Contents pictures = reopened(file);
+    ASSERT_EQ(5u, pictures.size()) << limit;
+    for (const size_t kept : {0u, 2u, 4u})
+      ASSERT_EQ(image.pictures[kept].jpeg, pictures[kept].second) << limit;
+  }
 }
 
 TEST_F(Removal, NeedsItsMemoryBeforeItBegins) {

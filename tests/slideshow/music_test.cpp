@@ -1,0 +1,272 @@
+// Music: whole files against a builder of the test's own, and every failing file call.
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <numeric>
+
+#include "platform/fault_injection.h"
+#include "tests/slideshow/file_limit.h"
+#include "tests/slideshow/show_state.h"
+#include "tests/support/slideshow_files.h"
+
+namespace tests {
+namespace {
+
+using pelo::faults::allocations;
+using pelo::faults::containerCalls;
+
+// Three pictures without music, the second marked for removal in memory.
+class MusicEntry : public testing::Test {
+ protected:
+  void SetUp() override {
+    image.path = file.path();
+    image.loop = 1;
+    for (const auto& [name, side] : {std::pair{"P", 40}, {"Q", 8}, {"R", 64}}) {
+      image.pictures.push_back({name, "", side, side, 0, encode_own(side, side, 80)});
+    }
+    open();
+  }
+  void TearDown() override {
+    allocations.arm(0);
+    containerCalls.arm(0);
+  }
+
+  void open() {
+    file.write(image.bytes());
+    ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
+    ASSERT_EQ(1, show.RemoveImage(1));
+  }
+  Bytes tune(size_t size) {
+    Bytes bytes(size);
+    std::iota(bytes.begin(), bytes.end(), static_cast<uint8_t>(size));
+    for (size_t i = 256; i < size; i += 256) bytes[i] ^= static_cast<uint8_t>(i >> 8);
+    source.write(bytes);
+    return bytes;
+  }
+  // The file with that music: every picture header tells the state in memory. Of the old end mark stays
+  // what the data, now longer by the music, does not reach.
+  Bytes with(const Bytes& music) const {
+    ContainerImage after = image;
+    after.music = music;
+    after.musicPath = source.path();
+    for (auto& picture : after.pictures) picture.state = 2;
+    if (after.pictures.size() > 1) after.pictures[1].state = 3;
+    Bytes bytes = after.bytes();
+    if (music.size() < kMarkBytes) {
+      const Bytes before = image.bytes();
+      bytes.insert(bytes.end() - kMarkBytes,
+                   before.end() - static_cast<ptrdiff_t>(kMarkBytes - music.size()), before.end());
+    }
+    return bytes;
+  }
+  // The same without it: the old end mark stays in front of the new one.
+  static Bytes without(const Bytes& with, size_t size) {
+    Bytes bytes(with.begin() + static_cast<ptrdiff_t>(size), with.end());
+    set_number(bytes, 540, 0);
+    std::fill_n(bytes.begin() + 256, 256, uint8_t{0});
+    size_t at = kHeaderBytes;
+    for (size_t i = 0; i < static_cast<size_t>(number_at(bytes, 544)); ++i) {
+      set_number(bytes, 548 + 4 * i, static_cast<uint32_t>(at));
+      set_number(bytes, at + 536, static_cast<uint32_t>(at));
+      at += static_cast<size_t>(number_at(bytes, at + 532));
+    }
+    const Bytes mark(bytes.end() - kMarkBytes, bytes.end());
+    bytes.insert(bytes.end(), mark.begin(), mark.end());
+    set_number(bytes, bytes.size() - 4, 0);
+    return bytes;
+  }
+
+  TempFile file, source{".tune"};
+  ContainerImage image;
+  SlideShow show;
+};
+
+TEST_F(MusicEntry, GoesInAndOutByteForByte) {
+  const size_t whole = image.bytes().size();
+  for (const size_t size :
+       {size_t{1}, size_t{5}, size_t{12}, size_t{13}, size_t{100}, size_t{628}, size_t{1000}, whole - 12,
+        whole, whole + 1, size_t{131071}, size_t{131072}, size_t{131073}, size_t{300000}}) {
+    open();
+    const Contents pictures = contents(show);
+    const Bytes music = tune(size);
+    ASSERT_EQ(1, show.AddMusic(source.c_str())) << size;
+    const Bytes expected = with(music);
+    ASSERT_EQ(expected, file.read()) << size;
+    EXPECT_EQ(static_cast<int>(size), show.GetMusicSize());
+    EXPECT_EQ(pictures, contents(show));
+    EXPECT_EQ(pictures, reopened(file));
+    char text[256];
+    EXPECT_EQ(static_cast<int>(source.path().size()), show.GetMusic(text));
+    EXPECT_EQ(source.path(), text);
+    // No second one.
+    ASSERT_EQ(0, show.AddMusic(source.c_str()));
+    ASSERT_EQ(expected, file.read());
+
+    ASSERT_EQ(1, show.RemoveMusic()) << size;
+    ASSERT_EQ(without(expected, size), file.read()) << size;
+    EXPECT_EQ(0, show.GetMusicSize());
+    EXPECT_EQ(0, show.GetMusic(text));
+    EXPECT_EQ(pictures, contents(show));
+    EXPECT_EQ(pictures, reopened(file));
+    ASSERT_EQ(0, show.RemoveMusic());
+  }
+}
+
+TEST_F(MusicEntry, RefusalsLeaveShowAndFileAlone) {
+  const State state(show);
+  tune(0);
+  const std::string missing = source.path() + ".none", folder = testing::TempDir();
+  for (const char* path : {static_cast<const char*>(nullptr), "", missing.c_str(), folder.c_str(),
+                           "/dev/null", source.c_str()}) {
+    EXPECT_EQ(0, show.AddMusic(path));
+  }
+  EXPECT_EQ(0, show.AddMusic(std::string(256, 'a').c_str()));
+  EXPECT_EQ(0, show.RemoveMusic());
+  EXPECT_TRUE(state == State(show));
+  EXPECT_EQ(image.bytes(), file.read());
+  SlideShow other;
+  tune(9);
+  EXPECT_EQ(0, other.AddMusic(source.c_str()));
+  EXPECT_EQ(0, other.RemoveMusic());
+}
+
+TEST_F(MusicEntry, OfAShowThatHoldsNothingElse) {
+  const Bytes music = tune(5);
+  ASSERT_EQ(1, show.CreateShow(file.c_str(), 480, 480));
+  ASSERT_EQ(1, show.AddMusic(source.c_str()));
+  EXPECT_EQ(5 + kHeaderBytes + kMarkBytes, file.read().size());
+  ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
+  EXPECT_EQ(5, show.GetMusicSize());
+  // The container itself, whole, as its own music.
+  ASSERT_EQ(1, show.RemoveMusic());
+  ASSERT_EQ(1, add_sample(show, 16, 16, "A"));
+  const Bytes before = file.read();
+  ASSERT_EQ(1, show.AddMusic(file.c_str()));
+  Bytes after = file.read();
+  after.resize(before.size());
+  EXPECT_EQ(before, after);
+  EXPECT_EQ(1u, reopened(file).size());
+}
+
+TEST_F(MusicEntry, IsOnlyNotedInMemory) {
+  tune(1000);
+  ASSERT_EQ(1, show.CreateShow(nullptr, 480, 480));
+  ASSERT_EQ(1, show.AddMusic(source.c_str()));
+  EXPECT_EQ(1000, show.GetMusicSize());
+  EXPECT_EQ(0, show.AddMusic(source.c_str()));
+  EXPECT_EQ(1, add_sample(show, 8, 8, "A"));
+  ASSERT_EQ(1, show.RemoveMusic());
+  EXPECT_EQ(0, show.GetMusicSize());
+  EXPECT_STREQ("", show.musicName);
+  EXPECT_EQ(0, show.RemoveMusic());
+  // 2 GiB and more, without a byte on the disk.
+  for (const long long size : {0x7FFFFFFFLL, 0x80000000LL, 5LL << 30}) {
+    if (sizeof(off_t) < sizeof size && size > 0x7FFFFFFF) continue;
+    ASSERT_EQ(0, truncate(source.c_str(), static_cast<off_t>(size)));
+    const bool fits = size == 0x7FFFFFFF;
+    EXPECT_EQ(fits, show.AddMusic(source.c_str())) << size;
+    if (fits) {
+      EXPECT_EQ(1, add_sample(show, 8, 8, "B"));
+      ASSERT_EQ(1, show.RemoveMusic());
+    }
+  }
+  open();
+  ASSERT_EQ(0, truncate(source.c_str(), 0x7FFFFFFF));
+  EXPECT_EQ(0, show.AddMusic(source.c_str()));  // no room for the pictures behind it
+  EXPECT_EQ(image.bytes(), file.read());
+}
+
+// The k-th file call fails: the old file or the new one, and an object that agrees.
+TEST_F(MusicEntry, GoesInDespiteAFailingCall) {
+  for (const long count : {1, 2}) {
+    for (const size_t size : {size_t{5}, size_t{1000}, size_t{140000}}) {
+      const Bytes after = with(tune(size));
+      bool hit = true;
+      for (long k = 1; hit; ++k) {
+        ASSERT_LT(k, 2000);
+        open();
+        const State state(show);
+        containerCalls.arm(k, count);
+        const int result = show.AddMusic(source.c_str());
+        hit = containerCalls.calls >= k;
+        containerCalls.arm(0);
+        ASSERT_EQ(result == 1 ? after : image.bytes(), file.read()) << size << " " << k;
+        ASSERT_TRUE(result == 1 || state == State(show)) << size << " " << k;
+        ASSERT_EQ(contents(show), reopened(file)) << size << " " << k;
+      }
+      EXPECT_EQ(after, file.read());
+    }
+  }
+}
+
+// Going out, a call that fails twice may cost the music but no picture.
+TEST_F(MusicEntry, GoesOutDespiteAFailingCall) {
+  for (const long count : {1, 2, 3}) {
+    for (const size_t size : {size_t{5}, size_t{1000}, size_t{140000}}) {
+      tune(size);
+      open();
+      ASSERT_EQ(1, show.AddMusic(source.c_str()));
+      const Bytes before = file.read(), after = without(before, size);
+      bool hit = true;
+      for (long k = 1; hit; ++k) {
+        ASSERT_LT(k, 2000);
+        file.write(before);
+        ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
+        ASSERT_EQ(1, show.RemoveImage(1));
+        const State state(show);
+        containerCalls.arm(k, count);
+        const int result = show.RemoveMusic();
+        hit = containerCalls.calls >= k;
+        containerCalls.arm(0);
+        Bytes left = file.read();
+        if (result == 1) {
+          ASSERT_EQ(after, left) << size << " " << k;
+        } else {
+          ASSERT_TRUE(state == State(show)) << size << " " << k;
+          const size_t same = count == 1 ? 0 : size;
+          ASSERT_TRUE(left.size() == before.size() &&
+                      std::equal(left.begin() + static_cast<ptrdiff_t>(same), left.end(),
+                                 before.begin() + static_cast<ptrdiff_t>(same)))
+              << size << " " << k;
+        }
+        ASSERT_EQ(contents(show), reopened(file)) << size << " " << k;
+      }
+    }
+  }
+}
+
+TEST_F(MusicEntry, GoesInOnlyWithRoomOnTheDisk) {
+  const Bytes after = with(tune(3000));
+  const State state(show);
+  const size_t before = image.bytes().size();
+  for (size_t limit = before; limit < after.size(); limit += 61) {
+    ASSERT_EQ(0, (FileLimit(limit), show.AddMusic(source.c_str()))) << limit;
+    ASSERT_TRUE(state == State(show)) << limit;
+    ASSERT_EQ(image.bytes(), file.read()) << limit;
+  }
+  const FileLimit enough(after.size());
+  EXPECT_EQ(1, show.AddMusic(source.c_str()));
+}
+
+TEST_F(MusicEntry, NeedsItsMemory) {
+  const Bytes after = with(tune(1000));
+  const State state(show);
+  for (long k = 1;; ++k) {
+    allocations.arm(k);
+    if (show.AddMusic(source.c_str()) == 1) break;
+    ASSERT_TRUE(state == State(show)) << k;
+    ASSERT_EQ(image.bytes(), file.read()) << k;
+  }
+  EXPECT_EQ(after, file.read());
+  const State full(show);
+  for (long k = 1;; ++k) {
+    allocations.arm(k);
+    if (show.RemoveMusic() == 1) break;
+    ASSERT_TRUE(full == State(show)) << k;
+    ASSERT_EQ(after, file.read()) << k;
+  }
+}
+
+}  // namespace
+}  // namespace tests
