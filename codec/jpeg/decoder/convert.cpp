@@ -96,6 +96,11 @@ bool serve_output_row(PELOJ_JDINFO& jd, const GridRow& row) {
   return true;
 }
 
+// True when the band is full and the picture goes on: the input row may have points of its next row too.
+bool pauses(const PELOJ_JDINFO& jd) {
+  return jd.output.emitted == jd.output.bandEnd && jd.output.emitted < jd.output.limit;
+}
+
 // Four-point averages; every row of the call is used up.
 template <class Rows>
 void convert_averaging(PELOJ_JDINFO& jd, int rows) {
@@ -105,8 +110,9 @@ void convert_averaging(PELOJ_JDINFO& jd, int rows) {
       Rows::write(jd, row, jd.targetWidth);
       continue;
     }
-    while (jd.output.emitted < jd.output.limit && serve_output_row<Rows>(jd, row)) {
+    while (jd.output.emitted < jd.output.bandEnd && serve_output_row<Rows>(jd, row)) {
     }
+    if (pauses(jd)) return;
   }
   jd.continueFlag = 0;
 }
@@ -131,10 +137,11 @@ void convert_picking(PELOJ_JDINFO& jd, int rows) {
       YccRows::write(jd, row, jd.targetWidth);
       continue;
     }
-    while (jd.output.emitted < jd.output.limit &&
+    while (jd.output.emitted < jd.output.bandEnd &&
            holds_point(jd, jd.inputRow, jd.output.emitted, jd.usedHeight / 2)) {
       WriteRow(&jd, row.plane[0], row.plane[1], row.plane[2], jd.targetWidth);
     }
+    if (pauses(jd)) return;
   }
   jd.continueFlag = 0;
 }

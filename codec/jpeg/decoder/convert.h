@@ -9,7 +9,8 @@
 
 // Each converts `rows` rows of the current row group from the read position on. The plain members and the
 // fast enlarging one finish their rows in one call; the averaging enlarging ones return after every output
-// row and clear the continue flag when the input row is used up.
+// row. All clear the continue flag when the input row is used up, and keep it, one row a call, when the
+// band of output rows is full before.
 TAVIRPELO_API void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);
 TAVIRPELO_API void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows);
 TAVIRPELO_API void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);

@@ -69,10 +69,9 @@ bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
   return true;
 }
 
-using RowFunction = int (*)(PELOJ_JDINFO*, int*, int);
-
 // Passes the rows above the wanted part; false when the picture ends there.
-bool skip_rows(PELOJ_JDINFO& jd, RowFunction process) {
+bool skip_rows(PELOJ_JDINFO& jd) {
+  const RowFunction process = row_function(jd);
   jd.skipping = 1;
   while (jd.rowsDone < jd.cropY) {
     int rows = 0;
@@ -86,36 +85,21 @@ bool skip_rows(PELOJ_JDINFO& jd, RowFunction process) {
   return true;
 }
 
-// Shows the wanted rows; false when a row could not be decoded. The rows written stand.
-bool show_rows(PELOJ_JDINFO& jd, RowFunction process) {
-  while (jd.rowsDone < jd.usedHeight && jd.output.emitted < jd.output.limit) {
-    int rows = 0;
-    const int status = process(&jd, &rows, 1);
-    jd.rowsDone += rows;
-    if (status == PELOJ_FAIL) return false;
-    if (status == PELOJ_IMAGE_DONE || rows == 0) break;
-  }
-  return true;
-}
-
 // From one pass over the data. Damage ends the picture, it does not fail.
 int decode_in_order(PELOJ_JDINFO& jd) {
-  const RowFunction process = jd.scale == kFull ? PELOJ_ProcessData : PELOJ_ProcessData_resize;
-  if (!skip_rows(jd, process)) return 0;
-  show_rows(jd, process);
+  if (!skip_rows(jd)) return 0;
+  show_rows(jd);
   return PELOJ_OK;
 }
 
 // From all scans, row by row.
 int decode_scans(PELOJ_JDINFO& jd) {
   if (list_scans(jd) != PELOJ_OK) return PELOJ_FAIL;
-  const bool full = jd.scale == kFull;
-  const RowFunction process = full ? PELOJ_ProgProcessData : PELOJ_ProgProcessData_resize;
-  if (!skip_rows(jd, process)) return 0;
-  if (show_rows(jd, process)) return PELOJ_OK;
+  if (!skip_rows(jd)) return 0;
+  if (show_rows(jd) != PELOJ_FAIL) return PELOJ_OK;
   gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
-  log_error(full ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
-                 : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");
+  log_error(jd.scale == kFull ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
+                              : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");
   return 0;
 }
 
@@ -172,14 +156,11 @@ int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_RE
     if (gTAVIRPELO_Error != TAVIRPELO_ERROR_MEMORY) gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
     return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
   }
-  const bool progressive = decoder->marker->frameType == FrameType::kProgressive;
-  // An eighth of the size shows the first scan alone, which then has to be a first DC scan.
-  if (progressive && decoder->scale == kEighth && (decoder->ss != 0 || decoder->ah != 0)) {
+  if (!first_scan_suffices(*decoder)) {
     gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
     return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
   }
-  const bool allScans = progressive && decoder->scale != kEighth;
-  return allScans ? decode_scans(*decoder) : decode_in_order(*decoder);
+  return needs_all_scans(*decoder) ? decode_scans(*decoder) : decode_in_order(*decoder);
 }
 
 int PELOJ_ValorenDecodeFrame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, void* outBuffer,

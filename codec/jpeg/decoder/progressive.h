@@ -25,6 +25,17 @@ TAVIRPELO_API int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo);
 
 namespace pelo::jpeg {
 
+// True for progressive pictures but at an eighth of their size, which shows the first scan alone.
+inline bool needs_all_scans(const PELOJ_JDINFO& jd) {
+  return jd.marker->frameType == FrameType::kProgressive && jd.scale != kEighth;
+}
+
+// False when that first scan is not a first pass over DC, without which the rest is nothing.
+inline bool first_scan_suffices(const PELOJ_JDINFO& jd) {
+  const bool firstAlone = jd.marker->frameType == FrameType::kProgressive && jd.scale == kEighth;
+  return !firstAlone || (jd.ss == 0 && jd.ah == 0);
+}
+
 // Lists the scans from the first one, which the decoder has just prepared, as far as the scale can show
 // them. 200 or 201.
 [[nodiscard]] int list_scans(PELOJ_JDINFO& jd);

@@ -101,11 +101,12 @@ struct RgbModel {
 // Planar rows: luma whole; on even rows one chroma sample for each pair of pixels, the even column's.
 template <class Model>
 void store_planar(const RowOutput& output, const Run& in, int begin, int count) {
-  const ptrdiff_t row = output.emitted;
+  const ptrdiff_t row = output.emitted - output.firstRow;
   std::memcpy(output.plane[0] + row * output.rowStep + begin, in.channel[0], static_cast<size_t>(count));
-  if (row % 2 != 0) return;
+  if (output.emitted % 2 != 0) return;
+  const ptrdiff_t chromaRow = output.emitted / 2 - (output.firstRow + 1) / 2;
   for (int c = 1; c < 3; ++c) {
-    uint8_t* out = output.plane[c] + row / 2 * ((output.rowStep + 1) >> 1) + begin / 2;
+    uint8_t* out = output.plane[c] + chromaRow * ((output.rowStep + 1) >> 1) + begin / 2;
     for (int i = 0; i < count; i += 2) out[i / 2] = Model::kGrey ? 128 : in.channel[c][i];
   }
 }
@@ -115,7 +116,7 @@ template <class Model, class Source>
 void emit_row(PELOJ_JDINFO& jd, const Source& source, int count) {
   RowOutput& output = jd.output;
   const bool writes = output.plane[0] != nullptr && (!output.planar || Model::kPlanar);
-  if (output.emitted >= output.limit) return;
+  if (output.emitted >= output.bandEnd) return;
   RunBuffer samples, colours;
   for (int begin = 0; writes && begin < count; begin += kRun) {
     const int length = std::min(kRun, count - begin);
@@ -125,7 +126,8 @@ void emit_row(PELOJ_JDINFO& jd, const Source& source, int count) {
       continue;
     }
     const Run rgb = Model::rgb(in, length, output, colours);
-    uint8_t* out = output.plane[0] + output.emitted * output.rowStep + begin * output.pixelStep;
+    uint8_t* out = output.plane[0] + (output.emitted - output.firstRow) * output.rowStep +
+                   begin * output.pixelStep;
     output.pack(rgb.channel[0], rgb.channel[1], rgb.channel[2], length, out, output.pixelStep);
   }
   ++output.emitted;
@@ -142,6 +144,16 @@ void set_planes(PELOJ_JDINFO& jd, uint8_t* buffer, const Placement& p, int64_t h
   jd.output.plane[2] = buffer + p.pitch * height + chromaPitch * ((height + 1) >> 1) + chroma;
 }
 
+// Chooses the packer of the state's format; its bytes a pixel, 0 for an unknown code: rows are then counted
+// only.
+int choose_packer(PELOJ_JDINFO& jd) {
+  jd.output.dither =
+      jd.outFormat == TAVIRPELO_RGB565_DITHER && jd.colourSpace == ColourSpace::kYcc ? 1 : 0;
+  const int format = jd.outFormat == TAVIRPELO_RGB565_DITHER ? TAVIRPELO_RGB565 : jd.outFormat;
+  jd.output.pack = jd.output.dither ? dithered_packer() : opaque_packer(format);
+  return jd.output.pack == nullptr ? 0 : bytes_per_pixel(format);
+}
+
 }  // namespace
 
 void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option) {
@@ -152,21 +164,34 @@ void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option) {
   auto* bytes = static_cast<uint8_t*>(buffer);
 
   jd.output = {};
-  jd.output.limit = jd.targetHeight;
+  jd.output.limit = jd.output.bandEnd = jd.targetHeight;
   if (buffer == nullptr) return;
   if (jd.outFormat == TAVIRPELO_YUV420) {
     set_planes(jd, bytes, p, tight ? target.height : jd.bufferHeight);
     return;
   }
-  jd.output.dither =
-      jd.outFormat == TAVIRPELO_RGB565_DITHER && jd.colourSpace == ColourSpace::kYcc ? 1 : 0;
-  const int format = jd.outFormat == TAVIRPELO_RGB565_DITHER ? TAVIRPELO_RGB565 : jd.outFormat;
-  jd.output.pack = jd.output.dither ? dithered_packer() : opaque_packer(format);
-  if (jd.output.pack == nullptr) return;  // an unknown code: rows are counted only
-  const int size = bytes_per_pixel(format);
+  const int size = choose_packer(jd);
+  if (size == 0) return;
   jd.output.plane[0] = bytes + p.first * size;
   jd.output.pixelStep = static_cast<ptrdiff_t>(p.pixelStep * size);
   jd.output.rowStep = static_cast<ptrdiff_t>(p.rowStep * size);
+}
+
+void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows) {
+  RowOutput& output = jd.output;
+  output.firstRow = output.emitted;
+  output.bandEnd = output.emitted + std::min(rows, output.limit - output.emitted);
+  output.planar = jd.outFormat == TAVIRPELO_YUV420;
+  const int size = output.planar ? 1 : choose_packer(jd);
+  const int used = output.planar ? 3 : 1;
+  bool complete = planes != nullptr && size != 0;
+  for (int c = 0; complete && c < used; ++c) {
+    output.plane[c] = planes[c];
+    complete = planes[c] != nullptr;
+  }
+  if (!complete) output.plane[0] = nullptr;
+  output.pixelStep = size;
+  output.rowStep = static_cast<ptrdiff_t>(int64_t{jd.bufferWidth} * size);
 }
 
 }  // namespace pelo::jpeg

@@ -12,7 +12,7 @@ typedef struct PELOJ_JDINFO PELOJ_JDINFO;
 namespace pelo::jpeg {
 
 // Where and how rows are written. Rows are addressed from their number, so that no pointer is formed
-// outside the buffer; one past `limit` is counted but never written.
+// outside the buffer; none past `bandEnd` is written.
 struct RowOutput {
   uint8_t* plane[3];    // first pixel; null writes nothing
   ptrdiff_t pixelStep;  // bytes between neighbours of a written row
@@ -21,12 +21,18 @@ struct RowOutput {
   int dither;           // YCbCr sources only
   int emitted;          // rows delivered
   int limit;            // rows to deliver
+  int firstRow;         // the row that the planes begin with
+  int bandEnd;          // rows to deliver before the planes change; the whole picture's: limit
   PackRow pack;
 };
 
 // Sets the output position and the packer of the state's format, rotation and target size; `buffer` holds
 // bufferWidth x bufferHeight pixels, or exactly the picture when the fitting is tight.
 void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option);
+
+// Sends the next `rows` rows to planes of their own, unrotated and bufferWidth wide; formats of one plane
+// use the first. A null plane writes nothing.
+void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows);
 
 }  // namespace pelo::jpeg
 

@@ -10,14 +10,14 @@ namespace pelo::jpeg {
 namespace {
 
 // One row function: how it decodes, and what it says.
-struct RowFunction {
+struct RowDecoder {
   int (*decodeRow)(PELOJ_JDINFO*);
   const char* aborted;
   const char* failed;
 };
 
 // Decodes the next iMCU row into the sample rows. Returns its status, 201 for a failure.
-int fill_sample_rows(PELOJ_JDINFO& jd, const RowFunction& function) {
+int fill_sample_rows(PELOJ_JDINFO& jd, const RowDecoder& function) {
   if (jd.checkFn != nullptr && jd.checkFn(jd.decInfo, jd.output.emitted, jd.rowsDone) == 0) {
     log_error(function.aborted);
     return PELOJ_FAIL;
@@ -34,7 +34,7 @@ int fill_sample_rows(PELOJ_JDINFO& jd, const RowFunction& function) {
   return status;
 }
 
-int process(PELOJ_JDINFO& jd, const RowFunction& function, int* rowCounter, int rowsWanted) {
+int process(PELOJ_JDINFO& jd, const RowDecoder& function, int* rowCounter, int rowsWanted) {
   int status = 0;
   if (!jd.bufferFull) {
     status = fill_sample_rows(jd, function);
@@ -47,6 +47,27 @@ int process(PELOJ_JDINFO& jd, const RowFunction& function, int* rowCounter, int 
 }
 
 }  // namespace
+
+RowFunction row_function(const PELOJ_JDINFO& jd) {
+  const bool full = jd.scale == kFull;
+  if (needs_all_scans(jd)) {
+    return full ? PELOJ_ProgProcessData : PELOJ_ProgProcessData_resize;
+  }
+  return full ? PELOJ_ProcessData : PELOJ_ProcessData_resize;
+}
+
+int show_rows(PELOJ_JDINFO& jd) {
+  const RowFunction process = row_function(jd);
+  while (jd.rowsDone < jd.usedHeight && jd.output.emitted < jd.output.bandEnd) {
+    int rows = 0;
+    const int status = process(&jd, &rows, 1);
+    jd.rowsDone += rows;
+    if (status == PELOJ_FAIL || status == PELOJ_IMAGE_DONE) return status;
+    if (rows == 0) break;
+  }
+  return jd.rowsDone < jd.usedHeight && jd.output.emitted < jd.output.limit ? 0 : PELOJ_IMAGE_DONE;
+}
+
 }  // namespace pelo::jpeg
 
 using namespace pelo::jpeg;

@@ -12,3 +12,16 @@ TAVIRPELO_API int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter
 // The same for progressive pictures.
 TAVIRPELO_API int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
 TAVIRPELO_API int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
+
+namespace pelo::jpeg {
+
+using RowFunction = int (*)(PELOJ_JDINFO*, int*, int);
+
+// The row function of the state's frame type and scale.
+[[nodiscard]] RowFunction row_function(const PELOJ_JDINFO& jd);
+
+// Delivers rows up to the end of the band. 101 when the picture is complete or its data has ended quietly,
+// 201 when a row could not be decoded; the rows written stand.
+int show_rows(PELOJ_JDINFO& jd);
+
+}  // namespace pelo::jpeg

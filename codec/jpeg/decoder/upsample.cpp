@@ -91,9 +91,11 @@ void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
   if (jdInfo->readPosition >= jdInfo->vMax) replicate_row_group(*jdInfo);
   const int rows = std::min(jdInfo->vMax - jdInfo->readPosition, capacity - *rowCounter);
   jdInfo->continueFlag = 1;
-  while (jdInfo->continueFlag && jdInfo->output.emitted < jdInfo->output.limit) {
+  while (jdInfo->continueFlag && jdInfo->output.emitted < jdInfo->output.bandEnd) {
     jdInfo->convert(jdInfo, rows);
   }
+  // A band that ends inside an input row goes on with it in the next one.
+  if (jdInfo->continueFlag && jdInfo->output.emitted < jdInfo->output.limit) return;
   *rowCounter += rows;
   advance(*jdInfo, rows);
 }
