@@ -29,6 +29,28 @@ TAVIRPELO_API int elo_dec_jpeg_from_file(const char* path, TAVIRPELO_RAWINFO* ra
 TAVIRPELO_API int elo_dec_jpeg_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
                                            uint32_t option);
 
+/* ---- JPEG in bands ----
+ * A picture of any size, stretched to exactly width x height, decoded a band of rows at a time: memory
+ * holds one row of blocks and the caller's band. The rows equal those of TAVIRPELO_DecodeJPEG with
+ * TAVIRPELO_FIT_STRETCH and TAVIRPELO_THUMBNAIL_NEVER; rotation does not apply. */
+
+struct PELOJ_JDINFO;
+
+/* Starts a decode of the object's source in a pixel format. The object must outlive the state and is not
+ * to be used for anything else meanwhile; its outFormat and fitting stay changed. Null on failure, with a
+ * line in the log. */
+TAVIRPELO_API struct PELOJ_JDINFO* __elo_jpeg_dec_line_init(TAVIRPELO_DECINFO* decInfo, int width,
+                                                            int height, int outFormat);
+
+/* Decodes the next `rows` rows (fewer at the picture's end) into planes[0], packed; TAVIRPELO_YUV420 has
+ * three planes, and a band then brings the chroma of its even picture rows. 1, also behind the last row,
+ * for no rows, and when the data ends within the last 16 rows, which stay as they were; 0 when the data is
+ * damaged or CheckFn aborts: the state is gone then, and so is it for null. */
+TAVIRPELO_API int __elo_jpeg_dec_line_process(struct PELOJ_JDINFO* state, uint8_t* const* planes, int rows);
+
+/* Ends a decode at any point, and releases the state; null is ignored. */
+TAVIRPELO_API void __elo_jpeg_dec_line_finish(struct PELOJ_JDINFO* state);
+
 /* ---- JPEG on a decoder information object ---- */
 
 /* Decodes into a buffer of reqWidth x reqHeight pixels of decInfo->outFormat, fitted and rotated by
