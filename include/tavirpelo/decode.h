@@ -76,4 +76,33 @@ TAVIRPELO_API int PELOJ_GetDecSize(const TAVIRPELO_DECINFO* decInfo, int* width,
 TAVIRPELO_API int PELOJ_RotateImage90(void* buffer, int width, int height, int outFormat);
 TAVIRPELO_API int PELOJ_RotateImage270(void* buffer, int width, int height, int outFormat);
 
+/* ---- PNG on a decoder information object ----
+ *
+ * Output formats 0, 1 and 5 to 8; with others the size is found and nothing is written. The picture is
+ * written at its own size when it fits the width x height box, else shrunk into it, centred; with
+ * TAVIRPELO_FIT_STRETCH it fills the box, with TAVIRPELO_FIT_TIGHT the buffer holds exactly the picture.
+ * Formats 0 and 1 show transparent pixels over what the buffer holds; the others store their alpha.
+ * Rotation is not applied, except to resampled interlaced pictures whose option bits 12 to 13 are 1: these
+ * are gathered whole first. From memory, several IDAT chunks are merged inside the caller's buffer, which
+ * therefore must be writable. */
+
+/* Decodes the whole picture. 1, or 0. */
+TAVIRPELO_API int TAVIRPELOI_DecodePNG(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+
+/* Decodes the next `lines` output rows into the first rows of `output` (0: all of them). 1 when the picture
+ * is complete, 4 when rows remain, 0 on failure. Interlaced pictures: only with `lines` equal to their
+ * height. */
+TAVIRPELO_API int TAVIRPELOI_DecodePNGLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
+                                           int lines);
+
+/* Decodes one block of compressed data. 1 when the picture is complete, 4 when data remain, 0 on
+ * failure. */
+TAVIRPELO_API int TAVIRPELOI_DecodePNGIter(TAVIRPELO_DECINFO* decInfo, void* output, int width,
+                                           int height);
+
+/* End a decode by lines or blocks before its picture is complete. 1, or 0 for null or another format's
+ * state. */
+TAVIRPELO_API int TAVIRPELOI_DestroyPNGInfo(TAVIRPELO_DECINFO* decInfo);
+TAVIRPELO_API int TAVIRPELOI_AbortPNGIter(TAVIRPELO_DECINFO* decInfo);
+
 #endif

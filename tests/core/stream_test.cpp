@@ -8,44 +8,15 @@
 #include "codec/core/ground/buffered_source.h"
 #include "platform/fault_injection.h"
 #include "tavirpelo/tavirpelo.h"
-#include "tests/support/jpeg_samples.h"
+#include "tests/support/memory_stream.h"
 
 namespace tests {
 namespace {
 
-// A stream over bytes that counts its calls and can misbehave.
-struct Stream {
-  Bytes bytes;
-  size_t at = 0;
-  int limit = INT_MAX;  // most bytes a read delivers
-  int lie = 0;          // added to what a read reports
-  int resets = 0, skips = 0;
-};
-
-int read(void* context, void* destination, int length) {
-  auto& s = *static_cast<Stream*>(context);
-  const size_t count = std::min({static_cast<size_t>(std::min(length, s.limit)), s.bytes.size() - s.at});
-  std::memcpy(destination, s.bytes.data() + s.at, count);
-  s.at += count;
-  return static_cast<int>(count) + s.lie;
-}
-
-int skip(void* context, int, int count) {
-  auto& s = *static_cast<Stream*>(context);
-  ++s.skips;
-  s.at = std::min(s.bytes.size(), s.at + static_cast<size_t>(count));
-  return static_cast<int>(s.at);
-}
-
-int reset(void* context, int, int) {
-  auto& s = *static_cast<Stream*>(context);
-  ++s.resets;
-  s.at = 0;
-  return -1;
-}
+using Stream = MemoryStream;
 
 TAVIRPELO_IO* open(Stream& s) {
-  return TAVIRPELO_Open_Stream(&s, read, skip, reset, static_cast<int>(s.bytes.size()));
+  return TAVIRPELO_Open_Stream(&s, stream_read, stream_skip, stream_reset, static_cast<int>(s.bytes.size()));
 }
 
 TEST(Streams, SeekByResettingAndSkipping) {
@@ -132,7 +103,7 @@ TEST(Streams, PicturesDecodeAsFromMemory) {
   EXPECT_EQ(1, TAVIRPELO_DecodeJPEG(info, expected.data(), 50, 40));
   TAVIRPELO_DestroyDecInfo(info);
   info =
-      TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), read, skip, reset, 1, 0);
+      TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), stream_read, stream_skip, stream_reset, 1, 0);
   TAVIRPELO_HINFO header;
   EXPECT_EQ(TAVIRPELO_FORMAT_JPEG, TAVIRPELO_Parser(info, &header));
   EXPECT_EQ(50, header.width);
@@ -151,7 +122,7 @@ TEST(Streams, ShortMemoryAtEveryStep) {
     gTAVIRPELO_Error = 0;
     pelo::faults::allocations.arm(k);
     TAVIRPELO_DECINFO* info =
-        TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), read, skip, reset, 1, 0);
+        TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), stream_read, stream_skip, stream_reset, 1, 0);
     const bool callback = PELOJ_SetCallback(
                               info, [](intptr_t, int) {}, 1) != 0;
     TAVIRPELO_HINFO header;
