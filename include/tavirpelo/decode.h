@@ -105,4 +105,42 @@ TAVIRPELO_API int TAVIRPELOI_DecodePNGIter(TAVIRPELO_DECINFO* decInfo, void* out
 TAVIRPELO_API int TAVIRPELOI_DestroyPNGInfo(TAVIRPELO_DECINFO* decInfo);
 TAVIRPELO_API int TAVIRPELOI_AbortPNGIter(TAVIRPELO_DECINFO* decInfo);
 
+/* ---- GIF on a decoder information object ----
+ * `output` is a buffer of width x height pixels of decInfo->outFormat (0, 1, 5, 7, 8, 10 or 11; for
+ * others the picture is decoded and nothing written), fitted and rotated by decInfo->option; fill acts
+ * as fit inside. Transparent pixels are zero bytes. A picture reduced on both sides is averaged; one
+ * that is not turned then fills a box smaller than its reduced size whole. What an image does not cover
+ * keeps the buffer's bytes. decInfo->outWidth and outHeight receive the size before rotation.
+ * Operations of several calls hold their state in decInfo->pFormatInfo and want the same width, height,
+ * format and option each time: a different request ends them with 0, and another decoder's state is
+ * answered with 0. 0 also means: null, negative size, no GIF, damaged data, a screen, row or plane
+ * above 256 MiB, short memory. A file cut inside the image is decoded as far as it goes. */
+
+/* Decodes the first image; ends a GIF operation that the object holds. 1 or 0. */
+TAVIRPELO_API int TAVIRPELOI_DecodeGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+
+/* Decodes the next `lines` (at least 1) rows of outHeight to the start of `output`, which holds that
+ * many rows of `width` pixels: unrotated, centred from left to right only. 1, with pFormatInfo null once
+ * all rows are done (a further call starts over); 0 on failure. */
+TAVIRPELO_API int TAVIRPELOI_DecodeGIFLine(TAVIRPELO_DECINFO* decInfo, void* output, int width,
+                                           int height, int lines);
+
+/* The first image in steps: the first call prepares, each later one decodes 16 image rows. 4 while
+ * there are more, 1 at the end, also when the data turn out damaged; 0 when the first call fails. */
+TAVIRPELO_API int TAVIRPELOI_DecodeGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width,
+                                           int height);
+
+/* The next frame of an animation, every row of the screen composed from the frames so far; pixels that
+ * none has painted are zero bytes. 1: another frame follows; 3: this was the last one; 0: failure, also
+ * a file that ends behind this frame without a trailer. */
+TAVIRPELO_API int TAVIRPELOI_DecodeAGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+
+/* The same in steps of 16 image rows: 4 until the frame is complete. */
+TAVIRPELO_API int TAVIRPELOI_DecodeAGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width,
+                                            int height);
+
+/* End an operation of several calls and release its state. 1, or 0 for null or another decoder's state. */
+TAVIRPELO_API int TAVIRPELOI_AbortGIFIter(TAVIRPELO_DECINFO* decInfo);
+TAVIRPELO_API int TAVIRPELOI_AborAGIF(TAVIRPELO_DECINFO* decInfo);
+
 #endif
