@@ -1,0 +1,197 @@
+// Stills and animations against giflib, pixel for pixel.
+#ifdef TAVIR_HAVE_GIFLIB
+
+#include <gif_lib.h>
+
+#include "tests/gif/gif_decode.h"
+
+namespace tests {
+namespace {
+
+struct Input {
+  const Bytes& bytes;
+  size_t at = 0;
+};
+
+int read_input(GifFileType* gif, GifByteType* target, int length) {
+  auto& input = *static_cast<Input*>(gif->UserData);
+  const size_t count = std::min(static_cast<size_t>(length), input.bytes.size() - input.at);
+  std::memcpy(target, input.bytes.data() + input.at, count);
+  input.at += count;
+  return static_cast<int>(count);
+}
+
+// The file as giflib reads it, with all its images.
+class Reference {
+ public:
+  explicit Reference(const Bytes& bytes) : input_{bytes} {
+    int error = 0;
+    gif_ = DGifOpen(&input_, read_input, &error);
+    EXPECT_NE(nullptr, gif_);
+    EXPECT_EQ(GIF_OK, DGifSlurp(gif_)) << gif_->Error;
+  }
+  ~Reference() { DGifCloseFile(gif_, nullptr); }
+  const GifFileType* operator->() const { return gif_; }
+
+  int transparent(int image) const {
+    GraphicsControlBlock control;
+    return DGifSavedExtensionToGCB(gif_, image, &control) == GIF_OK ? control.TransparentColor : -1;
+  }
+  int disposal(int image) const {
+    GraphicsControlBlock control;
+    return DGifSavedExtensionToGCB(gif_, image, &control) == GIF_OK ? control.DisposalMode : 0;
+  }
+  Colour colour(int image, int index) const {
+    const ColorMapObject* map = gif_->SavedImages[image].ImageDesc.ColorMap;
+    const GifColorType& c = (map ? map : gif_->SColorMap)->Colors[index];
+    return {c.Red, c.Green, c.Blue, 255};
+  }
+
+ private:
+  Input input_;
+  GifFileType* gif_;
+};
+
+// The first image in its place on a filled screen.
+Bytes still_of(const Reference& gif, int format) {
+  const int width = gif->SWidth, height = gif->SHeight;
+  const SavedImage& image = gif->SavedImages[0];
+  Bytes out(static_cast<size_t>(width * height * pelo::bytes_per_pixel(format)), kFill);
+  for (int y = 0; y < image.ImageDesc.Height; ++y) {
+    for (int x = 0; x < image.ImageDesc.Width; ++x) {
+      const int index = image.RasterBits[y * image.ImageDesc.Width + x];
+      const Colour c = index == gif.transparent(0) ? Colour{0, 0, 0, 0} : gif.colour(0, index);
+      const int column = x + image.ImageDesc.Left, row = y + image.ImageDesc.Top;
+      if (column < width && row < height) put_pixel(out, width, column, row, packed(c, format));
+    }
+  }
+  return out;
+}
+
+void expect_equal(const GifFile& file) {
+  const Bytes bytes = file.bytes();
+  const Reference reference(bytes);
+  for (const int format : {0, 1, 5, 7, 8, 10, 11}) {
+    const GifResult result = decode_gif(bytes, file.width, file.height, format);
+    EXPECT_EQ(1, result.answer);
+    ASSERT_EQ(still_of(reference, format), result.pixels) << format;
+  }
+}
+
+TEST(GifReference, EveryCodeSizeAndRowOrder) {
+  for (int bits = 1; bits <= 8; ++bits) {
+    for (const bool interlaced : {false, true}) {
+      SCOPED_TRACE(bits);
+      expect_equal(sample_gif(201, 97, bits, interlaced));
+    }
+  }
+  for (int height = 1; height <= 20; ++height) {
+    SCOPED_TRACE(height);
+    expect_equal(sample_gif(7, height, 4, true));
+    expect_equal(sample_gif(1, height, 2, false));
+  }
+}
+
+TEST(GifReference, ClearCodesAndBlocksOfAnyLength) {
+  GifFile file = sample_gif(320, 240);
+  LzwStyle& style = file.images[0].lzw;
+  expect_equal(file);
+  style.deferClear = true;
+  expect_equal(file);
+  for (const int every : {1, 2, 700, 3838, 3839, 3840}) {
+    style.clearEvery = every;
+    expect_equal(file);
+  }
+  style = {};
+  for (const int blockBytes : {1, 2, 7, 254}) {
+    style.blockBytes = blockBytes;
+    expect_equal(file);
+  }
+  // One colour: the longest strings, each used as soon as it exists.
+  file.images[0].indices.assign(file.images[0].indices.size(), 77);
+  style = {};
+  expect_equal(file);
+}
+
+TEST(GifReference, PlacesPalettesAndTransparency) {
+  GifFile file = sample_gif(60, 40, 5);
+  GifImage& image = file.images[0];
+  image.control = GifControl{0, 7, 3};
+  expect_equal(file);
+  image.palette = sample_palette(32, 99);
+  expect_equal(file);
+  file.palette.clear();
+  expect_equal(file);
+  for (const auto& [left, top] : {std::pair(10, 5), {0, 39}, {59, 0}, {50, 30}}) {
+    image.left = left;
+    image.top = top;
+    expect_equal(file);
+  }
+  for (const char* version : {"87a", "12Z"}) {
+    file.version = version;
+    image.control.reset();
+    const Bytes bytes = file.bytes();
+    EXPECT_EQ(1, decode_gif(bytes, 60, 40).answer);
+  }
+  file.loops = true;
+  file.version = "89a";
+  expect_equal(file);
+}
+
+// Frames of any place, palette, transparency, disposal and row order, composed by the format's rules.
+TEST(GifReference, AnimationsComposed) {
+  uint32_t seed = 5;
+  const auto random = [&seed](int below) {
+    seed = seed * 1664525 + 1013904223;
+    return static_cast<int>((seed >> 8) % static_cast<uint32_t>(below));
+  };
+  for (int round = 0; round < 30; ++round) {
+    GifFile file;
+    file.width = 50;
+    file.height = 31;
+    file.palette = sample_palette(16);
+    file.background = 5;
+    file.loops = true;
+    for (int i = 0; i < 6; ++i) {
+      GifImage image;
+      image.left = random(45);
+      image.top = random(28);
+      image.width = 1 + random(50 - image.left);
+      image.height = 1 + random(31 - image.top);
+      image.indices = sample_indices(image.width, image.height, 16, seed);
+      image.interlaced = random(2) == 1;
+      image.lzw.minimumCodeSize = 4;
+      if (random(2) == 1) image.palette = sample_palette(16, seed);
+      image.control = GifControl{random(5), random(9), random(3) == 0 ? -1 : random(16)};
+      file.images.push_back(image);
+    }
+    const Bytes bytes = file.bytes();
+    const Reference reference(bytes);
+    const GifFrames result = decode_frames(bytes, 50, 31);
+    EXPECT_EQ(3, result.answer);
+    ASSERT_EQ(6u, result.frames.size());
+    Bytes canvas(50 * 31 * 4, 0);
+    for (int i = 0; i < 6; ++i) {
+      const SavedImage& image = reference->SavedImages[i];
+      const int clear = reference.transparent(i);
+      const Colour under = clear >= 0
+                               ? Colour{0, 0, 0, 0}
+                               : Colour{file.palette[15], file.palette[16], file.palette[17], 255};
+      Bytes shown = canvas;
+      for (int p = 0; p < image.ImageDesc.Width * image.ImageDesc.Height; ++p) {
+        const int x = image.ImageDesc.Left + p % image.ImageDesc.Width;
+        const int y = image.ImageDesc.Top + p / image.ImageDesc.Width;
+        const int index = image.RasterBits[p];
+        if (index != clear) put_pixel(shown, 50, x, y, packed(reference.colour(i, index), 7));
+        if (reference.disposal(i) == 2) put_pixel(canvas, 50, x, y, packed(under, 7));
+      }
+      ASSERT_EQ(shown, result.frames[static_cast<size_t>(i)]) << round << " " << i;
+      if (reference.disposal(i) < 2 || reference.disposal(i) > 3) canvas = shown;
+    }
+  }
+}
+
+}  // namespace
+}  // namespace tests
+
+#endif
