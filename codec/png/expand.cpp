@@ -2,6 +2,8 @@
 
 #include <cstring>
 
+#include "codec/pixel/packed_samples.h"
+
 namespace pelo::png {
 namespace {
 
@@ -10,15 +12,8 @@ namespace {
 // Palette indices and grey samples, looked up.
 template <int Depth>
 struct Indexed {
-  static uint32_t sample(const uint8_t* row, size_t x) {
-    if constexpr (Depth >= 8) return row[x * (Depth / 8)];
-    constexpr size_t kPerByte = 8 / Depth;
-    const auto shift =
-        static_cast<uint32_t>((kPerByte - 1 - x % kPerByte) * Depth);  // first pixel highest
-    return uint32_t{row[x / kPerByte]} >> shift & ((1u << Depth) - 1);
-  }
   static void pixel(const SampleMeaning& meaning, const uint8_t* row, size_t x, uint8_t* rgba) {
-    std::memcpy(rgba, meaning.colours[sample(row, x)].data(), 4);
+    std::memcpy(rgba, meaning.colours[packed_sample<Depth>(row, x)].data(), 4);
   }
 };
 

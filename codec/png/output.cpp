@@ -9,12 +9,12 @@
 #include "codec/core/ground/byte_order.h"
 #include "codec/pixel/blend.h"
 #include "codec/pixel/packers.h"
+#include "codec/pixel/pixel_runs.h"
 #include "codec/png/png_context.h"
 
 namespace pelo::png {
 namespace {
 
-constexpr int kRun = 256;                                   // pixels expanded at a time
 constexpr uint32_t kGatherMask = 0x3000, kGather = 0x1000;  // option bits
 
 bool writes(int format) {
@@ -32,12 +32,12 @@ bool one_to_one(const PELOI_PNGCONTEXT& context) {
 template <class Store>
 void for_runs(const OutputState& output, ExpandRow expand, const uint8_t* row, const uint32_t* columns,
               uint32_t begin, int count, Store store) {
-  uint8_t rgba[4 * kRun];
-  for (int i = 0; i < count; i += kRun) {
-    const int length = std::min(kRun, count - i);
-    expand(output.meaning, row, columns, begin + static_cast<uint32_t>(i), length, rgba);
-    store(rgba, i, length);
-  }
+  for_pixel_runs(
+      count,
+      [&](int first, int length, uint8_t* rgba) {
+        expand(output.meaning, row, columns, begin + static_cast<uint32_t>(first), length, rgba);
+      },
+      store);
 }
 
 // A whole output row from a scanline of the full width.

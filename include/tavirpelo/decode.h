@@ -19,15 +19,54 @@ TAVIRPELO_API int TAVIRPELO_DecodeImageFromFile(const char* path, TAVIRPELO_RAWI
 TAVIRPELO_API int TAVIRPELO_DecodeImageFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
                                                   uint32_t option);
 
+/* Of one format. */
 TAVIRPELO_API int TAVIRPELO_DecodeJpegFromFile(const char* path, TAVIRPELO_RAWINFO* raw,
                                                uint32_t option);
 TAVIRPELO_API int TAVIRPELO_DecodeJpegFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                                 uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodePngFromFile(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodePngFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                                uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeGifFromFile(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeGifFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                                uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeBmpFromFile(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeBmpFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                                uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeWBmpFromFile(const char* path, TAVIRPELO_RAWINFO* raw,
+                                               uint32_t option);
+TAVIRPELO_API int TAVIRPELO_DecodeWBmpFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
                                                  uint32_t option);
 
 /* The same without argument checks. */
 TAVIRPELO_API int elo_dec_jpeg_from_file(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
 TAVIRPELO_API int elo_dec_jpeg_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
                                            uint32_t option);
+TAVIRPELO_API int elo_dec_png_from_file(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int elo_dec_png_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                          uint32_t option);
+TAVIRPELO_API int elo_dec_gif_from_file(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int elo_dec_gif_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                          uint32_t option);
+TAVIRPELO_API int elo_dec_bmp_from_file(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int elo_dec_bmp_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                          uint32_t option);
+TAVIRPELO_API int elo_dec_wbmp_from_file(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option);
+TAVIRPELO_API int elo_dec_wbmp_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                           uint32_t option);
+
+/* Decode the next frame of an animated GIF, composed. *handle is null before the first frame, and the
+ * source, size and format stay the same from frame to frame. 1 when more frames may follow; 3 with the last
+ * one; 0 on failure: with 3 and 0 *handle is null again. A caller that stops earlier ends the operation with
+ * TAVIRPELOI_AborAGIF and TAVIRPELO_DestroyDecInfo. */
+TAVIRPELO_API int TAVIRPELO_DecodeAGifFromFile(const char* path, TAVIRPELO_RAWINFO* raw,
+                                               uint32_t option, TAVIRPELO_DECINFO** handle);
+TAVIRPELO_API int TAVIRPELO_DecodeAGifFromBuffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                                 uint32_t option, TAVIRPELO_DECINFO** handle);
+TAVIRPELO_API int elo_dec_agif_from_file(const char* path, TAVIRPELO_RAWINFO* raw, uint32_t option,
+                                         TAVIRPELO_DECINFO** handle);
+TAVIRPELO_API int elo_dec_agif_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
+                                           uint32_t option, TAVIRPELO_DECINFO** handle);
 
 /* ---- JPEG in bands ----
  * A picture of any size, stretched to exactly width x height, decoded a band of rows at a time: memory
@@ -142,5 +181,32 @@ TAVIRPELO_API int TAVIRPELOI_DecodeAGIFIter(TAVIRPELO_DECINFO* decInfo, void* ou
 /* End an operation of several calls and release its state. 1, or 0 for null or another decoder's state. */
 TAVIRPELO_API int TAVIRPELOI_AbortGIFIter(TAVIRPELO_DECINFO* decInfo);
 TAVIRPELO_API int TAVIRPELOI_AborAGIF(TAVIRPELO_DECINFO* decInfo);
+/* ---- BMP and WBMP on a decoder information object ----
+ *
+ * BMP: file and memory sources of 1, 4, 8, 16, 24 and 32 bits a pixel without compression, in output formats
+ * 0, 1 and 5 to 8; with others nothing is written. Placed in the width x height buffer like a JPEG, never
+ * filled; turned by the option word; larger pictures are averaged down. Rows that the source lacks keep what
+ * the buffer held. */
+
+/* Decodes the whole picture. 1, or 0 for headers that are damaged or not supported. */
+TAVIRPELO_API int TAVIRPELOI_DecodeBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+
+/* Decode the next `lines` (100) output rows; all calls get the same buffer and sizes. 1 for progress, with
+ * decInfo->pFormatInfo null when the picture is complete; DecodeBMPIter answers 4 until then. 0 on
+ * failure. */
+TAVIRPELO_API int TAVIRPELOI_DecodeBMPIterLine(TAVIRPELO_DECINFO* decInfo, void* output, int width,
+                                               int height, int lines);
+TAVIRPELO_API int TAVIRPELOI_DecodeBMPLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
+                                           int lines);
+TAVIRPELO_API int TAVIRPELOI_DecodeBMPIter(TAVIRPELO_DECINFO* decInfo, void* output, int width,
+                                           int height);
+
+/* Ends a decode by rows before its picture is complete. 1, or 0 for null or another format's state. */
+TAVIRPELO_API int TAVIRPELOI_AbortBMPIter(TAVIRPELO_DECINFO* decInfo);
+
+/* Decodes a wireless bitmap (type 0) of a file or memory source in output format 0 or 1; with others nothing
+ * is written. Centred; only the option word TAVIRPELO_FIT_STRETCH matters. 1, or 0 for a damaged header or
+ * a source shorter than the picture. */
+TAVIRPELO_API int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
 
 #endif

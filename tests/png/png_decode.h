@@ -1,4 +1,4 @@
-// One PNG decode with guard bytes around the buffer.
+// One PNG decode from memory.
 #pragma once
 
 #include "codec/png/png_driver.h"

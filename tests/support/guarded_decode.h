@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <string>
 
 #include "codec/pixel/packers.h"
 #include "tavirpelo/tavirpelo.h"
@@ -51,6 +52,10 @@ inline DecInfo open_stream(MemoryStream& stream, int format, uint32_t option = 0
   return DecInfo(TAVIRPELO_CreateDecInfoWithStream(&stream, static_cast<int>(stream.bytes.size()),
                                                    stream_read, stream_skip, stream_reset, format,
                                                    option));
+}
+inline DecInfo open_file(const std::string& path, int format, uint32_t option = 0) {
+  return DecInfo(TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_FILE, const_cast<char*>(path.c_str()), 0, format,
+                                         option));
 }
 
 }  // namespace tests
