@@ -23,5 +23,6 @@ void register_job(Job job);
 // The jobs, over a large photograph.
 void register_decode_jobs(const Bytes& photograph);
 void register_slide_jobs(const Bytes& photograph);
+void register_png_jobs(const Bytes& photograph);
 
 }  // namespace bench

@@ -53,5 +53,6 @@ int main(int argc, char** argv) {
   bench::Bytes photograph{std::istreambuf_iterator<char>(file), {}};
   bench::register_decode_jobs(photograph);
   bench::register_slide_jobs(photograph);
+  bench::register_png_jobs(photograph);
   return benchmark::RunSpecifiedBenchmarks() == 0 ? 1 : 0;
 }
