@@ -6,6 +6,7 @@
 #include "codec/bmp/bmp_record.h"
 #include "codec/core/ground/axis_stepper.h"
 #include "codec/core/ground/byte_order.h"
+#include "codec/core/ground/geometry.h"
 #include "codec/pixel/packers.h"
 
 namespace pelo::bmp {
@@ -127,13 +128,6 @@ bool read_headers(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
 
 // ---- output ----
 
-// Inside the box with its proportions; the width decides where both would fit.
-Size fit(Size picture, Size box) {
-  const int64_t height = int64_t{picture.height} * box.width / picture.width;
-  if (height <= box.height) return {box.width, static_cast<int>(height)};
-  return {static_cast<int>(int64_t{picture.width} * box.height / picture.height), box.height};
-}
-
 void choose_size(PELOI_BMPRECORD& record) {
   const uint32_t rotation = record.option & TAVIRPELO_ROTATE_MASK;
   const bool sideways = rotation == TAVIRPELO_ROTATE_90 || rotation == TAVIRPELO_ROTATE_270;
@@ -143,7 +137,7 @@ void choose_size(PELOI_BMPRECORD& record) {
   Size out = box;
   if ((record.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_STRETCH) {
     record.oneToOne = picture.width <= box.width && picture.height <= box.height;
-    out = record.oneToOne ? picture : fit(picture, box);
+    out = fit_by_width(picture.width, picture.height, box);
   }
   record.outWidth = out.width;
   record.outHeight = out.height;

@@ -8,8 +8,7 @@
 #include "codec/bmp/bmp_record.h"
 #include "codec/core/ground/byte_order.h"
 #include "codec/pixel/packed_samples.h"
-#include "codec/pixel/pixel_runs.h"
-#include "codec/pixel/rgba_store.h"
+#include "codec/pixel/pixel_layout.h"
 
 namespace pelo::bmp {
 namespace {
@@ -42,21 +41,29 @@ struct ByteSource {
   }
 };
 
+// Neighbouring pixels get a loop of their own: its constant stride is what vectorises.
+template <class Layout, class Pixel>
+void store_pixels(uint8_t* output, int count, ptrdiff_t pixelStep, Pixel pixel) {
+  const auto store = [&](int x, uint8_t* out) {
+    uint8_t rgba[4];
+    pixel(static_cast<size_t>(x), rgba);
+    Layout::store(out, rgba[0], rgba[1], rgba[2], rgba[3]);
+  };
+  if (pixelStep == Layout::kBytes) {
+    for (int x = 0; x < count; ++x) store(x, output + x * Layout::kBytes);
+  } else {
+    for (int x = 0; x < count; ++x) store(x, output + x * pixelStep);
+  }
+}
+
 template <class Source>
 void write_row(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
                const PELOI_BMPCOLOURS& colours) {
-  if (!writes(format)) return;
-  const StoreRgba store = rgba_storer(format, Alpha::kIgnored);
-  for_pixel_runs(
-      width,
-      [&](int first, int length, uint8_t* rgba) {
-        for (int i = 0; i < length; ++i) {
-          Source::pixel(colours, row, static_cast<size_t>(first + i), rgba + 4 * i);
-        }
-      },
-      [&](const uint8_t* rgba, int first, int length) {
-        store(rgba, length, output + first * pixelStep, pixelStep);
-      });
+  visit_layout(format, [&](auto layout) {
+    store_pixels<decltype(layout)>(output, width, pixelStep, [&](size_t x, uint8_t* rgba) {
+      Source::pixel(colours, row, x, rgba);
+    });
+  });
 }
 
 // Adds two pixels of a row to each output pixel's word, a quarter of each channel.
@@ -77,22 +84,14 @@ void add_row(PELOI_BMPRECORD& record, const uint8_t* row) {
 
 template <bool KeepsAlpha>
 void write_words(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pixelStep, int format) {
-  if (!writes(format)) return;
-  const StoreRgba store = rgba_storer(format, Alpha::kIgnored);
-  for_pixel_runs(
-      width,
-      [&](int first, int length, uint8_t* rgba) {
-        for (int i = 0; i < length; ++i) {
-          const uint32_t word = words[first + i];
-          rgba[4 * i] = static_cast<uint8_t>(word >> 16);
-          rgba[4 * i + 1] = static_cast<uint8_t>(word >> 8);
-          rgba[4 * i + 2] = static_cast<uint8_t>(word);
-          rgba[4 * i + 3] = KeepsAlpha ? static_cast<uint8_t>(word >> 24) : 255;
-        }
-      },
-      [&](const uint8_t* rgba, int first, int length) {
-        store(rgba, length, output + first * pixelStep, pixelStep);
-      });
+  visit_layout(format, [&](auto layout) {
+    store_pixels<decltype(layout)>(output, width, pixelStep, [words](size_t x, uint8_t* rgba) {
+      rgba[0] = static_cast<uint8_t>(words[x] >> 16);
+      rgba[1] = static_cast<uint8_t>(words[x] >> 8);
+      rgba[2] = static_cast<uint8_t>(words[x]);
+      rgba[3] = KeepsAlpha ? static_cast<uint8_t>(words[x] >> 24) : 255;
+    });
+  });
 }
 
 // How a bit count is decoded.

@@ -8,6 +8,7 @@
 
 #include "codec/bmp/row_reader.h"
 #include "codec/core/ground/axis_stepper.h"
+#include "codec/core/ground/geometry.h"
 #include "codec/core/ground/output_grid.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/packers.h"
@@ -55,20 +56,6 @@ bool read_header(TAVIRPELO_IO* io, Wbmp& wbmp) {
   if (io->ioType != TAVIRPELO_IO_FILE) return false;
   uint8_t head[kHeadBytes];
   return parse(head, TAVIRPELO_Read_IO(io, head, kHeadBytes), wbmp);
-}
-
-// Halves of the fitted side are truncated, the side of the larger ratio deciding.
-Size fitted(const Wbmp& wbmp, Size box) {
-  if (box.width == 0 || box.height == 0) return {0, 0};
-  const int64_t width = wbmp.width, height = wbmp.height;
-  if (width <= box.width && height <= box.height)
-    return {static_cast<int>(width), static_cast<int>(height)};
-  const float across = static_cast<float>(width) / static_cast<float>(box.width);
-  const float down = static_cast<float>(height) / static_cast<float>(box.height);
-  if (across >= down) {
-    return {box.width, static_cast<int>(std::min<int64_t>(box.width * height / width, box.height))};
-  }
-  return {static_cast<int>(std::min<int64_t>(width * box.height / height, box.width)), box.height};
 }
 
 // Black or white in an output format.
@@ -182,7 +169,8 @@ int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   if (int64_t{wbmp.height} * wbmp.rowBytes + wbmp.dataOffset > io->size) return 0;
 
   const bool stretch = decInfo->option == TAVIRPELO_FIT_STRETCH;
-  const pelo::Size out = stretch ? pelo::Size{width, height} : fitted(wbmp, {width, height});
+  const pelo::Size out =
+      stretch ? pelo::Size{width, height} : pelo::fit_by_ratio(wbmp.width, wbmp.height, {width, height});
   decInfo->outWidth = out.width;
   decInfo->outHeight = out.height;
   if (out.width == 0 || out.height == 0 || wbmp.width == 0 || wbmp.height == 0) return 1;

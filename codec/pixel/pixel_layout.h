@@ -80,4 +80,33 @@ using Bgr565 = Swapped<Rgb565>;
 using Bgr888 = Swapped<Rgb888>;
 
 }  // namespace layout
+
+// Calls visit(Layout()) with the layout of an output format that decoders of pixels with alpha write: 0,
+// 1 and 5 to 8. False, without a call, for other formats.
+template <class Visit>
+bool visit_layout(int format, Visit visit) {
+  switch (format) {
+    case TAVIRPELO_RGB565:
+      visit(layout::Rgb565());
+      return true;
+    case TAVIRPELO_RGB888:
+      visit(layout::Rgb888());
+      return true;
+    case TAVIRPELO_ARGB8888:
+      visit(layout::Argb8888());
+      return true;
+    case TAVIRPELO_RGB565A8:
+      visit(layout::Rgb565Alpha());
+      return true;
+    case TAVIRPELO_RGBA8888:
+      visit(layout::Rgba8888());
+      return true;
+    case TAVIRPELO_BGRA8888:
+      visit(layout::Bgra8888());
+      return true;
+    default:
+      return false;
+  }
+}
+
 }  // namespace pelo

@@ -137,41 +137,20 @@ void write_interlaced(PELOI_PNGCONTEXT& context, const uint8_t* row) {
 
 // ---- set-up ----
 
-struct Fit {
-  uint32_t width, height;
-  bool whole;
-};
-
-// The picture's size in a box: as it is when it fits, else shrunk to the box with its proportions, the
-// side of the larger ratio deciding.
-Fit fit(uint32_t width, uint32_t height, uint32_t boxWidth, uint32_t boxHeight) {
-  if (width <= boxWidth && height <= boxHeight) return {width, height, true};
-  if (boxWidth == 0 || boxHeight == 0) return {0, 0, false};
-  const float across = static_cast<float>(width) / static_cast<float>(boxWidth);
-  const float down = static_cast<float>(height) / static_cast<float>(boxHeight);
-  if (across >= down) {
-    const uint64_t fitted = uint64_t{boxWidth} * height / width;
-    return {boxWidth, static_cast<uint32_t>(std::min<uint64_t>(fitted, boxHeight)), false};
-  }
-  const uint64_t fitted = uint64_t{boxHeight} * width / height;
-  return {static_cast<uint32_t>(std::min<uint64_t>(fitted, boxWidth)), boxHeight, false};
-}
-
 bool sideways(const PELOI_PNGCONTEXT& context) {
   return context.rotation == 90 || context.rotation == 270;
 }
 
 void choose_size(PELOI_PNGCONTEXT& context) {
   const Request& request = context.request;
-  auto boxWidth = static_cast<uint32_t>(request.width);
-  auto boxHeight = static_cast<uint32_t>(request.height);
-  if (sideways(context)) std::swap(boxWidth, boxHeight);
+  const int64_t width = context.info.width, height = context.info.height;
+  Size box{request.width, request.height};
+  if (sideways(context)) std::swap(box.width, box.height);
   const bool stretch = (request.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_STRETCH;
-  const Fit size = stretch ? Fit{boxWidth, boxHeight, false}
-                           : fit(context.info.width, context.info.height, boxWidth, boxHeight);
-  context.output.width = size.width;
-  context.output.height = size.height;
-  context.info.wholeMultiple = size.whole ? 1 : 0;
+  const Size size = stretch ? box : fit_by_ratio(width, height, box);
+  context.output.width = static_cast<uint32_t>(size.width);
+  context.output.height = static_cast<uint32_t>(size.height);
+  context.info.wholeMultiple = !stretch && size.width == width && size.height == height ? 1 : 0;
 }
 
 bool map_columns(PELOI_PNGCONTEXT& context) {

@@ -25,4 +25,14 @@ struct Placement {
 // option word's rotation bits; a tight buffer is exactly as large as the turned picture.
 Placement place(Size buffer, Size target, uint32_t option);
 
+// ---- fitting with proportions ----
+// The decoders shrink a picture into a box by two rules that can differ by a pixel. A picture that fits
+// stays as it is; a fitted side may come out 0.
+
+// PNG and WBMP: the side of the larger ratio, in single precision, decides.
+Size fit_by_ratio(int64_t width, int64_t height, Size box);
+
+// BMP: the box's width, when the height that belongs to it fits; else the box's height.
+Size fit_by_width(int64_t width, int64_t height, Size box);
+
 }  // namespace pelo
