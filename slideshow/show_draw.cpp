@@ -26,6 +26,13 @@ Decode decoder_of(int format) {
   switch (format) {
     case TAVIRPELO_FORMAT_JPEG:
       return TAVIRPELO_DecodeJPEG;
+    case TAVIRPELO_FORMAT_BMP:
+      return TAVIRPELOI_DecodeBMP;
+    case TAVIRPELO_FORMAT_PNG:
+      return TAVIRPELOI_DecodePNG;
+    case TAVIRPELO_FORMAT_GIF:
+    case TAVIRPELO_FORMAT_ANIMATED_GIF:
+      return TAVIRPELOI_DecodeGIF;
     default:
       return nullptr;
   }

@@ -181,6 +181,7 @@ TAVIRPELO_API int TAVIRPELOI_DecodeAGIFIter(TAVIRPELO_DECINFO* decInfo, void* ou
 /* End an operation of several calls and release its state. 1, or 0 for null or another decoder's state. */
 TAVIRPELO_API int TAVIRPELOI_AbortGIFIter(TAVIRPELO_DECINFO* decInfo);
 TAVIRPELO_API int TAVIRPELOI_AborAGIF(TAVIRPELO_DECINFO* decInfo);
+
 /* ---- BMP and WBMP on a decoder information object ----
  *
  * BMP: file and memory sources of 1, 4, 8, 16, 24 and 32 bits a pixel without compression, in output formats
