@@ -1,9 +1,9 @@
 // vss list: the pictures of a show, as a table or as JSON.
 #include <memory>
 
+#include "tools/common/json_text.h"
 #include "tools/vss/arguments.h"
 #include "tools/vss/commands.h"
-#include "tools/vss/json_text.h"
 #include "tools/vss/show_file.h"
 
 namespace vss {
@@ -32,8 +32,8 @@ void print_json(const SlideShow& show) {
     fmt::print(
         "{}\n  {{\"index\": {}, \"name\": {}, \"source\": {}, \"width\": {}, \"height\": {}, "
         "\"bytes\": {}, \"offset\": {}}}",
-        i == 0 ? "" : ",", i, json_text(entry.name), json_text(entry.path), entry.width, entry.height,
-        show.GetSizeOfSubfile(i), entry.offset);
+        i == 0 ? "" : ",", i, tool::json_text(entry.name), tool::json_text(entry.path), entry.width,
+        entry.height, show.GetSizeOfSubfile(i), entry.offset);
   }
   fmt::print("]}}\n");
 }

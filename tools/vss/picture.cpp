@@ -2,10 +2,9 @@
 // file.
 #include "tools/vss/picture.h"
 
-#include <cerrno>
-#include <cstdio>
-#include <cstring>
 #include <filesystem>
+
+#include "tools/common/output.h"
 
 namespace vss {
 namespace {
@@ -29,10 +28,6 @@ void copy_opaque(const uint8_t* source, uint8_t* target, int width) {
 bool same_file(const std::string& a, const std::string& b) {
   std::error_code ignored;
   return std::filesystem::equivalent(a, b, ignored);
-}
-
-bool write_all(std::FILE* stream, const uint8_t* bytes, size_t size) {
-  return std::fwrite(bytes, 1, size, stream) == size;
 }
 
 }  // namespace
@@ -67,18 +62,10 @@ Exit write_jpeg(const SlideShow& show, const std::string& path, const TAVIRPELO_
 }
 
 Exit write_output(const SlideShow& show, const std::string& path, const uint8_t* bytes, size_t size) {
-  if (path == "-") {
-    return write_all(stdout, bytes, size) ? Exit::kDone : Exit::kWriteFailure;
-  }
-  if (same_file(path, show.pathName)) {
+  if (path != "-" && same_file(path, show.pathName)) {
     return fail(Exit::kRefused, "{}: is the show itself", path);
   }
-  std::FILE* stream = std::fopen(path.c_str(), "wb");
-  if (!stream) return fail(Exit::kWriteFailure, "{}: {}", path, std::strerror(errno));
-  bool written = write_all(stream, bytes, size);
-  bool closed = std::fclose(stream) == 0;
-  if (!written || !closed) return fail(Exit::kWriteFailure, "{}: {}", path, std::strerror(errno));
-  return Exit::kDone;
+  return tool::write_bytes(path, bytes, size);
 }
 
 }  // namespace vss

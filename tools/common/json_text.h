@@ -4,9 +4,9 @@
 #include <string>
 #include <string_view>
 
-namespace vss {
+namespace tool {
 
 // Quoted and escaped. Bytes that are not UTF-8 become U+FFFD, so that the output always parses.
 std::string json_text(std::string_view text);
 
-}  // namespace vss
+}  // namespace tool

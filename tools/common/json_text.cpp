@@ -1,9 +1,9 @@
 // Text as a JSON string (RFC 8259, section 7).
-#include "tools/vss/json_text.h"
+#include "tools/common/json_text.h"
 
 #include <fmt/format.h>
 
-namespace vss {
+namespace tool {
 namespace {
 
 // Bytes of the well-formed UTF-8 sequence at the start of `text` (RFC 3629, section 4); 0 when there is
@@ -49,4 +49,4 @@ std::string json_text(std::string_view text) {
   return result + '"';
 }
 
-}  // namespace vss
+}  // namespace tool

@@ -1,0 +1,307 @@
+"""pelo from the outside: what it prints and writes, what it refuses, and its exit codes."""
+import json
+import os
+import pathlib
+import shutil
+import struct
+import subprocess
+import sys
+import tempfile
+import unittest
+
+sys.path.insert(0, str(pathlib.Path(__file__).parents[1] / "support"))
+import pictures  # noqa: E402
+
+DONE, USAGE, CANNOT_OPEN, REFUSED, WRITE_FAILURE = 0, 2, 3, 4, 5
+
+
+class Pixmap:
+    """A binary PPM or PGM file."""
+
+    def __init__(self, data):
+        magic, size, maximum, self.pixels = data.split(b"\n", 3)
+        self.width, self.height = map(int, size.split())
+        self.channels = {b"P5": 1, b"P6": 3}[magic]
+        assert maximum == b"255" and len(self.pixels) == self.width * self.height * self.channels
+
+    def pixel(self, x, y):
+        at = (y * self.width + x) * self.channels
+        return tuple(self.pixels[at:at + self.channels])
+
+    def size(self):
+        return self.width, self.height
+
+
+def largest_difference(a, b):
+    return max(abs(x - y) for x, y in zip(a, b, strict=True))
+
+
+class PeloTest(unittest.TestCase):
+    def setUp(self):
+        self.folder = pathlib.Path(tempfile.mkdtemp())
+        self.addCleanup(shutil.rmtree, self.folder)
+        self.photo = self.folder / "photo.jpg"
+        pictures.write_jpeg(self.photo, 160, 120)
+
+    def pelo(self, *arguments, expect=DONE, **options):
+        command = [os.environ["PELO"], *map(str, arguments)]
+        done = subprocess.run(command, stdout=options.pop("stdout", subprocess.PIPE),
+                              stderr=subprocess.PIPE, **options)
+        self.assertEqual(done.returncode, expect, f"{arguments}\n{done.stderr.decode()}")
+        # A message exactly when something is wrong.
+        self.assertEqual(bool(done.stderr), expect != DONE, done.stderr.decode())
+        return done.stdout
+
+    def decode(self, *arguments, **options):
+        return Pixmap(self.pelo("decode", *arguments, **options))
+
+    def info(self, picture):
+        return json.loads(self.pelo("info", "--json", picture))
+
+    def exiftool(self, *arguments):
+        done = subprocess.run(["exiftool", *map(str, arguments)], capture_output=True)
+        self.assertEqual(done.returncode, 0, done.stderr.decode())
+        return done.stdout
+
+    # ---- info ----
+
+    def test_info_of_each_kind(self):
+        progressive = self.folder / "progressive.jpg"
+        pictures.write_jpeg(progressive, 70, 50, None, "-progressive")
+        gif = self.folder / "two.gif"
+        frame = b"\x2c" + struct.pack("<4HB", 0, 0, 1, 1, 0) + b"\x02\x02\x44\x01\x00"
+        gif.write_bytes(b"GIF89a" + struct.pack("<2H3B", 3, 2, 0, 0, 0) + frame * 2 + b";")
+        expected = {self.photo: ("JPEG", 160, 120, 1, False), progressive: ("JPEG", 70, 50, 1, True),
+                    gif: ("animated GIF", 3, 2, 2, False)}
+        for path, (name, width, height, frames, is_progressive) in expected.items():
+            self.assertEqual(self.info(path), {
+                "picture": str(path), "format": name, "width": width, "height": height, "frames": frames,
+                "bytes": path.stat().st_size, "progressive": is_progressive, "thumbnail": None, "exif": None})
+            line = self.pelo("info", path).decode()
+            self.assertIn(f"{name}, {width}x{height}, {frames} frame", line)
+            self.assertEqual("progressive" in line.split(",")[0].replace(str(path), ""), is_progressive)
+        self.assertEqual(json.loads(self.pelo("info", "--json", "-", input=self.photo.read_bytes()))["width"], 160)
+
+    # ---- EXIF, compared with exiftool as writer and as reader ----
+
+    NUMBERS = {"orientation": "Orientation", "isoSpeed": "ISO", "flash": "Flash", "colourSpace": "ColorSpace",
+               "exposureMode": "ExposureMode", "whiteBalance": "WhiteBalance", "pixelXDimension": "ExifImageWidth",
+               "pixelYDimension": "ExifImageHeight", "resolutionUnit": "ResolutionUnit",
+               "ycbcrPositioning": "YCbCrPositioning"}
+    TEXTS = {"make": "Make", "model": "Model", "software": "Software", "rights": "Copyright",
+             "captureTime": "DateTimeOriginal", "digitizingTime": "CreateDate"}
+    RATIONALS = {"exposureTime": "ExposureTime", "fNumber": "FNumber", "exposureBias": "ExposureCompensation",
+                 "focalLength": "FocalLength", "digitalZoom": "DigitalZoomRatio", "xResolution": "XResolution",
+                 "yResolution": "YResolution"}
+
+    def write_exif(self, order, path):
+        thumbnail = self.folder / "thumbnail.jpg"
+        pictures.write_jpeg(thumbnail, 64, 48, (200, 30, 30))
+        pictures.write_jpeg(path, 160, 120, (30, 30, 200))
+        self.exiftool(
+            "-q", "-overwrite_original", f"-ExifByteOrder={order}", "-n", "-Make=Mak", "-Model=A model, 7 words",
+            "-Orientation=8", "-Software=firm 1.2", "-Copyright=\u00a9 someone", "-XResolution=300", "-YResolution=72.5",
+            "-ResolutionUnit=3", "-YCbCrPositioning=2", "-ExposureTime=0.0125", "-FNumber=2.8", "-ISO=1600",
+            "-DateTimeOriginal=2021:02:03 04:05:06", "-CreateDate=2020:01:02 03:04:05", "-ShutterSpeedValue=0.0125",
+            "-ExposureCompensation=-0.6666666667", "-EXIF:Flash=16", "-FocalLength=4.15", "-ColorSpace=1",
+            "-ExifImageWidth=7000", "-ExifImageHeight=120", "-ExposureMode=1", "-WhiteBalance=1",
+            "-DigitalZoomRatio=1.5", "-GPSLatitude=12.3456789", "-GPSLatitudeRef=S", "-GPSLongitude=98.7654321",
+            "-GPSLongitudeRef=E", "-GPSAltitude=432.1", "-GPSAltitudeRef=1", "-GPSTimeStamp=09:08:07",
+            "-GPSDateStamp=2021:02:03", "-GPSMapDatum=WGS-84", "-GPSProcessingMethod=CELLID",
+            f"-ThumbnailImage<={thumbnail}", path)
+        return thumbnail
+
+    def test_exif_agrees_with_exiftool_in_both_byte_orders(self):
+        for order in ("II", "MM"):
+            with self.subTest(order=order):
+                path = self.folder / f"{order}.jpg"
+                thumbnail = self.write_exif(order, path).read_bytes()
+                self.assertIn(b"Exif\0\0" + order.encode(), path.read_bytes()[:64])
+                theirs, = json.loads(self.exiftool("-j", "-n", path))
+                ours = json.loads(self.pelo("exif", "--json", path))
+                for name, tag in self.NUMBERS.items():
+                    self.assertEqual(ours[name], theirs[tag], name)
+                for name, tag in self.TEXTS.items():
+                    self.assertEqual(ours[name], theirs[tag], name)
+                self.assertEqual(ours["exifVersion"], f"{theirs['ExifVersion']:04}")  # a number to exiftool
+                for name, tag in self.RATIONALS.items():
+                    numerator, denominator = ours[name]
+                    self.assertAlmostEqual(numerator / denominator, theirs[tag], 6, name)
+                # exiftool gives seconds, the field holds the exponent.
+                numerator, denominator = ours["shutterSpeed"]
+                self.assertAlmostEqual(2 ** -(numerator / denominator), theirs["ShutterSpeedValue"], 6)
+
+                gps = ours["gps"]
+                self.assertAlmostEqual(gps["latitude"], theirs["GPSLatitude"], 6)
+                self.assertAlmostEqual(gps["longitude"], theirs["GPSLongitude"], 6)
+                self.assertAlmostEqual(gps["altitude"], theirs["GPSAltitude"], 6)
+                self.assertLess(gps["latitude"], 0)
+                self.assertLess(gps["altitude"], 0)
+                for name, tag in {"time": "GPSTimeStamp", "date": "GPSDateStamp", "datum": "GPSMapDatum",
+                                  "method": "GPSProcessingMethod"}.items():
+                    self.assertEqual(gps[name], theirs[tag], name)
+                self.assertEqual(gps["version"].replace(".", " "), theirs["GPSVersionID"])
+
+                stored = ours["thumbnail"]
+                self.assertEqual((stored["offset"], stored["bytes"]),
+                                 (theirs["ThumbnailOffset"], theirs["ThumbnailLength"]))
+                self.assertEqual((stored["width"], stored["height"], stored["compression"]), (64, 48, 6))
+                self.assertEqual(path.read_bytes()[stored["offset"]:][:stored["bytes"]], thumbnail)
+                header = self.info(path)
+                self.assertEqual(header["exif"], ours)
+                self.assertEqual(header["thumbnail"], {"width": 64, "height": 48})
+
+    def test_exif_as_text(self):
+        path = self.folder / "text.jpg"
+        shutil.copy(self.photo, path)
+        self.exiftool("-q", "-overwrite_original", "-n", "-Make=tab\tbell\a", "-ExposureTime=0.008", path)
+        lines = dict(line.split(None, 1) for line in self.pelo("exif", path).decode().splitlines())
+        self.assertEqual(lines["make"], "tab?bell?")
+        self.assertEqual(lines["exposureTime"], "1/125")
+        self.assertNotIn("model", lines)
+        self.assertIn("  make ", self.pelo("info", path).decode())
+        self.pelo("exif", self.photo, expect=REFUSED)
+
+    # ---- decode ----
+
+    def test_decode_agrees_with_djpeg(self):
+        expected = pictures.Picture(self.photo.read_bytes())
+        for source, options in ((self.photo, {}), ("-", {"input": self.photo.read_bytes()})):
+            picture = self.decode(source, "-", **options)
+            self.assertEqual(picture.size(), (160, 120))
+            self.assertLess(largest_difference(picture.pixels, expected.pixels), 12)
+        grey = self.decode(self.photo, "-", "--pgm")
+        red, green, blue = picture.pixel(150, 20)
+        self.assertEqual(grey.channels, 1)
+        self.assertAlmostEqual(grey.pixel(150, 20)[0], 0.299 * red + 0.587 * green + 0.114 * blue, delta=0.51)
+        file = self.folder / "out.ppm"
+        self.pelo("decode", self.photo, file)
+        self.assertEqual(Pixmap(file.read_bytes()).pixels, picture.pixels)
+
+    def test_sizes_and_fits(self):
+        def size(*options):
+            return self.decode(self.photo, "-", *options).size()
+
+        self.assertEqual(size("--size", "80x80"), (80, 60))
+        self.assertEqual(size("--size", "1000x30"), (40, 30))
+        self.assertEqual(size("--size", "1000x1000"), (160, 120))
+        self.assertEqual(size("--size", "50x70", "--rotate", 90), (50, 66))
+        for fit in ("pad", "fill", "stretch"):
+            self.assertEqual(size("--size", "90x50", "--fit", fit), (90, 50))
+        padded = self.decode(self.photo, "-", "--size", "100x60", "--fit", "pad")
+        self.assertEqual(padded.pixel(5, 30), (0, 0, 0))
+        self.assertGreater(padded.pixel(50, 30)[2], 100)
+        # Red grows to the right, green downwards.
+        filled = self.decode(self.photo, "-", "--size", "60x60", "--fit", "fill")
+        self.assertGreater(filled.pixel(1, 30)[0], 25)
+        stretched = self.decode(self.photo, "-", "--size", "60x60", "--fit", "stretch")
+        self.assertLess(stretched.pixel(1, 30)[0], 15)
+
+    def test_rotation_and_modes(self):
+        red_corner = {0: (155, 5), 90: (115, 155), 180: (5, 115), 270: (5, 5)}
+        for degrees, (x, y) in red_corner.items():
+            picture = self.decode(self.photo, "-", "--rotate", degrees)
+            self.assertEqual(picture.size(), (160, 120) if degrees % 180 == 0 else (120, 160))
+            red, green, _ = picture.pixel(x, y)
+            self.assertTrue(red > 230 and green < 30, (degrees, red, green))
+        exact = self.decode(self.photo, "-").pixels
+        for mode in range(5):
+            picture = self.decode(self.photo, "-", "--mode", mode)
+            self.assertEqual(picture.size(), (160, 120))
+            self.assertLess(largest_difference(picture.pixels, exact), 30, mode)
+        self.assertNotEqual(picture.pixels, exact)
+
+    def test_raw_formats(self):
+        rgb = self.pelo("decode", self.photo, "-", "--raw", "rgb")
+        self.assertEqual(rgb, self.decode(self.photo, "-").pixels)
+        pixels = [rgb[i:i + 3] for i in range(0, len(rgb), 3)]
+        self.assertEqual(self.pelo("decode", self.photo, "-", "--raw", "argb"), b"".join(b"\xff" + p for p in pixels))
+        self.assertEqual(self.pelo("decode", self.photo, "-", "--raw", "rgba"), b"".join(p + b"\xff" for p in pixels))
+        self.assertEqual(self.pelo("decode", self.photo, "-", "--raw", "bgra"),
+                         b"".join(p[::-1] + b"\xff" for p in pixels))
+        self.assertEqual(self.pelo("decode", self.photo, "-", "--raw", "rgb565"),
+                         b"".join(struct.pack("<H", p[0] >> 3 << 11 | p[1] >> 2 << 5 | p[2] >> 3) for p in pixels))
+        self.assertEqual(len(self.pelo("decode", self.photo, "-", "--raw", "yuv420", "--size", "33x21", "--fit", "stretch")),
+                         33 * 21 + 2 * 17 * 11)
+        self.pelo("decode", self.photo, "-", "--raw", "yuv420", "--rotate", "90", expect=USAGE)
+
+    def test_embedded_thumbnails(self):
+        path = self.folder / "both.jpg"
+        self.write_exif("MM", path)  # a blue picture with a red thumbnail
+
+        def is_red(*options):
+            red, _, blue = self.decode(path, "-", *options).pixel(20, 15)
+            return red > blue
+
+        self.assertFalse(is_red("--size", "60x45"))
+        self.assertTrue(is_red("--size", "60x45", "--thumbnail", "enough"))
+        self.assertFalse(is_red("--size", "80x60", "--thumbnail", "enough"))
+        self.assertTrue(is_red("--size", "80x60", "--thumbnail", "any"))
+
+    # ---- encode ----
+
+    def test_encode(self):
+        ppm = self.folder / "in.ppm"
+        pictures.write_ppm(ppm, 48, 36)
+        sizes = []
+        for quality in (20, 60, 95):
+            jpeg = self.pelo("encode", ppm, "-", "--quality", quality)
+            seen = pictures.Picture(jpeg)
+            self.assertEqual((seen.width, seen.height), (48, 36))
+            sizes.append(len(jpeg))
+        self.assertEqual(sizes, sorted(sizes))
+        original = Pixmap(self.folder.joinpath("in.ppm").read_bytes().replace(b" 255", b"\n255", 1).replace(b"P6 ", b"P6\n", 1))
+        self.assertLess(abs(seen.pixel(40, 30)[1] - original.pixel(40, 30)[1]), 10)
+        output = self.folder / "out.jpg"
+        self.pelo("encode", "-", output, input=b"P5 # a comment\n3\t2 # another\n100\n" + bytes([0, 50, 100] * 2))
+        self.assertEqual(self.info(output)["format"], "JPEG")
+        grey = self.decode(output, "-", "--pgm")
+        self.assertLess(largest_difference(grey.pixels, bytes([0, 128, 255] * 2)), 25)
+
+    def test_what_encode_refuses(self):
+        for bad in (b"", b"P6", b"P3 1 1 255 0 0 0", b"P6 0 1 255 ", b"P6 2 1 255\n12345", b"P6 1 1 65535 abcdef",
+                    b"P6 1 1 0 abc", b"P6 99999999999 1 255 a", b"P6 1 1 255", self.photo.read_bytes()):
+            self.pelo("encode", "-", self.folder / "no.jpg", input=bad, expect=REFUSED)
+        self.pelo("encode", "-", self.folder / "no.jpg", input=b"P5 5000 1 255\n" + bytes(5000), expect=REFUSED)
+        self.assertFalse((self.folder / "no.jpg").exists())
+
+    # ---- manners ----
+
+    def test_files_that_cannot_be_used(self):
+        text = self.folder / "text.jpg"
+        text.write_text("not a picture")
+        empty = self.folder / "empty.jpg"
+        empty.touch()
+        for command, rest in (("info", ()), ("exif", ()), ("decode", ("-",))):
+            self.pelo(command, self.folder / "absent.jpg", *rest, expect=CANNOT_OPEN)
+            self.pelo(command, self.folder, *rest, expect=CANNOT_OPEN)
+            self.pelo(command, empty, *rest, expect=CANNOT_OPEN)
+            self.pelo(command, text, *rest, expect=REFUSED)
+        self.pelo("encode", self.folder / "absent.ppm", "-", expect=CANNOT_OPEN)
+        headless = self.folder / "headless.jpg"
+        headless.write_bytes(self.photo.read_bytes().replace(b"\xff\xc4", b"\xff\xfe"))  # no Huffman tables
+        self.pelo("decode", headless, "-", expect=REFUSED)
+        self.assertIn(b"TavirPelo", subprocess.run([os.environ["PELO"], "--log", "decode", headless, "-"],
+                                                   capture_output=True).stderr)
+
+    def test_full_disks(self):
+        self.pelo("decode", self.photo, "/dev/full", expect=WRITE_FAILURE)
+        self.pelo("decode", self.photo, self.folder / "missing" / "out.ppm", expect=WRITE_FAILURE)
+        with open("/dev/full", "wb") as full:
+            for command in (("info", self.photo), ("decode", self.photo, "-")):
+                self.pelo(*command, expect=WRITE_FAILURE, stdout=full)
+
+    def test_help_version_and_usage(self):
+        self.assertIn(b"Exit codes", self.pelo("--help"))
+        self.assertRegex(self.pelo("--version"), rb"^pelo \d+\.\d+\.\d+\n$")
+        for command in ("info", "exif", "decode", "encode"):
+            self.assertIn(b"picture", self.pelo(command, "--help"))
+        for wrong in ((), ("paint",), ("info",), ("decode", self.photo), ("decode", self.photo, "-", "--size", "0x5"),
+                      ("decode", self.photo, "-", "--rotate", "45"), ("decode", self.photo, "-", "--mode", "5"),
+                      ("decode", self.photo, "-", "--fit", "loose"), ("encode", self.photo, "-", "--quality", "0"),
+                      ("decode", self.photo, "-", "--pgm", "--raw", "rgb")):
+            self.pelo(*wrong, expect=USAGE)
+
+
+if __name__ == "__main__":
+    unittest.main()

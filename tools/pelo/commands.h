@@ -1,0 +1,21 @@
+// The subcommands: each file of that name adds its options to the program and, when chosen, runs.
+#pragma once
+
+#include <CLI/CLI.hpp>
+
+#include "tools/common/exit_code.h"
+
+namespace pelo_tool {
+
+using tool::Exit;
+using tool::fail;
+
+// Adds one subcommand; its outcome is stored in `result` when the command line has been read.
+using Register = void (*)(CLI::App& app, Exit& result);
+
+void register_info(CLI::App& app, Exit& result);
+void register_exif(CLI::App& app, Exit& result);
+void register_decode(CLI::App& app, Exit& result);
+void register_encode(CLI::App& app, Exit& result);
+
+}  // namespace pelo_tool

@@ -1,0 +1,40 @@
+// pelo: the image codec from the command line.
+#include "platform/android_log.h"
+#include "tools/common/program.h"
+#include "tools/pelo/commands.h"
+
+const char tool::kProgram[] = "pelo";
+
+namespace {
+
+constexpr pelo_tool::Register kCommands[] = {
+    pelo_tool::register_info,
+    pelo_tool::register_exif,
+    pelo_tool::register_decode,
+    pelo_tool::register_encode,
+};
+
+// The codec's log lines are for its developers; messages say what its callers need.
+void set_log(bool wanted) {
+#ifndef __ANDROID__
+  constexpr pelo::platform::LogSink kDiscard = [](const char*) {};
+  pelo::platform::set_log_sink(wanted ? nullptr : kDiscard);
+#else
+  static_cast<void>(wanted);
+#endif
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  CLI::App app{"Measures, decodes and encodes pictures.", tool::kProgram};
+  app.set_version_flag("--version", "pelo " PELO_VERSION);
+  app.add_flag_function(
+      "--log", [](int64_t) { set_log(true); }, "Let the codec's log through, to standard error");
+  app.require_subcommand(1);
+  app.footer(tool::footer() + "\nA picture or file named - is standard input or output.");
+  set_log(false);
+  pelo_tool::Exit result = pelo_tool::Exit::kDone;
+  for (pelo_tool::Register add : kCommands) add(app, result);
+  return tool::run(app, argc, argv, result);
+}
