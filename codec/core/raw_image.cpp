@@ -21,7 +21,8 @@ bool has_layout(int format) {
 
 // Sides are at most 5000: no product overflows.
 size_t block_size(size_t width, size_t height, int format) {
-  if (format != TAVIRPELO_YUV420) return width * height * static_cast<size_t>(pelo::bytes_per_pixel(format));
+  if (format != TAVIRPELO_YUV420)
+    return width * height * static_cast<size_t>(pelo::bytes_per_pixel(format));
   return width * height + ((height + 1) >> 1) * ((width + 1) & ~size_t{1});
 }
 
@@ -53,7 +54,9 @@ int fill(TAVIRPELO_RAWINFO* raw, uint16_t word, uint8_t r, uint8_t g, uint8_t b)
       pixel[2] = b;
       fill_pixels(*raw, pixel, 3);
       break;
-    case TAVIRPELO_YUV420: fill_planes(*raw); break;
+    case TAVIRPELO_YUV420:
+      fill_planes(*raw);
+      break;
     case TAVIRPELO_ARGB8888:
       pixel[0] = 255;
       pixel[1] = r;
@@ -104,7 +107,8 @@ void TAVIRPELO_DestroyRawInfo(TAVIRPELO_RAWINFO* raw) {
 
 int TAVIRPELO_FillRawImageWithRgb565(TAVIRPELO_RAWINFO* raw, uint16_t colour565) {
   return fill(raw, colour565, static_cast<uint8_t>(colour565 >> 8 & 0xF8),
-              static_cast<uint8_t>(colour565 >> 3 & 0xFC), static_cast<uint8_t>((colour565 & 0x1F) << 3));
+              static_cast<uint8_t>(colour565 >> 3 & 0xFC),
+              static_cast<uint8_t>((colour565 & 0x1F) << 3));
 }
 
 int TAVIRPELO_FillRawImageWithRgb888(TAVIRPELO_RAWINFO* raw, uint8_t r, uint8_t g, uint8_t b) {

@@ -9,5 +9,6 @@
 #include "tavirpelo/io.h"
 #include "tavirpelo/parse.h"
 #include "tavirpelo/raw.h"
+#include "tavirpelo/yuv.h"
 
 #endif
