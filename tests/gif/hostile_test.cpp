@@ -1,0 +1,215 @@
+// Damaged, cut and contradictory files, and memory that runs out: every decode ends inside its buffers.
+#include <sys/resource.h>
+
+#include "platform/fault_injection.h"
+#include "tests/gif/gif_decode.h"
+
+namespace tests {
+namespace {
+
+// Two images, extensions, a local palette, interlace, transparency: something of everything.
+GifFile victim() {
+  GifFile file = sample_gif(23, 19, 3);
+  file.loops = true;
+  file.images[0].control = GifControl{2, 4, 1};
+  GifImage second = sample_gif(12, 9, 4, true).images[0];
+  second.left = 5;
+  second.top = 6;
+  second.palette = sample_palette(16, 7);
+  second.control = GifControl{3, 4, -1};
+  file.images.push_back(second);
+  return file;
+}
+
+struct Answers {
+  int whole, reduced, lines, batches;
+  GifFrames frames;
+};
+
+// One file through every operation, in buffers with guards.
+Answers decode_all(Bytes file, int width = 23, int height = 19) {
+  Answers answers{};
+  answers.whole = decode_gif(file, width, height).answer;
+  answers.reduced = decode_gif(file, 5, 4, 0, 0x4).answer;
+  answers.frames = decode_frames(file, width, height);
+  decode_frames(file, 31, 40, 10, 0x70C);
+  file.shrink_to_fit();
+  const DecInfo decInfo = open_memory(file, 1);
+  if (decInfo == nullptr) return answers;
+  GuardedPixels pixels(width, height, 1, kFill);
+  int calls = 0;
+  do {
+    answers.lines = TAVIRPELOI_DecodeGIFLine(decInfo.get(), pixels.data(), width, height, height);
+  } while (decInfo->pFormatInfo != nullptr && ++calls < 10);
+  EXPECT_LE(calls, 1);
+  calls = 0;
+  do {
+    answers.batches = TAVIRPELOI_DecodeGIFIter(decInfo.get(), pixels.data(), width, height);
+  } while (answers.batches == 4 && ++calls < 70000 / 16);
+  EXPECT_NE(4, answers.batches);
+  return answers;
+}
+
+TEST(GifHostile, EveryTruncation) {
+  const GifFile file = victim();
+  const Bytes bytes = file.bytes();
+  const Bytes whole = decode_gif(bytes, 23, 19).pixels;
+  int good = 0;
+  for (size_t size = 1; size < bytes.size(); ++size) {
+    const Bytes cut(bytes.begin(), bytes.begin() + static_cast<ptrdiff_t>(size));
+    const Answers answers = decode_all(cut);
+    EXPECT_EQ(0, answers.frames.answer) << "no trailer";
+    const GifResult part = decode_gif(cut, 23, 19);
+    EXPECT_EQ(part.answer, answers.lines);
+    EXPECT_EQ(part.answer, answers.batches);
+    good += part.answer;
+    // Whole rows from the top, the rest untouched.
+    size_t row = 0;
+    const auto same = [&](const Bytes& other) {
+      const auto first = static_cast<ptrdiff_t>(row * 23 * 4);
+      return std::equal(part.pixels.begin() + first, part.pixels.begin() + first + 23 * 4,
+                        other.begin() + first);
+    };
+    while (row < 19 && same(whole)) ++row;
+    for (const Bytes empty(whole.size(), kFill); row < 19; ++row) ASSERT_TRUE(same(empty)) << size;
+  }
+  EXPECT_GT(good, 100);
+  // A source that claims to be longer than it is has not simply ended.
+  Bytes cut(bytes.begin(), bytes.begin() + 120);
+  MemoryStream stream{cut};
+  const DecInfo decInfo = open_stream(stream, 7);
+  decInfo->pIO->size = 300;
+  Bytes pixels(23 * 19 * 4);
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIF(decInfo.get(), pixels.data(), 23, 19));
+}
+
+TEST(GifHostile, EveryFlippedByte) {
+  const Bytes bytes = victim().bytes();
+  for (size_t at = 0; at < bytes.size(); ++at) {
+    for (const uint8_t mask : {0xFF, 0x01, 0x80}) {
+      Bytes damaged = bytes;
+      damaged[at] ^= mask;
+      decode_all(damaged);
+    }
+  }
+}
+
+// Every field of screen, descriptor and control at its extremes.
+TEST(GifHostile, FieldsAtTheirExtremes) {
+  const GifFile file = victim();
+  const Bytes bytes = file.bytes();
+  constexpr size_t kControl = 13 + 24 + 19 + 7;  // header, palette, application, comment
+  ASSERT_EQ(0xF9, bytes[kControl + 1]);
+  constexpr size_t kDescriptor = kControl + 8;
+  ASSERT_EQ(0x2C, bytes[kDescriptor]);
+  for (const size_t at :
+       {size_t{6}, size_t{8}, kDescriptor + 1, kDescriptor + 3, kDescriptor + 5, kDescriptor + 7}) {
+    for (const int value : {0, 1, 22, 24, 255, 256, 4095, 32767, 65535}) {
+      Bytes damaged = bytes;
+      damaged[at] = static_cast<uint8_t>(value);
+      damaged[at + 1] = static_cast<uint8_t>(value >> 8);
+      decode_all(damaged);
+      decode_all(damaged, 300, 2);
+    }
+  }
+  for (const size_t at :
+       {size_t{10}, size_t{11}, kControl + 3, kControl + 6, kDescriptor + 9, kDescriptor + 10}) {
+    for (int value = 0; value < 256; ++value) {
+      Bytes damaged = bytes;
+      damaged[at] = static_cast<uint8_t>(value);
+      decode_all(damaged);
+    }
+  }
+  GifFile flat = file;
+  flat.images[0].width = 0;
+  EXPECT_EQ(1, decode_all(flat.bytes()).whole);
+  EXPECT_EQ(3, decode_all(flat.bytes()).frames.answer)
+      << "the data of an image without pixels are passed over";
+  flat.images[0].width = 23;
+  flat.images[0].height = 0;
+  EXPECT_EQ(3, decode_all(flat.bytes()).frames.answer);
+}
+
+// More data than the image has rows, none, and a sub-block that ends it without an end code.
+TEST(GifHostile, TooMuchAndTooLittleData) {
+  GifFile file = victim();
+  const auto second = [&] { return decode_all(file.bytes()).frames; };
+  const Bytes expected = second().frames[1];
+  for (const int rows : {18, 1, 0}) {
+    GifFile less = file;
+    less.images[0].height = rows;
+    EXPECT_EQ(3, decode_all(less.bytes()).frames.answer) << "surplus data are not taken for blocks";
+  }
+  file.images[0].lzw.endCode = false;
+  EXPECT_EQ(expected, second().frames[1]);
+  file.images[0].data = Bytes{3, 0};
+  EXPECT_EQ(3, second().answer);
+  file.images[0].data = Bytes{3, 2, 0x08, 0x3B, 3, 0x3B, 0x2C, 0x3B, 0};
+  EXPECT_EQ(3, second().answer);
+}
+
+// Sizes that the header claims are not taken from memory: what is refused stays within a few megabytes.
+TEST(GifHostile, HugeSizes) {
+  GifFile file;
+  file.width = file.height = 65535;
+  GifImage image;
+  image.width = image.height = 65535;
+  image.data = Bytes{2, 2, 0x44, 0x01, 0};
+  image.interlaced = true;
+  file.images.push_back(image);
+  const Bytes bytes = file.bytes();
+  const auto peak = [] {  // KiB; what the library allocates it also clears
+    rusage usage{};
+    getrusage(RUSAGE_SELF, &usage);
+    return usage.ru_maxrss;
+  };
+  const long before = peak();
+  EXPECT_EQ(1, decode_gif(bytes, 40, 40).answer);
+  EXPECT_EQ(0, decode_frames(bytes, 40, 40).answer);
+  EXPECT_LT(peak() - before, 64 * 1024);
+  // Every index of a large screen out of little data: counted, not written.
+  file.images[0].interlaced = false;
+  std::vector<std::pair<int, int>> codes{{4, 3}, {1, 3}};
+  int width = 3;
+  for (int next = 6; next < 4096; ++next) {
+    codes.emplace_back(next, width);
+    if (next + 1 == 1 << width && width < 12) ++width;
+  }
+  for (int i = 0; i < 50000; ++i) codes.emplace_back(4095, 12);
+  file.images[0].data = image_data(2, pack_codes(codes));
+  EXPECT_EQ(1, decode_gif(file.bytes(), 7, 7).answer);
+}
+
+// Each allocation fails in turn; the decode answers 0 and holds nothing, or goes on when it could.
+TEST(GifHostile, MemoryRunsOutAtEveryAllocation) {
+  GifFile still = sample_gif(40, 30, 5, true);
+  Bytes bytes = still.bytes();
+  GuardedPixels pixels(40, 30, 7);
+  using Decode = int (*)(TAVIRPELO_DECINFO*, uint8_t*);
+  constexpr std::pair<Decode, int> kDecodes[] = {
+      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeGIF(d, out, 19, 17); }, 1},
+      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeGIFLine(d, out, 19, 17, 30); },
+       1},
+      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeGIFIter(d, out, 19, 17); }, 4},
+      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeAGIF(d, out, 19, 17); }, 3},
+  };
+  for (const auto& [decode, success] : kDecodes) {
+    int answer = 0;
+    long k = 1;
+    for (; answer == 0 && k < 20; ++k) {
+      const DecInfo decInfo = open_memory(bytes, 7);
+      pelo::faults::allocations.arm(k);
+      answer = decode(decInfo.get(), pixels.data());
+      const bool failed = pelo::faults::allocations.calls >= k;
+      pelo::faults::allocations.arm(0);
+      EXPECT_EQ(failed ? 0 : success, answer) << k;
+      if (failed) EXPECT_EQ(nullptr, decInfo->pFormatInfo);
+      TAVIRPELOI_AborAGIF(decInfo.get());
+    }
+    EXPECT_EQ(success, answer);
+    EXPECT_GT(k, 4);
+  }
+}
+
+}  // namespace
+}  // namespace tests

@@ -1,0 +1,190 @@
+// Code streams that no encoder writes, and the steps of the translation table.
+#include "codec/gif/driver.h"
+#include "codec/gif/parse.h"
+#include "codec/gif/uncalled_steps.h"
+#include "tests/gif/gif_decode.h"
+
+namespace tests {
+namespace {
+
+using Codes = std::vector<std::pair<int, int>>;
+
+// A file of one image with the given codes.
+GifFile coded(int width, int height, int minimumCodeSize, const Codes& codes) {
+  GifFile file;
+  file.width = width;
+  file.height = height;
+  file.palette = sample_palette(256);
+  GifImage image;
+  image.width = width;
+  image.height = height;
+  image.data = image_data(minimumCodeSize, pack_codes(codes));
+  file.images.push_back(image);
+  return file;
+}
+
+// The red channel tells the index; -1 where nothing was written.
+std::vector<int> decoded(const GifFile& file, int answer = 1) {
+  const GifResult result = decode_gif(file.bytes(), file.width, file.height);
+  EXPECT_EQ(answer, result.answer);
+  std::vector<int> indices;
+  for (size_t i = 0; i < result.pixels.size(); i += 4) {
+    indices.push_back(result.pixels[i + 3] == kFill ? -1 : 255 - result.pixels[i]);
+  }
+  return indices;
+}
+
+TEST(GifLzw, StartsAndEnds) {
+  using Indices = std::vector<int>;
+  const Indices none(3, -1);
+  EXPECT_EQ(none, decoded(coded(3, 1, 2, {{5, 3}}))) << "the end code first";
+  EXPECT_EQ(none, decoded(coded(3, 1, 2, {{4, 3}, {4, 3}, {5, 3}})));
+  EXPECT_EQ(none, decoded(coded(3, 1, 2, {}))) << "no data";
+  EXPECT_EQ((Indices{1, 2, 3}), decoded(coded(3, 1, 2, {{1, 3}, {2, 3}, {3, 3}, {5, 4}})))
+      << "no clear code";
+  EXPECT_EQ((Indices{1, 2, 3}), decoded(coded(3, 1, 2, {{4, 3}, {1, 3}, {2, 3}, {3, 3}})))
+      << "no end code";
+  EXPECT_EQ(none, decoded(coded(3, 1, 2, {{4, 3}, {1, 3}, {2, 3}, {5, 3}}))) << "an unfinished row";
+  EXPECT_EQ((Indices{1, 1, 1}), decoded(coded(3, 1, 2, {{4, 3}, {1, 3}, {6, 3}, {5, 3}})))
+      << "its own prefix";
+  EXPECT_EQ((Indices{1, 1, 1}), decoded(coded(3, 1, 2, {{1, 3}, {7, 3}, {5, 3}})))
+      << "beyond the next code";
+  EXPECT_EQ((Indices{6, 1, 2}), decoded(coded(3, 1, 2, {{4, 3}, {6, 3}, {1, 3}, {2, 3}})))
+      << "a first code is an index";
+  EXPECT_EQ(none, decoded(coded(3, 1, 2, {{7, 3}, {7, 3}, {1, 3}}))) << "no string before: ends quietly";
+  EXPECT_EQ((Indices{1, 2, 1, 2, 2, 1}), decoded(coded(3, 2, 2, {{1, 3}, {2, 3}, {6, 3}, {7, 4}})));
+  EXPECT_EQ((Indices{1, 2, 3, -1, -1, -1}),
+            decoded(coded(3, 2, 2, {{1, 3}, {2, 3}, {3, 3}, {5, 4}, {1, 4}})));
+  EXPECT_EQ(0, decode_gif(coded(3, 1, 12, {{1, 13}}).bytes(), 3, 1).answer);
+}
+
+// An animation goes on with code 0 where a still ends.
+TEST(GifLzw, AnimationsGoOnWithoutAStringBefore) {
+  const GifFile file = coded(5, 1, 2, {{7, 3}, {7, 3}, {1, 3}, {2, 4}, {5, 4}});
+  const GifFrames result = decode_frames(file.bytes(), 5, 1, 1);
+  EXPECT_EQ(3, result.answer);
+  std::vector<int> indices;
+  for (size_t i = 0; i < 15; i += 3) indices.push_back(255 - result.frames[0][i]);
+  EXPECT_EQ((std::vector<int>{7, 0, 0, 1, 2}), indices);
+}
+
+// Minimum sizes of 9 to 11 bits have indices above 255, of which the low byte counts.
+TEST(GifLzw, LargeMinimumCodeSizes) {
+  for (int n = 9; n <= 11; ++n) {
+    const GifFile file =
+        coded(4, 1, n, {{1 << n, n + 1}, {300, n + 1}, {511, n + 1}, {(1 << n) + 2, n + 1}});
+    EXPECT_EQ((std::vector<int>{44, 255, 44, 255}), decoded(file)) << n;
+  }
+  for (const int n : {0, 1}) {  // whatever they mean, they end
+    for (const uint8_t byte : {0x00, 0x55, 0xAA, 0xFF, 0x1B}) {
+      GifFile file = coded(300, 9, n, {});
+      file.images[0].data = image_data(n, Bytes(900, byte));
+      decode_gif(file.bytes(), 300, 9);
+      decode_gif(file.bytes(), 30, 9);
+      decode_frames(file.bytes(), 300, 9);
+    }
+  }
+}
+
+// Rows that no output row is made of are counted, not written; what follows them is the same.
+TEST(GifLzw, SkippedRowsLeaveNoTrace) {
+  for (int round = 0; round < 40; ++round) {
+    const int width = 1 + round * round % 113, height = 200;
+    GifFile file = sample_gif(width, height, 2 + round % 7, round % 3 == 1);
+    if (round % 5 == 0) file.images[0].indices.assign(static_cast<size_t>(width * height), 1);
+    for (size_t y = 0; y < height; y += 25) file.images[0].indices[y * static_cast<size_t>(width)] = 2;
+    file.images[0].lzw.deferClear = round % 2 == 1;
+    for (const int rows : {1, 3, 7, 64}) {
+      const Bytes bytes = file.bytes();
+      const GifResult some = decode_gif(bytes, width, rows, 7, 0x700);
+      const GifResult all = decode_gif(bytes, width, height);
+      for (int y = 0; y < rows; ++y) {
+        const auto first = static_cast<ptrdiff_t>((height / 2 + y * height) / rows) * width * 4;
+        ASSERT_TRUE(std::equal(all.pixels.begin() + first, all.pixels.begin() + first + width * 4,
+                               some.pixels.begin() + static_cast<ptrdiff_t>(y) * width * 4))
+            << round << " " << rows << " " << y;
+      }
+    }
+  }
+}
+
+TEST(GifLzw, TranslationTableSteps) {
+  static pelo::gif::TranslationTable table;
+  EXPECT_EQ(0, PELOI_InitializeTransTBL(12, &table));
+  ASSERT_EQ(1, PELOI_InitializeTransTBL(3, &table));
+  Bytes line(4200), expected{5};
+  uint32_t code = 5;
+  int error = 0;
+  for (uint32_t next = 10; next < 4096; ++next) {  // ever longer strings
+    PELOI_AddToTranslationTable(code, static_cast<uint8_t>(next), next, &table);
+    expected.push_back(static_cast<uint8_t>(next));
+    code = next;
+    ASSERT_EQ(5, PELOI_TranslateCode(code, &table, 3, line.data(), &error));
+    ASSERT_TRUE(std::equal(expected.begin(), expected.end(), line.begin() + 3)) << next;
+  }
+  EXPECT_EQ(0, error);
+  PELOI_TranslateCode(4096, &table, 0, line.data(), &error);
+  EXPECT_EQ(1, error);
+  PELOI_WriteCharacter(0x1FE, 7, line.data());
+  EXPECT_EQ(0xFE, line[7]);
+  EXPECT_EQ(0xABCDu, PELOI_DecoderBufferToOutBit(0xABCD));
+}
+
+TEST(GifLzw, ColourTablesArePackedInLanes) {
+  const Bytes rgb{1, 2, 3, 255, 0, 128};
+  uint32_t table[3] = {7, 7, 7};
+  PELOI_MakeColorTable(rgb.data(), 2, table);
+  EXPECT_EQ(1u << 20 | 2u << 10 | 3, table[0]);
+  EXPECT_EQ(255u << 20 | 128, table[1]);
+  EXPECT_EQ(7u, table[2]);
+  const Bytes corners[4] = {{0, 10, 255}, {100, 10, 255}, {0, 20, 255}, {100, 20, 255}};
+  uint8_t middle[3];
+  _interpolate_rgb888(corners[0].data(), corners[1].data(), corners[2].data(), corners[3].data(), 128,
+                      64, middle);
+  EXPECT_EQ(50, middle[0]);
+  EXPECT_EQ(13, middle[1]);
+  EXPECT_EQ(255, middle[2]);
+}
+
+// Any version letter, the fields of a graphic control, blocks of no meaning between images.
+TEST(GifParse, HeaderAndExtensions) {
+  GifFile file = sample_gif(4, 4, 2);
+  for (const auto& [version, answer] :
+       {std::pair("87a", 1), {"12Z", 1}, {"8xa", 0}, {"891", 0}, {"89{", 0}}) {
+    file.version = version;
+    EXPECT_EQ(answer, decode_gif(file.bytes(), 4, 4).answer) << version;
+  }
+  file.version = "89a";
+  file.images[0].control = GifControl{3, 7, 255};
+  Bytes bytes = file.bytes();
+  const DecInfo decInfo = open_memory(bytes, 7);
+  uint8_t output[64];
+  pelo::gif::Record* record = PELOI_InitializeGIF(decInfo.get(), 4, 4, 0, output);
+  ASSERT_NE(nullptr, record);
+  EXPECT_EQ(-1, record->control.transparentIndex);
+  EXPECT_EQ(1, PELOI_SeekImageData(decInfo->pIO, record));
+  EXPECT_EQ(70, record->control.delay);
+  EXPECT_EQ(3, record->control.disposal);
+  EXPECT_EQ(255, record->control.transparentIndex);
+  EXPECT_EQ(2, record->minimumCodeSize);
+  PELOI_DelGIFDecoderInfo(record);
+  PELOI_DelGIFDecoderInfo(nullptr);
+
+  constexpr ptrdiff_t kBlocks = 13 + 12;  // behind the header and four colours
+  ASSERT_EQ(0xF9, bytes[kBlocks + 1]);
+  for (const auto& [at, value] : {std::pair(2, 5), {2, 3}, {7, 1}}) {  // block size, terminator
+    Bytes bad = bytes;
+    bad[static_cast<size_t>(kBlocks + at)] = static_cast<uint8_t>(value);
+    EXPECT_EQ(0, decode_gif(bad, 4, 4).answer);
+  }
+  // Bytes of no meaning, an unknown extension of which only the label goes, plain text.
+  const Bytes odd{0, 0x77, 0x21, 0xFA, 5, 0x21, 0x01, 2, 0x2C, 0x3B, 0};
+  bytes.insert(bytes.begin() + kBlocks, odd.begin(), odd.end());
+  EXPECT_EQ(1, decode_gif(bytes, 4, 4).answer);
+  EXPECT_EQ(decode_gif(file.bytes(), 4, 4).pixels, decode_gif(bytes, 4, 4).pixels);
+  file.images.clear();
+  EXPECT_EQ(0, decode_gif(file.bytes(), 4, 4).answer) << "no image";
+}
+
+}  // namespace
+}  // namespace tests

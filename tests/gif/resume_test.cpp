@@ -1,0 +1,185 @@
+// Decodes in several calls: the same pixels as in one, whatever the split, and no mixing of requests.
+#include "codec/core/ground/format_state.h"
+#include "codec/gif/record.h"
+#include "tests/gif/gif_decode.h"
+
+namespace tests {
+namespace {
+
+struct Request {
+  int width, height;
+  uint32_t option;
+};
+
+std::vector<GifFile> pictures() {
+  std::vector<GifFile> files;
+  for (const bool interlaced : {false, true}) {
+    files.push_back(sample_gif(53, 41, 5, interlaced));
+    files.push_back(sample_gif(20, 24, 3, interlaced));
+    files.back().width = 53;
+    files.back().height = 41;
+    files.back().images[0].left = 9;
+    files.back().images[0].top = 8;
+    files.back().images[0].control = GifControl{0, 0, 2};
+  }
+  return files;
+}
+
+// Lines are delivered at the top of each call's buffer; rows above and below the image are untouched.
+Bytes by_lines(const GifFile& file, const Request& r, int lines, int format = 7) {
+  Bytes bytes = file.bytes(), all;
+  const DecInfo decInfo = open_memory(bytes, format, r.option);
+  for (int row = 0; row == 0 || row < decInfo->outHeight; row += lines) {
+    GuardedPixels pixels(r.width, lines, format, kFill);
+    EXPECT_EQ(1, TAVIRPELOI_DecodeGIFLine(decInfo.get(), pixels.data(), r.width, r.height, lines));
+    const bool more = row + lines < decInfo->outHeight;
+    EXPECT_EQ(more, decInfo->pFormatInfo != nullptr) << row << " " << lines;
+    const Bytes content = pixels.content();
+    const int count =
+        std::min(lines, decInfo->outHeight - row) * r.width * pelo::bytes_per_pixel(format);
+    EXPECT_TRUE(
+        std::all_of(content.begin() + count, content.end(), [](uint8_t b) { return b == kFill; }));
+    all.insert(all.end(), content.begin(), content.begin() + count);
+  }
+  return all;
+}
+
+TEST(GifResume, LinesInAnySplit) {
+  for (const GifFile& file : pictures()) {
+    const Request requests[] = {
+        {53, 41, 0}, {61, 41, 0}, {53, 20, 0x700}, {80, 90, 0x700}, {53, 41, 0x100}};
+    for (const Request& r : requests) {
+      for (const int format : {1, 7}) {
+        const Bytes whole = decode_gif(file.bytes(), r.width, r.height, format, r.option).pixels;
+        for (int lines = 1; lines <= r.height + 1; ++lines) {
+          ASSERT_EQ(whole, by_lines(file, r, lines, format)) << r.width << " " << lines;
+        }
+      }
+    }
+    // Reduced on both sides, lines are sampled, not averaged; turned requests come unturned.
+    const Bytes reduced = by_lines(file, {20, 15, 0x700}, 4);
+    EXPECT_EQ(reduced, by_lines(file, {20, 15, 0x700}, 15));
+    EXPECT_EQ(reduced, by_lines(file, {20, 15, 0x704}, 7));
+  }
+}
+
+TEST(GifResume, BatchesOfSixteenRows) {
+  for (const GifFile& file : pictures()) {
+    for (const Request& r : {Request{53, 41, 0}, {20, 15, 0}, {53, 15, 0x700}, {60, 60, 0x4}}) {
+      Bytes bytes = file.bytes();
+      const DecInfo decInfo = open_memory(bytes, 7, r.option);
+      GuardedPixels pixels(r.width, r.height, 7, kFill);
+      std::vector<int> answers;
+      do {
+        answers.push_back(TAVIRPELOI_DecodeGIFIter(decInfo.get(), pixels.data(), r.width, r.height));
+      } while (answers.back() == 4 && answers.size() < 100);
+      EXPECT_EQ(1, answers.back());
+      EXPECT_EQ(static_cast<size_t>(1 + (file.images[0].height + 15) / 16), answers.size());
+      EXPECT_EQ(nullptr, decInfo->pFormatInfo);
+      EXPECT_EQ(decode_gif(bytes, r.width, r.height, 7, r.option).pixels, pixels.content());
+    }
+  }
+}
+
+TEST(GifResume, FramesInBatches) {
+  GifFile file = sample_gif(40, 50, 4);
+  file.images.push_back(pictures()[3].images[0]);
+  file.images.push_back(file.images[0]);
+  file.images[2].interlaced = true;
+  for (const Request& r : {Request{40, 50, 0}, {17, 99, 0x700}, {60, 60, 0xC}}) {
+    const GifFrames whole = decode_frames(file.bytes(), r.width, r.height, 7, r.option);
+    ASSERT_EQ(3u, whole.frames.size());
+    Bytes bytes = file.bytes();
+    const DecInfo decInfo = open_memory(bytes, 7, r.option);
+    for (size_t i = 0; i < 3; ++i) {
+      GuardedPixels pixels(r.width, r.height, 7, kFill);
+      int answer, calls = 0;
+      do {
+        answer = TAVIRPELOI_DecodeAGIFIter(decInfo.get(), pixels.data(), r.width, r.height);
+        // The one-call form takes over in the middle of a frame.
+        if (i == 1 && ++calls == 2) {
+          answer = TAVIRPELOI_DecodeAGIF(decInfo.get(), pixels.data(), r.width, r.height);
+        }
+      } while (answer == 4);
+      EXPECT_EQ(i < 2 ? 1 : 3, answer);
+      EXPECT_EQ(whole.frames[i], pixels.content()) << i;
+    }
+    EXPECT_EQ(nullptr, decInfo->pFormatInfo);
+  }
+}
+
+TEST(GifResume, AnotherRequestEndsTheDecode) {
+  Bytes bytes = sample_gif(30, 30, 4).bytes(), output(30 * 40 * 4);
+  const DecInfo decInfo = open_memory(bytes, 7);
+  TAVIRPELO_DECINFO* d = decInfo.get();
+  const auto lines = [&](int width, int height) {
+    return TAVIRPELOI_DecodeGIFLine(d, output.data(), width, height, 5);
+  };
+  const auto started = [&] { return lines(30, 30) == 1 && d->pFormatInfo != nullptr; };
+  const auto ends = [&](int answer) { return answer == 0 && d->pFormatInfo == nullptr; };
+  ASSERT_TRUE(started());
+  EXPECT_TRUE(ends(lines(30, 40)));
+  ASSERT_TRUE(started());
+  EXPECT_TRUE(ends(lines(29, 30)));
+  ASSERT_TRUE(started());
+  d->outFormat = 1;
+  EXPECT_TRUE(ends(lines(30, 30)));
+  d->outFormat = 7;
+  ASSERT_TRUE(started());
+  d->option = 4;
+  EXPECT_TRUE(ends(lines(30, 30)));
+  d->option = 0;
+  ASSERT_TRUE(started());
+  EXPECT_TRUE(ends(TAVIRPELOI_DecodeGIFIter(d, output.data(), 30, 30)));
+  ASSERT_TRUE(started());
+  EXPECT_TRUE(ends(TAVIRPELOI_DecodeAGIF(d, output.data(), 30, 30)));
+  ASSERT_TRUE(started());
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIFLine(d, output.data(), 30, 30, 0));
+  EXPECT_NE(nullptr, d->pFormatInfo) << "a call for no rows changes nothing";
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIFLine(d, nullptr, 30, 30, 5));
+  EXPECT_EQ(0, lines(-1, 30));
+  EXPECT_EQ(1, TAVIRPELOI_DecodeGIF(d, output.data(), 10, 10)) << "a whole decode starts afresh";
+  EXPECT_EQ(nullptr, d->pFormatInfo);
+  ASSERT_TRUE(started());
+  EXPECT_EQ(1, TAVIRPELOI_AborAGIF(d));
+  EXPECT_EQ(nullptr, d->pFormatInfo);
+  EXPECT_EQ(1, TAVIRPELOI_AbortGIFIter(d));
+  EXPECT_EQ(0, TAVIRPELOI_AbortGIFIter(nullptr));
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIF(nullptr, output.data(), 1, 1));
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIF(d, output.data(), 1, -1));
+}
+
+TEST(GifResume, AnotherDecodersStateIsLeftAlone) {
+  Bytes bytes = sample_gif(8, 8, 2).bytes(), output(8 * 8 * 4, kFill);
+  const DecInfo decInfo = open_memory(bytes, 7);
+  pelo::FormatState foreign{pelo::FormatKind::kBmp};
+  decInfo->pFormatInfo = &foreign;
+  TAVIRPELO_DECINFO* d = decInfo.get();
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIF(d, output.data(), 8, 8));
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIFLine(d, output.data(), 8, 8, 1));
+  EXPECT_EQ(0, TAVIRPELOI_DecodeGIFIter(d, output.data(), 8, 8));
+  EXPECT_EQ(0, TAVIRPELOI_DecodeAGIF(d, output.data(), 8, 8));
+  EXPECT_EQ(0, TAVIRPELOI_AbortGIFIter(d));
+  EXPECT_EQ(&foreign, d->pFormatInfo);
+  EXPECT_EQ(Bytes(8 * 8 * 4, kFill), output);
+  d->pFormatInfo = nullptr;
+}
+
+// Streams and files that deliver what is asked for, or only a few bytes at a time.
+TEST(GifResume, StreamsGiveWhatMemoryGives) {
+  GifFile file = sample_gif(120, 90, 8);
+  file.images.push_back(file.images[0]);
+  for (const int limit : {INT_MAX, 1000, 1}) {
+    MemoryStream stream{file.bytes()};
+    stream.limit = limit;
+    const DecInfo decInfo = open_stream(stream, 7);
+    Bytes pixels(120 * 90 * 4);
+    EXPECT_EQ(1, TAVIRPELOI_DecodeGIF(decInfo.get(), pixels.data(), 120, 90));
+    EXPECT_EQ(decode_gif(stream.bytes, 120, 90).pixels, pixels);
+    EXPECT_EQ(1, TAVIRPELOI_DecodeAGIF(decInfo.get(), pixels.data(), 120, 90));
+    EXPECT_EQ(3, TAVIRPELOI_DecodeAGIF(decInfo.get(), pixels.data(), 120, 90));
+  }
+}
+
+}  // namespace
+}  // namespace tests
