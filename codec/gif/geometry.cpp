@@ -8,10 +8,6 @@
 namespace pelo::gif {
 namespace {
 
-int scaled(int side, int numerator, int denominator) {
-  return static_cast<int>(int64_t{side} * numerator / denominator);
-}
-
 // The least row o whose centre floor((height / 2 + o * height) / rows) is not above the screen row.
 int64_t first_row(const Sampling& s, int64_t screenRow) {
   const int64_t height = s.from.height;
@@ -29,15 +25,8 @@ Size box_of(const Record& record) {
 
 Size fit_screen(Size screen, Size box, uint32_t option) {
   if ((option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_STRETCH) return box;
-  if (box.width >= screen.width && box.height >= screen.height) return screen;
-  Size fitted = screen;
-  if (box.width < screen.width) {
-    fitted = {box.width, scaled(screen.height, box.width, screen.width)};
-  }
-  if (box.height < fitted.height) {
-    fitted = {scaled(screen.width, box.height, screen.height), box.height};
-  }
-  return fitted;
+  if (screen.width == 0) return {0, std::min(screen.height, box.height)};
+  return fit_by_width(screen.width, screen.height, box);
 }
 
 Size reduced_size(const Record& record) {

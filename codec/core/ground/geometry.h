@@ -32,7 +32,7 @@ Placement place(Size buffer, Size target, uint32_t option);
 // PNG and WBMP: the side of the larger ratio, in single precision, decides.
 Size fit_by_ratio(int64_t width, int64_t height, Size box);
 
-// BMP: the box's width, when the height that belongs to it fits; else the box's height.
+// BMP and GIF: the box's width, when the height that belongs to it fits; else the box's height.
 Size fit_by_width(int64_t width, int64_t height, Size box);
 
 }  // namespace pelo
