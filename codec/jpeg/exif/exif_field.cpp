@@ -12,16 +12,14 @@ int PELOJ_ReadExifField(const tiff::Structure* tiff, const uint8_t* entry, PELOJ
   *field = {head.tag, head.type, head.count, tiff::load32(head.field, tiff->order), 0, nullptr};
 
   const uint64_t length = uint64_t{unit} * head.count;
+  if (unit == 2 && head.count == 2) return 0;
   if (unit == 1 && head.count <= 4) {
     field->value = head.field;
-  } else if (unit == 2 && head.count == 2) {
-    return 0;
   } else if ((unit == 2 || unit == 4) && head.count == 1) {
     field->number = *head.first_value();
-  } else if (tiff->holds(field->number, length)) {
-    field->value = tiff->data + field->number;
   } else {
-    return 0;
+    if (!tiff->holds(field->number, length)) return 0;
+    field->value = tiff->data + field->number;
   }
   field->length = static_cast<uint32_t>(length);  // fits: four bytes or inside the structure
   return 1;

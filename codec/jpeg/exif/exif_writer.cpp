@@ -132,7 +132,7 @@ uint8_t* __elo_WriteASCIITag(uint8_t* entry, uint8_t* base, uint32_t* position, 
 
 uint32_t __elo_CreateExif(uint8_t* tiff, const ELO_EXIFCONTENT* content, uint32_t capacity) {
   if (tiff == nullptr || content == nullptr || exif_size(*content) > capacity) return 0;
-  std::memcpy(tiff, "II", 2);
+  tiff[0] = tiff[1] = 'I';
   __elo_WriteSHORT_LE(tiff + 2, 42);
   __elo_WriteLONG_LE(tiff + 4, tiff::kHeaderSize);
   const uint32_t end = put_image_directory(tiff, *content);
