@@ -143,6 +143,50 @@ class VssTest(unittest.TestCase):
         self.assertEqual(self.vss("settings", self.show).decode().split(), changed)
         self.assertEqual(self.names(), ["small"])
 
+    def test_pictures_are_removed(self):
+        self.create(self.wide, self.tall, self.small, self.wide)
+        self.vss("insert", self.show, 1, self.small, "--name", "between")
+        stale = self.show.read_bytes()
+        self.vss("compact", self.show)
+        self.assertEqual(self.show.read_bytes(), stale[:-MARK])
+        self.vss("remove", self.show, 4, 0, 2)
+        self.assertEqual(self.names(), ["between", "small"])
+        before = self.show.read_bytes()
+        self.assertEqual(len(before), HEADER + MARK + sum(RECORD + entry["bytes"] for entry in self.listed()))
+        for wrong in ((0, 2), (-1,)):
+            self.vss("remove", self.show, *wrong, expect=REFUSED)
+        self.assertEqual(self.show.read_bytes(), before)
+        self.vss("remove", self.show, 0, 1)
+        self.assertEqual(self.show.stat().st_size, HEADER + MARK)
+        self.assertEqual(self.listed(), [])
+
+    def test_music_goes_in_and_comes_back(self):
+        self.create(self.small)
+        before = self.show.read_bytes()
+        tune = self.folder / "tune"
+        tune.write_bytes(bytes(range(256)) * 600)
+        for command in ("remove", "get"):
+            self.vss("music", command, self.show, *["-"] * (command == "get"), expect=REFUSED)
+        self.vss("music", "add", self.show, self.folder / "absent", expect=CANNOT_OPEN)
+        self.vss("music", "add", self.show, self.folder, expect=CANNOT_OPEN)
+        self.vss("music", "add", self.show, "/dev/null", expect=CANNOT_OPEN)
+        self.assertEqual(self.show.read_bytes(), before)
+        self.vss("music", "add", self.show, tune)
+        self.vss("music", "add", self.show, tune, expect=REFUSED)
+        self.assertEqual(json.loads(self.vss("list", "--json", self.show))["musicBytes"], 256 * 600)
+        self.assertEqual(self.names(), ["small"])
+        self.assertEqual(self.vss("music", "get", self.show, "-"), tune.read_bytes())
+        copied = self.folder / "copied"
+        self.vss("music", "get", self.show, copied)
+        self.assertEqual(copied.read_bytes(), tune.read_bytes())
+        self.vss("music", "get", self.show, self.show, expect=REFUSED)
+        self.vss("music", "remove", self.show)
+        # The old end mark stays in front of the new one.
+        self.assertEqual(len(self.show.read_bytes()), len(before) + MARK)
+        self.vss("compact", self.show)
+        self.assertEqual(len(self.show.read_bytes()), len(before))
+        self.assertEqual(self.names(), ["small"])
+
     def test_refusals_leave_the_show_as_it_was(self):
         self.create(self.small)
         before = self.show.read_bytes()
@@ -197,11 +241,12 @@ class VssTest(unittest.TestCase):
     def test_help_version_and_usage(self):
         self.assertIn(b"Exit codes", self.vss("--help"))
         self.assertRegex(self.vss("--version"), rb"^vss \d+\.\d+\.\d+\n$")
-        for command in ("create", "add", "insert", "list", "get", "thumb", "sheet", "settings"):
-            self.assertIn(b"show", self.vss(command, "--help"))
+        for command in ("create", "add", "insert", "remove", "list", "get", "thumb", "sheet", "music add",
+                        "music remove", "music get", "settings", "compact"):
+            self.assertIn(b"show", self.vss(*command.split(), "--help"))
         for wrong in ((), ("paint",), ("add", self.show), ("create", self.show, "--size", "480"),
                       ("create", self.show, "--size", "0x480"), ("create", "x" * 256),
-                      ("get", self.show, "one", "-"), ("settings", self.show, "--loop", "2")):
+                      ("get", self.show, "one", "-"), ("settings", self.show, "--loop", "2"), ("music", self.show), ("remove", self.show)):
             self.vss(*wrong, expect=USAGE)
         self.assertFalse(self.show.exists())
 

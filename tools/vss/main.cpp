@@ -7,14 +7,15 @@ const char tool::kProgram[] = "vss";
 namespace {
 
 constexpr vss::Register kCommands[] = {
-    vss::register_create, vss::register_add,   vss::register_insert, vss::register_list,
-    vss::register_get,    vss::register_thumb, vss::register_sheet,  vss::register_settings,
+    vss::register_create, vss::register_add,      vss::register_insert,  vss::register_remove,
+    vss::register_list,   vss::register_get,      vss::register_thumb,   vss::register_sheet,
+    vss::register_music,  vss::register_settings, vss::register_compact, vss::register_frames,
 };
 
 }  // namespace
 
 int main(int argc, char** argv) {
-  CLI::App app{"Slide shows in one file: up to 20 pictures with settings.", tool::kProgram};
+  CLI::App app{"Slide shows in one file: up to 20 pictures with settings and music.", tool::kProgram};
   app.set_version_flag("--version", "vss " VSS_VERSION);
   app.require_subcommand(1);
   app.footer(tool::footer());
