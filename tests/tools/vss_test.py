@@ -187,6 +187,30 @@ class VssTest(unittest.TestCase):
         self.assertEqual(len(self.show.read_bytes()), len(before))
         self.assertEqual(self.names(), ["small"])
 
+    def test_frames_of_a_gif(self):
+        def image(left, top, width, height, *codes):  # codes of three bits: a clear code before each index
+            bits = sum(code << 3 * i for i, code in enumerate(c for index in codes for c in (4, index)))
+            data = (bits | 5 << 6 * len(codes)).to_bytes((6 * len(codes) + 10) // 8, "little")
+            return b"," + struct.pack("<4HB", left, top, width, height, 0) + b"\2" + bytes([len(data)]) + data + b"\0"
+
+        colours = ((255, 0, 0), (0, 255, 0), (0, 0, 255), (9, 8, 7))
+        table = bytes(sum(colours, ()))
+        screen = b"GIF89a" + struct.pack("<2H3B", 3, 2, 0x81, 0, 0) + table
+        gif = self.folder / "two.gif"
+        gif.write_bytes(screen + image(0, 0, 3, 2, 0, 1, 2, 3, 2, 1) + image(1, 1, 2, 1, 0, 0) + b";")
+        shown = self.folder / "deep" / "frames"
+        names = self.vss("frames", gif, shown).decode().split()
+        self.assertEqual(names, [str(shown / f"frame-00{i}.ppm") for i in (0, 1)])
+        for name, indices in zip(names, ((0, 1, 2, 3, 2, 1), (0, 1, 2, 3, 0, 0))):
+            pixels = b"".join(bytes(colours[i]) for i in indices)
+            self.assertEqual(pathlib.Path(name).read_bytes(), b"P6\n3 2\n255\n" + pixels)
+        for cut, code in ((-1, REFUSED), (-6, REFUSED)):
+            gif.write_bytes(gif.read_bytes()[:cut])
+            self.vss("frames", gif, shown, expect=code)
+        self.vss("frames", self.small, shown, expect=REFUSED)
+        self.vss("frames", self.folder / "absent.gif", shown, expect=CANNOT_OPEN)
+        self.vss("frames", self.folder, shown, expect=CANNOT_OPEN)
+
     def test_refusals_leave_the_show_as_it_was(self):
         self.create(self.small)
         before = self.show.read_bytes()
