@@ -3,6 +3,7 @@
 #define TAVIRPELO_ENCODE_H
 
 #include <stdint.h>
+#include <stdio.h>
 
 #include "tavirpelo/raw.h"
 
@@ -11,6 +12,20 @@ typedef struct TAVIRPELO_APP1 {
   const uint8_t* data;
   int length; /* bytes */
 } TAVIRPELO_APP1;
+
+/* Where encoded bytes go: a memory block that grows, or a file behind a working buffer. Belongs to the
+ * caller, who also releases the buffer of a memory destination; an encoder appends to it and replaces the
+ * buffer when it must grow. */
+enum { ELO_TO_FILE = 0, ELO_TO_MEMORY = 1 };
+
+typedef struct ELO_DESTINATION {
+  int kind;
+  int capacity;    /* bytes of the working buffer */
+  int used;        /* bytes in it */
+  int total;       /* bytes produced; memory: known when the image has ended */
+  FILE* file;      /* file kind only */
+  uint8_t* buffer; /* memory: from TAVIRPELO_OsMalloc; file: made by the encoder */
+} ELO_DESTINATION;
 
 typedef struct TAVIRPELO_ENCOPTION {
   int quality;                /* 1 to 100, clamped */

@@ -9,6 +9,7 @@
 #include "tavirpelo/io.h"
 #include "tavirpelo/parse.h"
 #include "tavirpelo/raw.h"
+#include "tavirpelo/transform.h"
 #include "tavirpelo/yuv.h"
 
 #endif

@@ -23,11 +23,15 @@ size_t stored_blocks_wide(const PELOJ_JDINFO& jd, const Component& component) {
   return static_cast<size_t>(mcus) * component.h;
 }
 
+}  // namespace
+
 int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int column) {
   const size_t block = static_cast<size_t>(row) * stored_blocks_wide(jd, component) +
                        static_cast<size_t>(column);
   return jd.rowCoefficients[component.index].data() + 64 * block;
 }
+
+namespace {
 
 bool allocate_store(PELOJ_JDINFO& jd) {
   for (int c = 0; c < jd.componentCount; ++c) {
@@ -122,6 +126,23 @@ int list_scans(PELOJ_JDINFO& jd) {
   return PELOJ_OK;
 }
 
+int decode_coefficient_row(PELOJ_JDINFO& jd) {
+  for (OsBuffer<int32_t>& plane : jd.rowCoefficients) {
+    if (plane) TAVIRPELO_OsMemset(plane.data(), 0, plane.size() * sizeof(int32_t));
+  }
+  for (size_t i = 0; i < jd.scanCount; ++i) {
+    ScanRecord* record = jd.scans[i].get();
+    if (!PELOJ_LoadScanInfo(&jd, record)) continue;
+    if (!decode_scan_row(jd)) {
+      if (jd.usedHeight - jd.rowsDone < 16) return PELOJ_IMAGE_DONE;
+      if (jd.ah == 0) log_error("PELOJ_ProgDecodeSingleiMcu : PELOJ_ProgDecodeMcu fail");
+      return PELOJ_ROW_FAIL;
+    }
+    PELOJ_SaveScanInfo(&jd, record);
+  }
+  return PELOJ_ROW_DONE;
+}
+
 }  // namespace pelo::jpeg
 
 using namespace pelo;
@@ -172,20 +193,8 @@ int PELOJ_LoadScanInfo(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
 }
 
 int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo) {
-  for (OsBuffer<int32_t>& plane : jdInfo->rowCoefficients) {
-    if (plane) TAVIRPELO_OsMemset(plane.data(), 0, plane.size() * sizeof(int32_t));
-  }
-  for (size_t i = 0; i < jdInfo->scanCount; ++i) {
-    ScanRecord* record = jdInfo->scans[i].get();
-    if (!PELOJ_LoadScanInfo(jdInfo, record)) continue;
-    if (!decode_scan_row(*jdInfo)) {
-      if (jdInfo->usedHeight - jdInfo->rowsDone < 16) return PELOJ_IMAGE_DONE;
-      if (jdInfo->ah == 0) log_error("PELOJ_ProgDecodeSingleiMcu : PELOJ_ProgDecodeMcu fail");
-      return PELOJ_ROW_FAIL;
-    }
-    PELOJ_SaveScanInfo(jdInfo, record);
-  }
-  return PELOJ_ProgIDct(jdInfo);
+  const int status = decode_coefficient_row(*jdInfo);
+  return status == PELOJ_ROW_DONE ? PELOJ_ProgIDct(jdInfo) : status;
 }
 
 int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo) {

@@ -40,4 +40,11 @@ inline bool first_scan_suffices(const PELOJ_JDINFO& jd) {
 // them. 200 or 201.
 [[nodiscard]] int list_scans(PELOJ_JDINFO& jd);
 
+// All scans of the next iMCU row into the coefficient store, without its transform; the caller moves
+// jd.imcuRow on. 100; 102 when a scan's data fail, or 101 when they do so within the picture's last rows.
+int decode_coefficient_row(PELOJ_JDINFO& jd);
+
+// A block of that store, by block row and column of the component in the iMCU row.
+int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int column);
+
 }  // namespace pelo::jpeg

@@ -3,22 +3,8 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <cstdio>
 
-#include "tavirpelo/api.h"
-
-enum ELO_DESTINATION_KIND { ELO_TO_FILE = 0, ELO_TO_MEMORY = 1 };
-
-// Belongs to the caller, who also releases the buffer of a memory destination. An encoder appends to it
-// and replaces the buffer when it must grow.
-struct ELO_DESTINATION {
-  int kind;
-  int capacity;     // bytes of the working buffer
-  int used;         // bytes in it
-  int total;        // bytes produced; memory: known when the image has ended
-  FILE* file;       // file kind only
-  uint8_t* buffer;  // memory: from the codec's allocator; file: made by the first append
-};
+#include "tavirpelo/encode.h"
 
 // The block moved into one `extra` bytes larger; null, with the old block untouched, when memory is
 // short or the new size exceeds an int.
