@@ -31,20 +31,29 @@ struct TranslationTable {
 
 }  // namespace pelo::gif
 
-// These steps run once a code, so they are inline; `used` keeps them among the exported ones.
-
 // Writes one index.
-TAVIRPELO_API [[gnu::used]] inline void PELOI_WriteCharacter(uint32_t character, int position,
-                                                             uint8_t* lineBuffer) {
-  lineBuffer[position] = static_cast<uint8_t>(character);
-}
+TAVIRPELO_API void PELOI_WriteCharacter(uint32_t character, int position, uint8_t* lineBuffer);
 
 // Writes the string of a code from `position` on, and up to kStringSlack bytes of anything behind it;
 // returns its first index. *errorFlag becomes 1 for a code that cannot exist.
-TAVIRPELO_API [[gnu::used]] inline uint8_t PELOI_TranslateCode(uint32_t code,
-                                                               const pelo::gif::TranslationTable* table,
-                                                               int position, uint8_t* lineBuffer,
-                                                               int* errorFlag) {
+TAVIRPELO_API uint8_t PELOI_TranslateCode(uint32_t code, const pelo::gif::TranslationTable* table,
+                                          int position, uint8_t* lineBuffer, int* errorFlag);
+
+// Makes `code` stand for the string of `prefix` (an existing code) with one more index.
+TAVIRPELO_API void PELOI_AddToTranslationTable(uint32_t prefix, uint8_t character, uint32_t code,
+                                               pelo::gif::TranslationTable* table);
+
+// Fills in the codes 0 to 2^minimumCodeSize + 1, each of one index. 1, or 0 for a size above 11.
+TAVIRPELO_API int PELOI_InitializeTransTBL(int minimumCodeSize, pelo::gif::TranslationTable* table);
+
+// The first three run once a code, so they are inline; `used` keeps them among the exported functions.
+
+[[gnu::used]] inline void PELOI_WriteCharacter(uint32_t character, int position, uint8_t* lineBuffer) {
+  lineBuffer[position] = static_cast<uint8_t>(character);
+}
+
+[[gnu::used]] inline uint8_t PELOI_TranslateCode(uint32_t code, const pelo::gif::TranslationTable* table,
+                                                 int position, uint8_t* lineBuffer, int* errorFlag) {
   if (code >= pelo::gif::kCodes) {
     *errorFlag = 1;
     return 0;
@@ -59,10 +68,8 @@ TAVIRPELO_API [[gnu::used]] inline uint8_t PELOI_TranslateCode(uint32_t code,
   return first;
 }
 
-// Makes `code` stand for the string of `prefix` (an existing code) with one more index.
-TAVIRPELO_API [[gnu::used]] inline void PELOI_AddToTranslationTable(uint32_t prefix, uint8_t character,
-                                                                    uint32_t code,
-                                                                    pelo::gif::TranslationTable* table) {
+[[gnu::used]] inline void PELOI_AddToTranslationTable(uint32_t prefix, uint8_t character, uint32_t code,
+                                                      pelo::gif::TranslationTable* table) {
   const auto& old = table->entries[prefix];
   auto& entry = table->entries[code];
   const int inTail = old.length & 7;  // 0: the last group is full
@@ -71,6 +78,3 @@ TAVIRPELO_API [[gnu::used]] inline void PELOI_AddToTranslationTable(uint32_t pre
   entry.length = static_cast<uint16_t>(old.length + 1);
   entry.first = old.first;
 }
-
-// Fills in the codes 0 to 2^minimumCodeSize + 1, each of one index. 1, or 0 for a size above 11.
-TAVIRPELO_API int PELOI_InitializeTransTBL(int minimumCodeSize, pelo::gif::TranslationTable* table);
