@@ -1,4 +1,6 @@
 // From a memory budget to a linear scale: a square root in 10-bit fixed point, by table.
+#include "codec/core/ground/dec_ratio.h"
+
 #include <algorithm>
 #include <array>
 #include <cstddef>
@@ -30,11 +32,15 @@ int root(int64_t step) {
 
 }  // namespace
 
-int PELO_GetMaxDecRatio(int needed, int available) {
+int pelo::max_dec_ratio(int64_t needed, int64_t available) {
   if (needed < 0) return 0;
   if (needed > available) return kOne;
   if (available == 0) return 0;
   // Small ratios take four times as many steps and half the root.
-  if (available >= int64_t{64} * needed) return root(int64_t{needed} * 1024 / available) >> 1;
-  return root(int64_t{needed} * 256 / available);
+  if (available >= 64 * needed) return root(needed * 1024 / available) >> 1;
+  return root(needed * 256 / available);
+}
+
+int PELO_GetMaxDecRatio(int needed, int available) {
+  return pelo::max_dec_ratio(needed, available);
 }
