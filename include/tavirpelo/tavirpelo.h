@@ -11,5 +11,6 @@
 #include "tavirpelo/raw.h"
 #include "tavirpelo/transform.h"
 #include "tavirpelo/yuv.h"
+#include "tavirpelo/zoom.h"
 
 #endif

@@ -1,0 +1,105 @@
+#include "codec/zoom/draw.h"
+
+#include <algorithm>
+
+#include "codec/core/ground/byte_order.h"
+#include "codec/pixel/packers.h"
+#include "codec/zoom/view.h"
+#include "tavirpelo/raw.h"
+
+namespace pelo::zoom {
+namespace {
+
+bool has_image(const TAVIRPELO_ZOOMINFO& zoom) {
+  return zoom.imageWidth > 0 && zoom.imageHeight > 0;
+}
+
+int draw_view(const TAVIRPELO_ZOOMINFO* zoom, const Display& display, int format, Quality quality) {
+  if (zoom == nullptr || zoom->format != format || !display.usable()) return 0;
+  if (zoom->pZoomImage == nullptr || !has_image(*zoom)) {
+    TAVIRPELO_PrintMessage("PELO_MakeDisplay : zoom image is null!");
+    return 0;
+  }
+  const Shown shown = prepare(*zoom, display);
+  const Area region = visible_region(*zoom, shown.size);
+  const auto* first = static_cast<const uint8_t*>(zoom->pZoomImage) +
+                      (ptrdiff_t{region.y} * zoom->imageWidth + region.x) * bytes_per_pixel(format);
+  scale_to({first, {region.width, region.height}, zoom->imageWidth}, shown.first, shown.size,
+           display.size.width, format, quality);
+  return 1;
+}
+
+// Fills with pixels of `bytes` bytes, lowest byte last; a colour of equal bytes is a plain fill.
+void fill_pixels(void* display, int width, int height, uint32_t colour, uint32_t full, size_t bytes) {
+  if (display == nullptr || width < 1 || height < 1) return;
+  const size_t count = static_cast<size_t>(width) * static_cast<size_t>(height);
+  auto* out = static_cast<uint8_t*>(display);
+  if (colour == 0 || colour == full) {
+    TAVIRPELO_OsMemset(out, colour == 0 ? 0 : 0xFF, count * bytes);
+    return;
+  }
+  for (size_t i = 0; i < count; ++i, out += bytes) {
+    if (bytes == 2) {
+      store_le16(out, colour);
+    } else {
+      out[0] = static_cast<uint8_t>(colour >> 16);
+      out[1] = static_cast<uint8_t>(colour >> 8);
+      out[2] = static_cast<uint8_t>(colour);
+    }
+  }
+}
+
+}  // namespace
+
+void scale_to(const Pixels& source, void* target, Size size, int stride, int format, Quality quality) {
+  const auto scaler = format == TAVIRPELO_RGB888     ? PELO_RGB888Scale_ex
+                      : quality == Quality::kNearest ? PELO_FastScale_ex
+                                                     : PELO_Scale_ex;
+  scaler(source.first, source.size.width, source.size.height, source.stride, target, size.width,
+         size.height, stride);
+}
+
+void fill(const Display& display, int format, uint32_t colour) {
+  const auto filler = format == TAVIRPELO_RGB888 ? PELO_SetRGB888OutBuff : PELO_SetOutBuff;
+  filler(display.pixels, display.size.width, display.size.height, colour);
+}
+
+Shown prepare(const TAVIRPELO_ZOOMINFO& zoom, const Display& display) {
+  const Size shown{std::min(zoom.viewWidth, display.size.width),
+                   std::min(zoom.viewHeight, display.size.height)};
+  if (shown != display.size) fill(display, zoom.format, zoom.background);
+  const ptrdiff_t x = (display.size.width - shown.width) / 2;
+  const ptrdiff_t y = (display.size.height - shown.height) / 2;
+  return {static_cast<uint8_t*>(display.pixels) +
+              (y * display.size.width + x) * bytes_per_pixel(zoom.format),
+          shown};
+}
+
+void draw(const TAVIRPELO_ZOOMINFO& zoom, const Display& display, Quality quality) {
+  if (has_image(zoom)) {
+    draw_view(&zoom, display, zoom.format, quality);
+  } else {
+    fill(display, zoom.format, zoom.background);
+  }
+}
+
+}  // namespace pelo::zoom
+
+using namespace pelo::zoom;
+
+int PELO_MakeDisplay(const TAVIRPELO_ZOOMINFO* zoom, void* display, int width, int height, int fast) {
+  return draw_view(zoom, {display, {width, height}}, TAVIRPELO_RGB565,
+                   fast != 0 ? Quality::kNearest : Quality::kAverage);
+}
+
+int PELO_MakeRGB888Display(const TAVIRPELO_ZOOMINFO* zoom, void* display, int width, int height) {
+  return draw_view(zoom, {display, {width, height}}, TAVIRPELO_RGB888, Quality::kAverage);
+}
+
+void PELO_SetOutBuff(void* display, int width, int height, uint32_t colour) {
+  fill_pixels(display, width, height, colour & 0xFFFF, 0xFFFF, 2);
+}
+
+void PELO_SetRGB888OutBuff(void* display, int width, int height, uint32_t colour) {
+  fill_pixels(display, width, height, colour & 0xFFFFFF, 0xFFFFFF, 3);
+}

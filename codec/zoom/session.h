@@ -1,0 +1,61 @@
+// What the operations on a zoom have in common: finding the state, the caller's display, and the
+// messages.
+#pragma once
+
+#include "codec/core/ground/geometry.h"
+#include "tavirpelo/zoom.h"
+
+namespace pelo::zoom {
+
+// Sets gTAVIRPELO_Error; 0.
+inline int fail(int code) {
+  gTAVIRPELO_Error = code;
+  return 0;
+}
+
+// Hands a text to the message hook; 0.
+inline int fail(const char* message, int code = gTAVIRPELO_Error) {
+  TAVIRPELO_PrintMessage(message);
+  return fail(code);
+}
+
+// The messages of a group of operations.
+struct Messages {
+  const char* noObject;
+  const char* noZoom;
+};
+constexpr Messages kControlMessages{"TAVIRPELO_ControlZoom : TAVIRPELO_DECINFO is null!",
+                                    "TAVIRPELO_ControlZoom : TAVIRPELO_ZOOMINFO is null!"};
+constexpr Messages kRatioMessages{"TAVIRPELO_ZoomRatio : TAVIRPELO_DECINFO is null!",
+                                  "TAVIRPELO_ZoomRatio : TAVIRPELO_ZOOMINFO is null!"};
+constexpr Messages kJumpMessages{"TAVIRPELO_JumpZoom : TAVIRPELO_DECINFO is null!",
+                                 "TAVIRPELO_JumpZoom : TAVIRPELO_ZOOMINFO is null!"};
+constexpr Messages kRefreshMessages{"TAVIRPELO_RefreshZoom : TAVIRPELO_DECINFO is null!",
+                                    "TAVIRPELO_RefreshZoom : TAVIRPELO_ZOOMINFO is null!"};
+
+// Begins an operation: clears gTAVIRPELO_Error, then the object's zoom, or null with error 1.
+TAVIRPELO_ZOOMINFO* begin(TAVIRPELO_DECINFO* decInfo, const Messages& messages);
+
+// The pixel formats that can be zoomed.
+constexpr bool zoomable(int outFormat) {
+  return outFormat == TAVIRPELO_RGB565 || outFormat == TAVIRPELO_RGB888;
+}
+
+// The picture's size from its header, before any rotation.
+bool read_size(TAVIRPELO_DECINFO& decInfo, Size& picture);
+
+// The caller's display buffer.
+struct Display {
+  void* pixels;
+  Size size;
+
+  bool usable() const { return pixels != nullptr && size.width > 0 && size.height > 0; }
+};
+
+// Ends the decode task, if any, and waits for it.
+void end_task(TAVIRPELO_ZOOMINFO& zoom);
+
+// Ends a zoom: the state goes, the object gets its own option word and progress function back.
+void end_zoom(TAVIRPELO_DECINFO& decInfo);
+
+}  // namespace pelo::zoom

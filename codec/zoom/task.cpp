@@ -1,0 +1,56 @@
+// The decode task, and a task layer for a platform without tasks.
+#include "codec/zoom/task.h"
+
+#include "tavirpelo/decode.h"
+
+namespace pelo::zoom {
+namespace {
+
+constexpr int kWidthLimit = 5000;  // of pictures that a task decodes
+constexpr int kForever = -1;
+
+void decode(const TAVIRPELO_TASKMESSAGE& message) {
+  TAVIRPELO_ZOOMINFO& zoom = *message.decInfo->pZoomInfo;
+  if (message.width > 0 && message.width < kWidthLimit) {
+    store_shared(zoom.decodeState, TAVIRPELO_ZOOM_DECODING);
+    if (load_shared(zoom.stopRequest) == 0) {
+      TAVIRPELO_DecodeJPEG(message.decInfo, message.buffer, message.width, message.height);
+    }
+  }
+  // Whatever became of the picture: the end of the zoom waits for this.
+  store_shared(zoom.decodeState, TAVIRPELO_ZOOM_DECODED);
+}
+
+}  // namespace
+
+TaskLayer taskLayer{TAVIRPELO_CreateTask,     TAVIRPELO_StartTask,   TAVIRPELO_SendMessage,
+                    TAVIRPELO_ReceiveMessage, TAVIRPELO_DestroyTask, TAVIRPELO_OsSleep};
+
+}  // namespace pelo::zoom
+
+using namespace pelo::zoom;
+
+void PELO_AsyncDecodeJPEG(void) {
+  for (;;) {
+    TAVIRPELO_TASKMESSAGE message{};
+    taskLayer.receive(kForever, &message);
+    if (message.decInfo == nullptr || message.decInfo->pZoomInfo == nullptr) return;
+    decode(message);
+  }
+}
+
+int TAVIRPELO_CreateTask(int, TAVIRPELO_TASKFN) {
+  return -1;
+}
+int TAVIRPELO_StartTask(int) {
+  return 0;
+}
+int TAVIRPELO_SendMessage(int, const TAVIRPELO_TASKMESSAGE*) {
+  return 0;
+}
+int TAVIRPELO_ReceiveMessage(int, TAVIRPELO_TASKMESSAGE*) {
+  return 0;
+}
+int TAVIRPELO_DestroyTask(int) {
+  return 0;
+}
