@@ -24,6 +24,7 @@ void register_job(Job job);
 void register_decode_jobs(const Bytes& photograph);
 void register_slide_jobs(const Bytes& photograph);
 void register_png_jobs(const Bytes& photograph);
+void register_transform_jobs(const Bytes& photograph);
 void register_gif_jobs(const Bytes& photograph);
 
 }  // namespace bench

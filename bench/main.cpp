@@ -54,6 +54,7 @@ int main(int argc, char** argv) {
   bench::register_decode_jobs(photograph);
   bench::register_slide_jobs(photograph);
   bench::register_png_jobs(photograph);
+  bench::register_transform_jobs(photograph);
   bench::register_gif_jobs(photograph);
   return benchmark::RunSpecifiedBenchmarks() == 0 ? 1 : 0;
 }

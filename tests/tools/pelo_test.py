@@ -267,6 +267,51 @@ class PeloTest(unittest.TestCase):
 
     # ---- manners ----
 
+    def test_rotate(self):
+        pictures.write_jpeg(self.photo, 160, 128)
+        turned = self.folder / "turned.jpg"
+        for angle, flip in ((90, False), (180, False), (270, False), (0, True), (90, True)):
+            self.pelo("rotate", self.photo, turned, "--angle", angle, *(["--flip"] if flip else []))
+            options = [] if angle == 0 else ["--rotate", angle]
+            source = self.photo
+            if flip:  # mirrored by an independent program
+                source = self.folder / "mirrored.jpg"
+                subprocess.run(["jpegtran", "-flip", "horizontal", "-outfile", source, self.photo], check=True)
+            expected = self.decode(source, "-", *options)
+            got = self.decode(turned, "-")
+            self.assertEqual(got.size(), expected.size())
+            self.assertLessEqual(largest_difference(got.pixels, expected.pixels), 12)
+
+    def test_rotate_follows_the_orientation_tag(self):
+        pictures.write_jpeg(self.photo, 160, 128)
+        upright = self.folder / "upright.jpg"
+        self.pelo("rotate", self.photo, upright)  # no tag: copied
+        self.assertEqual(upright.read_bytes(), self.photo.read_bytes())
+        inverse = {2: ("-flip", "horizontal"), 3: ("-rotate", "180"), 4: ("-flip", "vertical"), 5: ("-transpose",),
+                   6: ("-rotate", "90"), 7: ("-transverse",), 8: ("-rotate", "270")}
+        for orientation, options in inverse.items():
+            tagged, expected = self.folder / "tagged.jpg", self.folder / "expected.jpg"
+            shutil.copy(self.photo, tagged)
+            self.exiftool("-overwrite_original", f"-Orientation#={orientation}", tagged)
+            subprocess.run(["jpegtran", *options, "-copy", "none", "-outfile", expected, self.photo], check=True)
+            self.pelo("rotate", tagged, upright)
+            self.assertEqual(self.decode(upright, "-").pixels, self.decode(expected, "-").pixels, orientation)
+
+    def test_what_rotate_refuses(self):
+        pictures.write_jpeg(self.photo, 32, 32, None, "-progressive")
+        self.pelo("rotate", self.photo, "-", "--angle", 90, expect=REFUSED)
+        self.pelo("rotate", __file__, "-", expect=REFUSED)
+        self.pelo("rotate", self.photo, "-", "--angle", 45, expect=USAGE)
+
+    def test_shrink(self):
+        small = self.folder / "small.jpg"
+        for limit in (6000, 2000, 1000):
+            self.pelo("shrink", self.photo, small, "--max-bytes", limit)
+            self.assertLessEqual(small.stat().st_size, limit)
+            self.assertEqual(self.info(small)["format"], "JPEG")
+        self.pelo("shrink", self.photo, small, "--max-bytes", 100, expect=REFUSED)
+        self.pelo("shrink", self.photo, small, expect=USAGE)
+
     def test_files_that_cannot_be_used(self):
         text = self.folder / "text.jpg"
         text.write_text("not a picture")

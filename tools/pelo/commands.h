@@ -17,5 +17,7 @@ void register_info(CLI::App& app, Exit& result);
 void register_exif(CLI::App& app, Exit& result);
 void register_decode(CLI::App& app, Exit& result);
 void register_encode(CLI::App& app, Exit& result);
+void register_rotate(CLI::App& app, Exit& result);
+void register_shrink(CLI::App& app, Exit& result);
 
 }  // namespace pelo_tool

@@ -12,6 +12,8 @@ constexpr pelo_tool::Register kCommands[] = {
     pelo_tool::register_exif,
     pelo_tool::register_decode,
     pelo_tool::register_encode,
+    pelo_tool::register_rotate,
+    pelo_tool::register_shrink,
 };
 
 // The codec's log lines are for its developers; messages say what its callers need.

@@ -1,0 +1,30 @@
+#include "tools/pelo/jpeg_output.h"
+
+#include <climits>
+
+#include "tools/pelo/input.h"
+
+namespace pelo_tool {
+
+namespace {
+constexpr int kFirstBuffer = 64 * 1024;
+}
+
+CodecBuffer::CodecBuffer()
+    : bytes(static_cast<uint8_t*>(TAVIRPELO_OsMalloc(kFirstBuffer))),
+      size(bytes != nullptr ? kFirstBuffer : 0) {}
+CodecBuffer::~CodecBuffer() {
+  TAVIRPELO_OsFree(bytes);
+}
+
+Exit read_jpeg(const std::string& path, std::vector<uint8_t>& bytes, TAVIRPELO_HINFO& header) {
+  const Exit result = read_all(path, bytes);
+  if (result != Exit::kDone) return result;
+  const bool small = !bytes.empty() && bytes.size() <= INT_MAX;
+  const int format =
+      small ? elo_parse_from_buffer(bytes.data(), static_cast<int>(bytes.size()), &header) : 0;
+  if (format != TAVIRPELO_FORMAT_JPEG) return fail(Exit::kRefused, "{}: not a JPEG", path);
+  return Exit::kDone;
+}
+
+}  // namespace pelo_tool
