@@ -26,5 +26,7 @@ void register_slide_jobs(const Bytes& photograph);
 void register_png_jobs(const Bytes& photograph);
 void register_transform_jobs(const Bytes& photograph);
 void register_gif_jobs(const Bytes& photograph);
+void register_raw_jobs(const Bytes& photograph);
+void register_zoom_jobs(const Bytes& photograph);
 
 }  // namespace bench

@@ -56,5 +56,7 @@ int main(int argc, char** argv) {
   bench::register_png_jobs(photograph);
   bench::register_transform_jobs(photograph);
   bench::register_gif_jobs(photograph);
+  bench::register_raw_jobs(photograph);
+  bench::register_zoom_jobs(photograph);
   return benchmark::RunSpecifiedBenchmarks() == 0 ? 1 : 0;
 }
