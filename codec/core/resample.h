@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <utility>
 
 #include "codec/core/ground/axis_stepper.h"
 
@@ -52,6 +53,26 @@ void resample_nearest(const SourceArea& source, const TargetArea& target, ptrdif
   }
 }
 
+// What an average takes from one source row: the sums of each output's two samples there. Enlarging asks
+// for the same row again and again.
+template <class Pixel>
+class RowSums {
+ public:
+  // `a` and `b`: byte offsets of the samples.
+  void take(const SourceArea& source, ptrdiff_t row, const ptrdiff_t* a, const ptrdiff_t* b, int count) {
+    if (row == row_) return;
+    row_ = row;
+    const uint8_t* in = source.first + row * source.stride;
+    for (int i = 0; i < count; ++i) words_[i] = Pixel::word(in + a[i]) + Pixel::word(in + b[i]);
+  }
+  ptrdiff_t row() const { return row_; }
+  uint32_t operator[](int i) const { return words_[i]; }
+
+ private:
+  ptrdiff_t row_ = -1;
+  uint32_t words_[kResampleRun];
+};
+
 // Averages of two by two samples: words[i] = the sum of Pixel::word() of the four, finished by
 // finish(words, out, count), run by run.
 template <class Pixel, class Finish>
@@ -68,14 +89,15 @@ void resample_average(const SourceArea& source, const TargetArea& target, Phases
     }
     AxisStepper upper(source.height, target.height, down.first);
     AxisStepper lower(source.height, target.height, down.second);
+    RowSums<Pixel> sums[2];
+    RowSums<Pixel>*top = &sums[0], *bottom = &sums[1];
     for (int y = 0; y < target.height; ++y, upper.advance(), lower.advance()) {
-      const uint8_t* top = source.first + static_cast<ptrdiff_t>(upper.position()) * source.stride;
-      const uint8_t* bottom = source.first + static_cast<ptrdiff_t>(lower.position()) * source.stride;
+      const auto topRow = static_cast<ptrdiff_t>(upper.position());
+      if (bottom->row() == topRow) std::swap(top, bottom);
+      top->take(source, topRow, a, b, count);
+      bottom->take(source, static_cast<ptrdiff_t>(lower.position()), a, b, count);
       uint32_t words[kResampleRun];
-      for (int i = 0; i < count; ++i) {
-        words[i] = Pixel::word(top + a[i]) + Pixel::word(top + b[i]) + Pixel::word(bottom + a[i]) +
-                   Pixel::word(bottom + b[i]);
-      }
+      for (int i = 0; i < count; ++i) words[i] = (*top)[i] + (*bottom)[i];
       finish(words, target.first + y * target.stride + begin * Pixel::kBytes, count);
     }
   }
