@@ -56,7 +56,7 @@ const JNINativeMethod kNatives[] = {
 constexpr jint kNativeCount = static_cast<jint>(std::size(kNatives));
 
 bool register_natives(JNIEnv* env) {
-  const jclass owner = env->FindClass(kClassPath);
+  jclass owner = env->FindClass(kClassPath);
   if (owner == nullptr) {
     log(ANDROID_LOG_ERROR, "Native registration unable to find class '%s'", kClassPath);
     return false;
