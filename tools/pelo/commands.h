@@ -19,5 +19,9 @@ void register_decode(CLI::App& app, Exit& result);
 void register_encode(CLI::App& app, Exit& result);
 void register_rotate(CLI::App& app, Exit& result);
 void register_shrink(CLI::App& app, Exit& result);
+void register_crop(CLI::App& app, Exit& result);
+void register_scale(CLI::App& app, Exit& result);
+void register_yuv2rgb(CLI::App& app, Exit& result);
+void register_zoom(CLI::App& app, Exit& result);
 
 }  // namespace pelo_tool

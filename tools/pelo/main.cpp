@@ -14,6 +14,10 @@ constexpr pelo_tool::Register kCommands[] = {
     pelo_tool::register_encode,
     pelo_tool::register_rotate,
     pelo_tool::register_shrink,
+    pelo_tool::register_crop,
+    pelo_tool::register_scale,
+    pelo_tool::register_yuv2rgb,
+    pelo_tool::register_zoom,
 };
 
 // The codec's log lines are for its developers; messages say what its callers need.
