@@ -4,8 +4,9 @@
  *
  * Display buffers hold width x height pixels of the object's outFormat, TAVIRPELO_RGB565 or
  * TAVIRPELO_RGB888, in packed rows. Sizes and positions are pixels. An object has at most one zoom, and is
- * used by one thread; a decode task, where the task layer has tasks, writes only the zoom image and the
- * decode state.
+ * used by one thread. A decode task, where the task layer has tasks, writes the zoom image, the decode state
+ * and, like every decode, the object's picture sizes and gTAVIRPELO_Error; a view drawn meanwhile may mix
+ * pixels of the preview and of the picture.
  *
  * Unless said otherwise a function returns 0 on failure, with gTAVIRPELO_Error 1 for a missing object, zoom,
  * display or result, or a display or map size below 1.
