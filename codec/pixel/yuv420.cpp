@@ -12,7 +12,7 @@
 #define ENTRY_CBB(c) ((116130 * ((c)-127) + 32768) >> 16)
 #define ENTRY_CRG(c) (-46802 * ((c)-127))
 #define ENTRY_CBG(c) (-22554 * ((c)-127) + 32768)
-#define ENTRY_RANGE(i) ((i) < 512 ? 0 : (i) < 768 ? (i)-512 : 255)
+#define ENTRY_RANGE(i) static_cast<uint8_t>((i) < 512 ? 0 : (i) < 768 ? (i)-512 : 255)
 
 // Table initialisers of 256 and 1024 entries.
 #define ENTRIES_4(entry, c) entry(c), entry((c) + 1), entry((c) + 2), entry((c) + 3)
