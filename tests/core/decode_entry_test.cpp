@@ -1,8 +1,10 @@
 // One-call decoding: every format is detected and goes to its decoder; animations come frame by frame.
+#include <functional>
+
 #include "tests/support/gif_builder.h"
 #include "tests/support/guarded_decode.h"
+#include "tests/support/jpeg_samples.h"
 #include "tests/support/png_builder.h"
-#include "tests/support/slideshow_files.h"
 
 namespace tests {
 namespace {
@@ -23,11 +25,10 @@ int length(const Bytes& file) {
   return static_cast<int>(file.size());
 }
 
-Bytes black_bmp() {
-  Bytes bmp(54 + 4 * 12);
-  bmp[0] = 'B', bmp[1] = 'M', bmp[10] = 54, bmp[14] = 40, bmp[18] = 4, bmp[22] = 4, bmp[28] = 24;
-  for (size_t i = 54; i < bmp.size(); ++i) bmp[i] = static_cast<uint8_t>(i);
-  return bmp;
+Bytes sample_bmp() {
+  ByteWriter bmp(false);
+  bmp.text("BM").u32(0).u32(0).u32(54).u32(40).u32(4).u32(4).u16(1).u16(24).block(Bytes(24));
+  return bmp.block(random_bytes(48, 1));
 }
 
 using FromFile = int (*)(const char*, TAVIRPELO_RAWINFO*, uint32_t);
@@ -36,7 +37,7 @@ struct Format {
   Bytes bytes;
   FromFile fromFile;
   FromBuffer fromBuffer;
-  int (*decoder)(TAVIRPELO_DECINFO*, void*, int, int);
+  Decoder decoder;
 };
 
 std::vector<Format> formats() {
@@ -47,7 +48,7 @@ std::vector<Format> formats() {
        TAVIRPELO_DecodePngFromBuffer, TAVIRPELOI_DecodePNG},
       {sample_gif(8, 6).bytes(), TAVIRPELO_DecodeGifFromFile, TAVIRPELO_DecodeGifFromBuffer,
        TAVIRPELOI_DecodeGIF},
-      {black_bmp(), TAVIRPELO_DecodeBmpFromFile, TAVIRPELO_DecodeBmpFromBuffer, TAVIRPELOI_DecodeBMP},
+      {sample_bmp(), TAVIRPELO_DecodeBmpFromFile, TAVIRPELO_DecodeBmpFromBuffer, TAVIRPELOI_DecodeBMP},
       {{0, 0, 8, 2, 0xA5, 0x5A},
        TAVIRPELO_DecodeWBmpFromFile,
        TAVIRPELO_DecodeWBmpFromBuffer,
@@ -60,18 +61,18 @@ TEST(DecodeEntry, EveryFormatByNameAndByDetection) {
     file.write(format.bytes);
     GuardedPixels direct(9, 9, 1, 0);
     ASSERT_EQ(1, format.decoder(open_memory(format.bytes, 1).get(), direct.data(), 9, 9));
-    const auto expect = [&](auto decode) {
+    void* data = format.bytes.data();
+    const int size = length(format.bytes);
+    const std::function<int(TAVIRPELO_RAWINFO*)> ways[] = {
+        [&](auto* raw) { return format.fromFile(file.c_str(), raw, 0); },
+        [&](auto* raw) { return format.fromBuffer(data, size, raw, 0); },
+        [&](auto* raw) { return TAVIRPELO_DecodeImageFromFile(file.c_str(), raw, 0); },
+        [&](auto* raw) { return TAVIRPELO_DecodeImageFromBuffer(data, size, raw, 0); }};
+    for (const auto& way : ways) {
       const Raw raw = blank();
-      EXPECT_EQ(1, decode(raw.get()));
+      EXPECT_EQ(1, way(raw.get()));
       EXPECT_EQ(direct.content(), pixels_of(raw));
-    };
-    expect([&](auto* raw) { return format.fromFile(file.c_str(), raw, 0); });
-    expect(
-        [&](auto* raw) { return format.fromBuffer(format.bytes.data(), length(format.bytes), raw, 0); });
-    expect([&](auto* raw) { return TAVIRPELO_DecodeImageFromFile(file.c_str(), raw, 0); });
-    expect([&](auto* raw) {
-      return TAVIRPELO_DecodeImageFromBuffer(format.bytes.data(), length(format.bytes), raw, 0);
-    });
+    }
     // Another format's file is refused by name.
     Bytes other =
         format.fromBuffer == TAVIRPELO_DecodePngFromBuffer ? sample_jpeg(8, 6) : formats()[1].bytes;
@@ -84,7 +85,12 @@ TEST(DecodeEntry, MissingArguments) {
   const Raw raw = blank();
   TAVIRPELO_DECINFO* handle = nullptr;
   uint8_t byte = 0;
-  for (const Format& format : formats()) {
+  for (Format& format : formats()) {
+    const DecInfo decInfo = open_memory(format.bytes, 1);
+    EXPECT_EQ(0, format.decoder(nullptr, &byte, 1, 1));
+    EXPECT_EQ(0, format.decoder(decInfo.get(), nullptr, 1, 1));
+    EXPECT_EQ(0, format.decoder(decInfo.get(), &byte, -1, 1));
+    EXPECT_EQ(0, format.decoder(decInfo.get(), &byte, 1, -1));
     EXPECT_EQ(0, format.fromFile(nullptr, raw.get(), 0));
     EXPECT_EQ(0, format.fromFile("x", nullptr, 0));
     EXPECT_EQ(TAVIRPELO_CODEC_ARGUMENT, debug_PeloCodecError);

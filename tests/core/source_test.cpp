@@ -1,13 +1,11 @@
 // Input sources, the buffered reader, format detection, raw images and the small services of the ground.
-#include <gtest/gtest.h>
-
 #include <cstdio>
-#include <cstring>
 
 #include "codec/core/ground/buffered_source.h"
 #include "codec/core/ground/geometry.h"
-#include "platform/fault_injection.h"
-#include "tavirpelo/tavirpelo.h"
+#include "tests/support/failures.h"
+#include "tests/support/gif_builder.h"
+#include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_samples.h"
 
 namespace tests {
@@ -37,10 +35,9 @@ TEST(Sources, MemorySeeksAndReadsClamp) {
 }
 
 TEST(Sources, FilesAreMeasuredAndDirectoriesRefused) {
-  const std::string path = testing::TempDir() + "tavir_source_file";
-  FILE* file = std::fopen(path.c_str(), "wb");
-  std::fputs("0123456789", file);
-  std::fclose(file);
+  const TempFile temporary;
+  temporary.write(Bytes{'0', '1', '2', '3', '4', '5', '6', '7', '8', '9'});
+  const std::string& path = temporary.path();
   TAVIRPELO_IO* io = TAVIRPELO_Open_IO(TAVIRPELO_IO_FILE, const_cast<char*>(path.c_str()), 0);
   ASSERT_NE(nullptr, io);
   EXPECT_EQ(10, io->size);
@@ -60,16 +57,15 @@ TEST(Sources, FilesAreMeasuredAndDirectoriesRefused) {
   TAVIRPELO_Close_IO(io);
   std::fclose(handle);
   std::remove(path.c_str());
-
-  EXPECT_EQ(nullptr, TAVIRPELO_Open_IO(TAVIRPELO_IO_FILE, const_cast<char*>(testing::TempDir().c_str()), 0));
+  EXPECT_EQ(nullptr,
+            TAVIRPELO_Open_IO(TAVIRPELO_IO_FILE, const_cast<char*>(testing::TempDir().c_str()), 0));
   EXPECT_EQ(TAVIRPELO_ERROR_OPEN, gTAVIRPELO_Error);
   EXPECT_EQ(TAVIRPELO_INVALID_FILE, TAVIRPELO_OpenFile(path.c_str()));
 }
 
 // A window over more than its size: peeks, skips and jumps land on the right bytes.
 TEST(BufferedReader, FindsEveryByte) {
-  Bytes bytes(20000);
-  for (size_t i = 0; i < bytes.size(); ++i) bytes[i] = static_cast<uint8_t>(i * 7 + i / 256);
+  Bytes bytes = random_bytes(20000, 3);
   TAVIRPELO_IO* io = TAVIRPELO_Open_IO(TAVIRPELO_IO_MEMORY, bytes.data(), 20000);
   pelo::BufferedSource source;
   ASSERT_TRUE(source.open(io));
@@ -99,25 +95,28 @@ TEST(BufferedReader, FindsEveryByte) {
 int parse(Bytes bytes, TAVIRPELO_HINFO* header = nullptr) {
   TAVIRPELO_HINFO own;
   bytes.shrink_to_fit();
-  return TAVIRPELO_ParseFromBuffer(bytes.data(), static_cast<int>(bytes.size()), header != nullptr ? header : &own);
-}
-
-Bytes gif(int images, bool trailer) {
-  Bytes g = {'G', 'I', 'F', '8', '9', 'a', 30, 0, 20, 0, 0x80, 0, 0, 1, 2, 3, 4, 5, 6, 0x21, 0xF9, 4, 0, 0, 0, 0, 0, 0x21, 0xFA};
-  for (int i = 0; i < images; ++i) {
-    for (const int b : {0x2C, 0, 0, 0, 0, 30, 0, 20, 0, 0, 2, 2, 0x4C, 1, 0}) g.push_back(static_cast<uint8_t>(b));
-  }
-  if (trailer) g.push_back(0x3B);
-  return g;
+  return TAVIRPELO_ParseFromBuffer(bytes.data(), static_cast<int>(bytes.size()),
+                                   header != nullptr ? header : &own);
 }
 
 TEST(Detection, KnowsEveryFormat) {
-  Bytes png = {0x89, 'P', 'N', 'G', 0x0D, 0x0A, 0x1A, 0x0A, 0, 0, 0, 13, 'I', 'H', 'D', 'R', 0, 0, 1, 0, 0, 0, 0, 99};
-  Bytes bmp(26);
-  bmp[0] = 'B', bmp[1] = 'M', bmp[18] = 7, bmp[22] = 0xFE, bmp[23] = bmp[24] = bmp[25] = 0xFF;
-  struct { Bytes bytes; int format, width, height, frames; } const cases[] = {
-      {png, 3, 256, 99, 1}, {bmp, 2, 7, -2, 1}, {gif(1, true), 4, 30, 20, 1}, {gif(3, true), 6, 30, 20, 3},
-      {{0, 0, 1, 1, 0}, 5, 1, 1, 1}, {{0, 0, 0xA7, 0x08, 0xA7, 0x08}, 5, 5000, 5000, 1}, {sample_jpeg(33, 17), 1, 33, 17, 1}};
+  GifFile gif = sample_gif(30, 20, 2);
+  const Bytes still = gif.bytes();
+  gif.images.resize(3, gif.images[0]);
+  const Bytes animation = gif.bytes();
+  gif.images.clear();
+  const Bytes png = ByteWriter().u32(0x89504E47).u32(0x0D0A1A0A).u32(13).text("IHDR").u32(256).u32(99);
+  const Bytes bmp = overwritten(Bytes(26), 0, {'B', 'M'});
+  struct {
+    Bytes bytes;
+    int format, width, height, frames = 1;
+  } const cases[] = {{png, 3, 256, 99},
+                     {overwritten(bmp, 18, ByteWriter(false).u32(7).u32(-2)), 2, 7, -2},
+                     {still, 4, 30, 20},
+                     {animation, 6, 30, 20, 3},
+                     {{0, 0, 1, 1, 0}, 5, 1, 1},
+                     {{0, 0, 0xA7, 0x08, 0xA7, 0x08}, 5, 5000, 5000},
+                     {sample_jpeg(33, 17), 1, 33, 17}};
   for (const auto& c : cases) {
     TAVIRPELO_HINFO header;
     EXPECT_EQ(c.format, parse(c.bytes, &header));
@@ -125,17 +124,14 @@ TEST(Detection, KnowsEveryFormat) {
     EXPECT_EQ(c.height, header.height);
     EXPECT_EQ(c.frames, header.frameCount);
     EXPECT_EQ(0, header.sourceSize);
-    // Cut anywhere, on a heap block of exactly that size: no crash; flipped: likewise.
-    for (size_t length = 1; length < c.bytes.size() && length < 400; ++length) {
-      parse(Bytes(c.bytes.begin(), c.bytes.begin() + static_cast<ptrdiff_t>(length)));
-      Bytes flipped = c.bytes;
-      flipped[length] ^= 0xFF;
-      parse(flipped);
-    }
+    const Bytes head = prefix(c.bytes, std::min<size_t>(c.bytes.size(), 400));
+    every_truncation(head, [](const Bytes& cut) { parse(cut); });
+    every_flip(head, {0xFF}, [](const Bytes& damaged, size_t) { parse(damaged); });
   }
-  png[5] = 0;
-  for (const Bytes& unknown : {png, gif(2, false), gif(0, true), Bytes{'B', 'A', 0, 0, 0, 0, 0, 0}, Bytes{0, 0x80, 1, 1, 1},
-                               Bytes{0, 0, 0xA7, 0x09, 10}, Bytes{0, 0, 0x88, 0x80, 0x80, 0x80, 0x01, 1}}) {
+  for (const Bytes& unknown :
+       {overwritten(png, 5, {0}), prefix(animation, animation.size() - 1), gif.bytes(),
+        Bytes{'B', 'A', 0, 0, 0, 0, 0, 0}, Bytes{0, 0x80, 1, 1, 1}, Bytes{0, 0, 0xA7, 0x09, 10},
+        Bytes{0, 0, 0x88, 0x80, 0x80, 0x80, 0x01, 1}}) {
     EXPECT_EQ(0, parse(unknown));
   }
 }
@@ -196,7 +192,9 @@ TEST(Services, RatiosModesAndCallbacks) {
   EXPECT_EQ(5u, info->userOption);
   static int reports;
   reports = 0;
-  EXPECT_EQ(1, PELOJ_SetCallback(info, [](intptr_t argument, int percent) { reports += argument == 7 && percent == 0; }, 7));
+  EXPECT_EQ(
+      1, PELOJ_SetCallback(
+             info, [](intptr_t argument, int percent) { reports += argument == 7 && percent == 0; }, 7));
   for (int i = 1; i <= 10; ++i) {
     EXPECT_EQ(1, TAVIRPELO_ZoomCheckFn(info, 3, 0));
     EXPECT_EQ(i < 4 ? 0 : (i - 1) / 3, reports);

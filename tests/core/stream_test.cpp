@@ -1,27 +1,24 @@
 // Callback streams as sources, and short memory in every step of opening and parsing one.
-#include <gtest/gtest.h>
-
-#include <algorithm>
-#include <climits>
-#include <cstring>
-
 #include "codec/core/ground/buffered_source.h"
-#include "platform/fault_injection.h"
-#include "tavirpelo/tavirpelo.h"
-#include "tests/support/memory_stream.h"
+#include "tests/support/failures.h"
+#include "tests/support/guarded_decode.h"
+#include "tests/support/jpeg_samples.h"
 
 namespace tests {
 namespace {
 
-using Stream = MemoryStream;
-
-TAVIRPELO_IO* open(Stream& s) {
-  return TAVIRPELO_Open_Stream(&s, stream_read, stream_skip, stream_reset, static_cast<int>(s.bytes.size()));
+TAVIRPELO_IO* open(MemoryStream& s) {
+  return TAVIRPELO_Open_Stream(&s, stream_read, stream_skip, stream_reset,
+                               static_cast<int>(s.bytes.size()));
+}
+Bytes numbered(size_t size) {
+  Bytes bytes;
+  while (bytes.size() < size) bytes.push_back(static_cast<uint8_t>(bytes.size() % 251));
+  return bytes;
 }
 
 TEST(Streams, SeekByResettingAndSkipping) {
-  Stream s{Bytes(100)};
-  for (size_t i = 0; i < 100; ++i) s.bytes[i] = static_cast<uint8_t>(i);
+  MemoryStream s{numbered(100)};
   TAVIRPELO_IO* io = open(s);
   uint8_t out[8];
   EXPECT_EQ(8, TAVIRPELO_Read_IO(io, out, 8));
@@ -45,7 +42,7 @@ TEST(Streams, SeekByResettingAndSkipping) {
 
 // What callbacks report is not believed beyond what was asked for.
 TEST(Streams, LiesAndMissingCallbacks) {
-  Stream s{Bytes(100, 9)};
+  MemoryStream s{Bytes(100, 9)};
   TAVIRPELO_IO* io = open(s);
   uint8_t out[8];
   s.lie = 50;
@@ -73,8 +70,7 @@ TEST(Streams, LiesAndMissingCallbacks) {
 // A refill succeeds with fewer bytes than wanted; nobody may then consume more than there are, and bytes
 // that moved inside the window stay readable when the next read gives nothing.
 TEST(Streams, ShortReadsNeverInventBytes) {
-  Stream s{Bytes(6000)};
-  for (size_t i = 0; i < s.bytes.size(); ++i) s.bytes[i] = static_cast<uint8_t>(i % 251);
+  MemoryStream s{numbered(6000)};
   s.limit = 100;
   TAVIRPELO_IO* io = open(s);
   pelo::BufferedSource source;
@@ -96,44 +92,36 @@ TEST(Streams, ShortReadsNeverInventBytes) {
 }
 
 TEST(Streams, PicturesDecodeAsFromMemory) {
-  Stream s{sample_jpeg(50, 40)};
-  Bytes expected(50 * 40 * 3), actual(expected.size());
-  TAVIRPELO_DECINFO* info = TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, s.bytes.data(),
-                                                    static_cast<int>(s.bytes.size()), 1, 0);
-  EXPECT_EQ(1, TAVIRPELO_DecodeJPEG(info, expected.data(), 50, 40));
-  TAVIRPELO_DestroyDecInfo(info);
-  info =
-      TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), stream_read, stream_skip, stream_reset, 1, 0);
-  TAVIRPELO_HINFO header;
-  EXPECT_EQ(TAVIRPELO_FORMAT_JPEG, TAVIRPELO_Parser(info, &header));
-  EXPECT_EQ(50, header.width);
-  EXPECT_EQ(static_cast<int>(s.bytes.size()), header.sourceSize);
-  EXPECT_EQ(1, TAVIRPELO_SetStreamReadSize(info, 512));
-  EXPECT_EQ(1, TAVIRPELO_DecodeJPEG(info, actual.data(), 50, 40));
-  EXPECT_EQ(expected, actual);
-  TAVIRPELO_DestroyDecInfo(info);
+  const Bytes jpeg = sample_jpeg(50, 40);
+  const Bytes want = decode(TAVIRPELO_DecodeJPEG, jpeg, 50, 40, 1).pixels;
+  from_every_source(jpeg, 1, 0, [&](TAVIRPELO_DECINFO* info) {
+    TAVIRPELO_HINFO header;
+    EXPECT_EQ(TAVIRPELO_FORMAT_JPEG, TAVIRPELO_Parser(info, &header));
+    EXPECT_EQ(50, header.width);
+    EXPECT_EQ(static_cast<int>(jpeg.size()), header.sourceSize);
+    EXPECT_EQ(1, TAVIRPELO_SetStreamReadSize(info, 512));
+    EXPECT_EQ(want, decode(TAVIRPELO_DecodeJPEG, info, 50, 40).pixels);
+  });
 }
 
 // Each allocation of create, callback and parse fails in turn; the error words say which kind it was.
 TEST(Streams, ShortMemoryAtEveryStep) {
-  Stream s{sample_jpeg(20, 10)};
+  MemoryStream s{sample_jpeg(20, 10)};
   int failures = 0;
   for (long k = 1; k < 10; ++k) {
     gTAVIRPELO_Error = 0;
     pelo::faults::allocations.arm(k);
-    TAVIRPELO_DECINFO* info =
-        TAVIRPELO_CreateDecInfoWithStream(&s, static_cast<int>(s.bytes.size()), stream_read, stream_skip, stream_reset, 1, 0);
+    const DecInfo info = open_stream(s, 1);
     const bool callback = PELOJ_SetCallback(
-                              info, [](intptr_t, int) {}, 1) != 0;
+                              info.get(), [](intptr_t, int) {}, 1) != 0;
     TAVIRPELO_HINFO header;
-    const int format = info != nullptr ? TAVIRPELO_Parser(info, &header) : 0;
+    const int format = info != nullptr ? TAVIRPELO_Parser(info.get(), &header) : 0;
     pelo::faults::allocations.arm(0);
     if (info == nullptr)
       EXPECT_TRUE(gTavirError == TAVIRPELO_ERROR_MEMORY || gTAVIRPELO_Error == TAVIRPELO_ERROR_MEMORY);
     if (info != nullptr && !callback) EXPECT_EQ(nullptr, info->pCallback);
     if (info != nullptr && format == 0) EXPECT_NE(0, gTAVIRPELO_Error);
     failures += info == nullptr || !callback || format == 0;
-    if (info != nullptr) TAVIRPELO_DestroyDecInfo(info);
   }
   EXPECT_EQ(5, failures) << "object, source, record, the parser's buffer, the header scan's buffer";
 }

@@ -2,15 +2,8 @@
 // gives everything back.
 #include "codec/core/strip_decode.h"
 
-#include <gtest/gtest.h>
-
-#include <algorithm>
-#include <string_view>
-
-#include "codec/pixel/packers.h"
-#include "platform/android_log.h"
-#include "platform/fault_injection.h"
-#include "tavirpelo/tavirpelo.h"
+#include "tests/support/failures.h"
+#include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_samples.h"
 
 namespace tests {
@@ -20,23 +13,17 @@ struct Shape {
   int width, height, format;
 };
 
-size_t pixel_size(int format) {
-  return format == TAVIRPELO_YUV420          ? 1
-         : format == TAVIRPELO_RGB565_DITHER ? 2
-                                             : pelo::bytes_per_pixel(format);
-}
-
 // A heap block of exactly the rows asked for, so that a sanitizer sees every pixel beyond them.
 struct Band {
   Bytes planes[3];
 
   Band(const Shape& shape, int first, int rows) {
-    const auto chroma = static_cast<size_t>((first + rows + 1) / 2 - (first + 1) / 2);
-    planes[0].assign(
-        static_cast<size_t>(shape.width) * pixel_size(shape.format) * static_cast<size_t>(rows), 0x5A);
-    if (shape.format != TAVIRPELO_YUV420) return;
-    for (int c = 1; c < 3; ++c)
-      planes[c].assign(static_cast<size_t>((shape.width + 1) / 2) * chroma + 1, 0x5A);
+    const bool planar = shape.format == TAVIRPELO_YUV420;
+    const int bytes = planar ? 1 : pelo::bytes_per_pixel(shape.format);
+    planes[0].assign(static_cast<size_t>(shape.width * bytes * rows), kFill);
+    const int chroma = (first + rows + 1) / 2 - (first + 1) / 2;
+    for (int c = 1; c < 3 && planar; ++c)
+      planes[c].assign(static_cast<size_t>((shape.width + 1) / 2 * chroma) + 1, kFill);
   }
   int process(PELOJ_JDINFO* state, int rows) {
     uint8_t* pointers[3] = {planes[0].data(), planes[1].data(), planes[2].data()};
@@ -44,40 +31,16 @@ struct Band {
   }
 };
 
-class Source {
- public:
-  explicit Source(Bytes jpeg, uint32_t option = TAVIRPELO_THUMBNAIL_NEVER) : jpeg_(std::move(jpeg)) {
-    jpeg_.shrink_to_fit();
-    info_ = TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, jpeg_.data(), static_cast<int>(jpeg_.size()), 0,
-                                    option);
-  }
-  ~Source() { TAVIRPELO_DestroyDecInfo(info_); }
-  Source(const Source&) = delete;
-  TAVIRPELO_DECINFO* operator->() const { return info_; }
-  TAVIRPELO_DECINFO* get() const { return info_; }
-
- private:
-  Bytes jpeg_;
-  TAVIRPELO_DECINFO* info_;
-};
-
-Bytes decode_whole(const Bytes& jpeg, const Shape& shape, int mode) {
-  const Source source(jpeg, TAVIRPELO_FIT_STRETCH | TAVIRPELO_THUMBNAIL_NEVER);
-  source->outFormat = shape.format;
-  source->decMode = mode;
-  const auto pixels = static_cast<size_t>(shape.width) * static_cast<size_t>(shape.height);
-  const size_t chroma =
-      static_cast<size_t>((shape.width + 1) / 2) * static_cast<size_t>((shape.height + 1) / 2);
-  Bytes out(pixels * pixel_size(shape.format) + (shape.format == TAVIRPELO_YUV420 ? 2 * chroma : 0),
-            0x5A);
-  EXPECT_EQ(1, TAVIRPELO_DecodeJPEG(source.get(), out.data(), shape.width, shape.height));
-  return out;
+Bytes decode_whole(Bytes jpeg, const Shape& shape, int mode) {
+  const DecInfo info =
+      open_memory(jpeg, shape.format, TAVIRPELO_FIT_STRETCH | TAVIRPELO_THUMBNAIL_NEVER);
+  info->decMode = mode;
+  return decode(TAVIRPELO_DecodeJPEG, info.get(), shape.width, shape.height).pixels;
 }
 
 // The bands one behind the other, each as high as the next of `heights` in turn; empty on failure.
-Bytes decode_bands(const Bytes& jpeg, const Shape& shape, int mode, std::vector<int> heights) {
-  const Source source(jpeg, TAVIRPELO_ROTATE_90);  // bands are never turned
-  if (source.get() == nullptr) return {};
+Bytes decode_bands(Bytes jpeg, const Shape& shape, int mode, const std::vector<int>& heights) {
+  const DecInfo source = open_memory(jpeg, 0, TAVIRPELO_ROTATE_90);  // bands are never turned
   source->decMode = mode;
   PELOJ_JDINFO* state = __elo_jpeg_dec_line_init(source.get(), shape.width, shape.height, shape.format);
   if (state == nullptr) return {};
@@ -89,12 +52,11 @@ Bytes decode_bands(const Bytes& jpeg, const Shape& shape, int mode, std::vector<
     if (band.process(state, asked) == 0) return {};
     if (shape.format == TAVIRPELO_YUV420) {
       for (int c = 1; c < 3; ++c) {
-        EXPECT_EQ(0x5A, band.planes[c].back());
+        EXPECT_EQ(kFill, band.planes[c].back());
         band.planes[c].pop_back();
       }
     }
-    for (int c = 0; c < 3; ++c)
-      planes[c].insert(planes[c].end(), band.planes[c].begin(), band.planes[c].end());
+    for (int c = 0; c < 3; ++c) append(planes[c], band.planes[c]);
     row += rows;
   }
   Band behind(shape, 0, 1);
@@ -104,9 +66,7 @@ Bytes decode_bands(const Bytes& jpeg, const Shape& shape, int mode, std::vector<
   __elo_jpeg_dec_line_finish(state);
   EXPECT_EQ(shape.format, source->outFormat);
   EXPECT_EQ(uint32_t{TAVIRPELO_FIT_STRETCH | TAVIRPELO_ROTATE_90}, source->option);
-  planes[0].insert(planes[0].end(), planes[1].begin(), planes[1].end());
-  planes[0].insert(planes[0].end(), planes[2].begin(), planes[2].end());
-  return planes[0];
+  return ByteWriter().block(planes[0]).block(planes[1]).block(planes[2]);
 }
 
 struct Sample {
@@ -118,19 +78,13 @@ std::vector<Sample> samples() {
   std::vector<Sample> all = {{"baseline", encode_own(67, 53, 80)},
                              {"grey", encode_own(67, 53, 80, true)}};
 #ifdef TAVIR_HAVE_LIBJPEG
-  JpegStyle style;
-  style.progressive = true;
-  all.push_back({"progressive", encode_libjpeg(67, 53, style)});
-  style.components = 1;
-  all.push_back({"progressive grey", encode_libjpeg(67, 53, style)});
-  style = {};
-  style.h = 1;
-  style.restartInterval = 3;
-  all.push_back({"tall chroma, restarts", encode_libjpeg(67, 53, style)});
-  style = {};
-  style.h = style.v = 1;
-  style.rgb = true;
-  all.push_back({"RGB", encode_libjpeg(67, 53, style)});
+  for (const auto& [name, style] :
+       {std::pair<const char*, JpegStyle>{"progressive", {.progressive = true}},
+        {"progressive grey", {.components = 1, .progressive = true}},
+        {"tall chroma, restarts", {.h = 1, .restartInterval = 3}},
+        {"RGB", {.h = 1, .v = 1, .rgb = true}}}) {
+    all.push_back({name, encode_libjpeg(67, 53, style)});
+  }
 #endif
   return all;
 }
@@ -160,7 +114,8 @@ TEST(StripDecode, BandsOfAnyHeightGiveTheWholePicture) {
 }
 
 TEST(StripDecode, CountsCallsAndIgnoresEmptyOnes) {
-  const Source source(encode_own(100, 100, 80));
+  Bytes jpeg = encode_own(100, 100, 80);
+  const DecInfo source = open_memory(jpeg, 0);
   PELOJ_JDINFO* state = __elo_jpeg_dec_line_init(source.get(), 100, 400, TAVIRPELO_YUV420);
   ASSERT_NE(nullptr, state);
   const Shape shape{100, 400, TAVIRPELO_YUV420};
@@ -181,42 +136,32 @@ TEST(StripDecode, CountsCallsAndIgnoresEmptyOnes) {
   EXPECT_EQ(nullptr, __elo_jpeg_dec_line_init(source.get(), 1, -1, 1));
 }
 
-class HostileStrips : public testing::Test {
- protected:
-  void SetUp() override {
-    pelo::platform::set_log_sink([](const char*) {});
-  }
-  void TearDown() override {
-    pelo::platform::set_log_sink(nullptr);
-    pelo::faults::allocations.arm(0);
-  }
+using HostileStrips = QuietTest;
 
-  // Bands of 5 rows of a decode that may end anywhere; the number of bands, -1 when it did not start.
-  static int run(const Bytes& jpeg, const Shape& shape, int stopAfter = 1000) {
-    const Source source(jpeg);
-    if (source.get() == nullptr) return -1;
-    PELOJ_JDINFO* state =
-        __elo_jpeg_dec_line_init(source.get(), shape.width, shape.height, shape.format);
-    if (state == nullptr) return -1;
-    for (int band = 0;; ++band) {
-      if (5 * band >= shape.height || band == stopAfter) {
-        __elo_jpeg_dec_line_finish(state);
-        return band;
-      }
-      if (Band(shape, 5 * band, 5).process(state, 5) == 0) return band;
+// Bands of 5 rows of a decode that may end anywhere; the number of bands, -1 when it did not start.
+int run(Bytes jpeg, const Shape& shape, int stopAfter = 1000) {
+  const DecInfo source = open_memory(jpeg, 0, TAVIRPELO_THUMBNAIL_NEVER);
+  if (source == nullptr) return -1;
+  PELOJ_JDINFO* state = __elo_jpeg_dec_line_init(source.get(), shape.width, shape.height, shape.format);
+  if (state == nullptr) return -1;
+  for (int band = 0;; ++band) {
+    if (5 * band >= shape.height || band == stopAfter) {
+      __elo_jpeg_dec_line_finish(state);
+      return band;
     }
+    if (Band(shape, 5 * band, 5).process(state, 5) == 0) return band;
   }
-};
+}
 
 TEST_F(HostileStrips, EndedAnywhereOrDamaged) {
   for (const Sample& sample : samples()) {
     for (int bands = 0; bands < 11; ++bands) EXPECT_EQ(bands, run(sample.jpeg, {67, 53, 2}, bands));
     int cutBands = 0;
-    for (size_t length = 0; length < sample.jpeg.size(); length += 3) {
-      const Bytes cut(sample.jpeg.begin(), sample.jpeg.begin() + static_cast<ptrdiff_t>(length));
+    const auto cut_run = [&](const Bytes& cut) {
       cutBands += run(cut, {67, 53, 2}) < 11;
       run(cut, {17, 14, 1});
-    }
+    };
+    every_truncation(sample.jpeg, cut_run, 0, 3);
     EXPECT_GT(cutBands, 100) << sample.name;
     for (size_t i = 2; i < sample.jpeg.size(); i += 5) {
       Bytes bad = sample.jpeg;
@@ -226,43 +171,31 @@ TEST_F(HostileStrips, EndedAnywhereOrDamaged) {
   }
 }
 
-TEST_F(HostileStrips, ADamagedProgressivePictureSetsTheError) {
 #ifdef TAVIR_HAVE_LIBJPEG
-  JpegStyle style;
-  style.progressive = true;
-  const Bytes jpeg = encode_libjpeg(67, 203, style);
-  const Bytes cut(jpeg.begin(), jpeg.end() - static_cast<ptrdiff_t>(jpeg.size() / 3));
+TEST_F(HostileStrips, ADamagedProgressivePictureSetsTheError) {
+  const Bytes jpeg = encode_libjpeg(67, 203, {.progressive = true});
   gTAVIRPELO_Error = 0;
-  EXPECT_LT(run(cut, {67, 203, 1}), 41);
+  EXPECT_LT(run(prefix(jpeg, jpeg.size() - jpeg.size() / 3), {67, 203, 1}), 41);
   EXPECT_EQ(TAVIRPELO_ERROR_DECODE, gTAVIRPELO_Error);
-#endif
 }
+#endif
 
 TEST_F(HostileStrips, MemoryRunsOutAtEveryAllocation) {
   for (const Sample& sample : samples()) {
+    // Without memory for a later scan's tables a progressive picture shows the scans before it.
+    const int spare = std::string_view(sample.name).starts_with("progressive") ? 1 : 0;
     for (const Shape& shape : {Shape{67, 53, 1}, Shape{30, 90, 2}}) {
       const int bands = (shape.height + 4) / 5;
-      for (long k = 1;; ++k) {
-        ASSERT_LT(k, 500);
-        pelo::faults::allocations.arm(k);
-        const int result = run(sample.jpeg, shape);
-        const bool spent = pelo::faults::allocations.calls >= k;
-        pelo::faults::allocations.arm(0);
-        if (spent) {
-          // Without memory for a later scan's tables a progressive picture shows the scans before it.
-          const bool progressive = std::string_view(sample.name).starts_with("progressive");
-          EXPECT_LT(result, progressive ? bands + 1 : bands) << sample.name << " " << k;
-          continue;
-        }
-        EXPECT_EQ(bands, result);
-        break;
-      }
+      EXPECT_EQ(bands, fail_each_allocation([&] { return run(sample.jpeg, shape); },
+                                            [&](int done) { EXPECT_LT(done, bands + spare); }))
+          << sample.name;
     }
   }
 }
 
 TEST_F(HostileStrips, AbortingReleasesTheState) {
-  const Source source(encode_own(64, 200, 80));
+  Bytes jpeg = encode_own(64, 200, 80);
+  const DecInfo source = open_memory(jpeg, 0);
   source->CheckFn = [](TAVIRPELO_DECINFO*, int row, int) { return row < 32 ? 1 : 0; };
   PELOJ_JDINFO* state = __elo_jpeg_dec_line_init(source.get(), 64, 200, TAVIRPELO_RGB888);
   ASSERT_NE(nullptr, state);

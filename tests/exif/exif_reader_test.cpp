@@ -2,14 +2,10 @@
 // ignores.
 #include "codec/jpeg/exif/exif_reader.h"
 
-#include <gtest/gtest.h>
-
-#include <algorithm>
 #include <memory>
-#include <string_view>
 
-#include "platform/android_log.h"
 #include "tests/support/exif_builder.h"
+#include "tests/support/failures.h"
 #include "tests/support/jpeg_segments.h"
 #include "tests/support/slideshow_files.h"
 
@@ -29,11 +25,6 @@ Exif read(const ExifBuilder& exif) {
   return read(exif.jpeg(header_of({frame(9, 9)})));
 }
 
-testing::AssertionResult is(TAVIRPELO_RATIONAL r, uint32_t numerator, uint32_t denominator) {
-  if (r.numerator == numerator && r.denominator == denominator) return testing::AssertionSuccess();
-  return testing::AssertionFailure() << r.numerator << "/" << r.denominator;
-}
-
 class ExifReader : public testing::Test {
  protected:
   void SetUp() override {
@@ -48,68 +39,55 @@ std::string ExifReader::log_;
 class ExifOrder : public testing::TestWithParam<bool> {};
 INSTANTIATE_TEST_SUITE_P(BothOrders, ExifOrder, testing::Bool());
 
+using Numbers = std::vector<int64_t>;
+template <class Ratio>
+Numbers parts(std::initializer_list<Ratio> ratios) {
+  Numbers numbers;
+  for (const Ratio& r : ratios) numbers.insert(numbers.end(), {r.numerator, r.denominator});
+  return numbers;
+}
+std::string text_of(const uint8_t* bytes, size_t count) {
+  return std::string(bytes, bytes + count);
+}
+
 TEST_P(ExifOrder, EveryMember) {
   const Bytes jpeg = full_exif_jpeg(GetParam());
-  const Exif exif = read(jpeg);
-  ASSERT_TRUE(exif);
-  EXPECT_EQ(8u, exif->bitsPerSample[0]);
-  EXPECT_EQ(7u, exif->bitsPerSample[1]);
-  EXPECT_EQ(6u, exif->bitsPerSample[2]);
-  EXPECT_EQ(6u, exif->compression);
-  EXPECT_STREQ("Abc", exif->make);
-  EXPECT_STREQ("Model of five words, outside", exif->model);
-  EXPECT_EQ(6u, exif->orientation);
-  EXPECT_TRUE(is(exif->xResolution, 300, 1));
-  EXPECT_TRUE(is(exif->yResolution, 301, 2));
-  EXPECT_EQ(3u, exif->resolutionUnit);
-  EXPECT_STREQ("soft 1.0", exif->software);
-  EXPECT_EQ(2u, exif->ycbcrPositioning);
-  EXPECT_STREQ("all rights", exif->rights);
-  EXPECT_TRUE(is(exif->exposureTime, 1, 125));
-  EXPECT_EQ("0231", std::string_view(reinterpret_cast<const char*>(exif->exifVersion), 4));
-  EXPECT_STREQ("2021:02:03 04:05:06", exif->captureTime);
-  EXPECT_STREQ("2022:03:04 05:06:07", exif->digitizingTime);
-  EXPECT_EQ(16u, exif->flash);
-  EXPECT_EQ(1u, exif->colourSpace);
-  EXPECT_EQ(70000u, exif->pixelXDimension);
-  EXPECT_EQ(48u, exif->pixelYDimension);
-  EXPECT_EQ(1u, exif->exposureMode);
-  EXPECT_EQ(1u, exif->whiteBalance);
-  EXPECT_TRUE(is(exif->digitalZoom, 3, 2));
-  EXPECT_TRUE(is(exif->focalLength, 50, 1));
-  EXPECT_EQ(400u, exif->isoSpeed);
-  EXPECT_EQ(-1, exif->exposureBias.numerator);
-  EXPECT_EQ(3, exif->exposureBias.denominator);
-  EXPECT_TRUE(is(exif->fNumber, 28, 10));
-  EXPECT_EQ(-7, exif->shutterSpeed.numerator);
+  const Exif info = read(jpeg);
+  ASSERT_TRUE(info && info->gps);
+  const TAVIRPELO_EXIFINFO& e = *info;
+  EXPECT_EQ((Numbers{8, 7, 6, 6, 6, 3, 2, 16, 1, 70000, 48, 1, 1, 400}),
+            (Numbers{e.bitsPerSample[0], e.bitsPerSample[1], e.bitsPerSample[2], e.compression,
+                     e.orientation, e.resolutionUnit, e.ycbcrPositioning, e.flash, e.colourSpace,
+                     e.pixelXDimension, e.pixelYDimension, e.exposureMode, e.whiteBalance, e.isoSpeed}));
+  EXPECT_EQ(
+      (Numbers{300, 1, 301, 2, 1, 125, 3, 2, 50, 1, 28, 10}),
+      parts({e.xResolution, e.yResolution, e.exposureTime, e.digitalZoom, e.focalLength, e.fNumber}));
+  EXPECT_EQ((Numbers{-1, 3, -7, 2}), parts({e.exposureBias, e.shutterSpeed}));
+  EXPECT_STREQ("Abc", e.make);
+  EXPECT_STREQ("Model of five words, outside", e.model);
+  EXPECT_STREQ("soft 1.0", e.software);
+  EXPECT_STREQ("all rights", e.rights);
+  EXPECT_EQ("0231", text_of(e.exifVersion, 4));
+  EXPECT_STREQ("2021:02:03 04:05:06", e.captureTime);
+  EXPECT_STREQ("2022:03:04 05:06:07", e.digitizingTime);
 
-  const TAVIRPELO_GPSINFO* gps = exif->gps;
-  ASSERT_TRUE(gps);
-  EXPECT_EQ(2, gps->version[0]);
-  EXPECT_EQ(3, gps->version[1]);
-  EXPECT_STREQ("N", gps->latitudeRef);
-  EXPECT_STREQ("W", gps->longitudeRef);
-  EXPECT_TRUE(is(gps->latitude[0], 48, 1) && is(gps->latitude[2], 1234, 100));
-  EXPECT_TRUE(is(gps->longitude[1], 34, 1));
-  EXPECT_EQ(1, gps->altitudeRef);
-  EXPECT_TRUE(is(gps->altitude, 5195, 10));
-  EXPECT_TRUE(is(gps->timeStamp[2], 7, 1));
-  EXPECT_STREQ("WGS-84", gps->mapDatum);
-  ASSERT_EQ(11u, gps->processingMethodLength);
-  EXPECT_EQ("GPS", std::string_view(reinterpret_cast<const char*>(gps->processingMethod) + 8, 3));
-  EXPECT_STREQ("2021:02:03", gps->dateStamp);
+  const TAVIRPELO_GPSINFO& gps = *e.gps;
+  EXPECT_EQ((Numbers{2, 3, 1}), (Numbers{gps.version[0], gps.version[1], gps.altitudeRef}));
+  EXPECT_STREQ("N", gps.latitudeRef);
+  EXPECT_STREQ("W", gps.longitudeRef);
+  EXPECT_EQ((Numbers{48, 1, 1234, 100, 34, 1, 5195, 10, 7, 1}),
+            parts({gps.latitude[0], gps.latitude[2], gps.longitude[1], gps.altitude, gps.timeStamp[2]}));
+  EXPECT_STREQ("WGS-84", gps.mapDatum);
+  ASSERT_EQ(11u, gps.processingMethodLength);
+  EXPECT_EQ("GPS", text_of(gps.processingMethod + 8, 3));
+  EXPECT_STREQ("2021:02:03", gps.dateStamp);
 
-  const TAVIRPELO_EXIFTHUMBNAIL& thumbnail = exif->thumbnail;
+  const TAVIRPELO_EXIFTHUMBNAIL& t = e.thumbnail;
   const Bytes expected = sample_thumbnail();
-  EXPECT_EQ(1u, thumbnail.present);
-  EXPECT_EQ(20u, thumbnail.width);
-  EXPECT_EQ(12u, thumbnail.height);
-  EXPECT_EQ(6u, thumbnail.compression);
-  EXPECT_EQ(6u, thumbnail.photometric);
-  EXPECT_EQ(1u, thumbnail.planarConfig);
-  EXPECT_EQ(9u, thumbnail.tag4173);
-  ASSERT_EQ(expected.size(), thumbnail.length);
-  EXPECT_TRUE(std::equal(expected.begin(), expected.end(), jpeg.begin() + thumbnail.offset));
+  EXPECT_EQ((Numbers{1, 20, 12, 6, 6, 1, 9}), (Numbers{t.present, t.width, t.height, t.compression,
+                                                       t.photometric, t.planarConfig, t.tag4173}));
+  ASSERT_EQ(expected.size(), t.length);
+  EXPECT_EQ(expected, prefix(suffix(jpeg, t.offset), t.length));
 }
 
 TEST_F(ExifReader, FileAndSegmentAndBufferAgree) {
@@ -146,20 +124,15 @@ TEST_P(ExifOrder, EntriesOfOtherTypesAndCountsAreIgnored) {
       .text(Ifd::kGps, 1, "NN");
   const Exif info = read(exif);
   ASSERT_TRUE(info && info->gps);
-  EXPECT_EQ(0u, info->orientation);
-  EXPECT_EQ(0u, info->bitsPerSample[0]);
-  EXPECT_EQ(0u, info->resolutionUnit);
+  EXPECT_EQ(Numbers(8), (Numbers{info->orientation, info->bitsPerSample[0], info->resolutionUnit,
+                                 info->yResolution.numerator, info->isoSpeed, info->gps->dateStamp[0],
+                                 info->gps->latitudeRef[0], info->thumbnail.present}));
   EXPECT_EQ(nullptr, info->make);
   EXPECT_EQ(nullptr, info->model);
   EXPECT_NE(0u, info->xResolution.numerator);
-  EXPECT_EQ(0u, info->yResolution.numerator);
   EXPECT_STREQ("xy", info->software);
   EXPECT_EQ(nullptr, info->captureTime);
-  EXPECT_EQ(0u, info->isoSpeed);
-  EXPECT_EQ(0, info->gps->dateStamp[0]);
   EXPECT_EQ(0u, info->gps->latitude[0].numerator);
-  EXPECT_EQ(0, info->gps->latitudeRef[0]);
-  EXPECT_EQ(0u, info->thumbnail.present);
 }
 
 // The last of repeated tags stands; directories are walked once each, whatever points at them.
@@ -195,18 +168,15 @@ TEST_P(ExifOrder, ThumbnailEntriesApplyInTheirOrder) {
   strips.shorts(Ifd::k1, 256, {160}).longs(Ifd::k1, 257, {120}).shorts(Ifd::k1, 259, {1});
   strips.longs(Ifd::k1, 273, {500}).shorts(Ifd::k1, 279, {600});
   Exif info = read(strips);
-  EXPECT_EQ(1u, info->thumbnail.present);
-  EXPECT_EQ(160u, info->thumbnail.width);
-  EXPECT_EQ(120u, info->thumbnail.height);
-  EXPECT_EQ(0u, info->thumbnail.compression);
-  EXPECT_EQ(12u + 500, info->thumbnail.offset);  // SOI, marker, length, identifier
-  EXPECT_EQ(600u, info->thumbnail.length);
-
+  const auto fields = [&] {
+    const TAVIRPELO_EXIFTHUMBNAIL& t = info->thumbnail;
+    return Numbers{t.present, t.width, t.height, t.compression, t.offset, t.length};
+  };
+  // Counted from the file's start: SOI, marker, length, identifier.
+  EXPECT_EQ((Numbers{1, 160, 120, 0, 12 + 500, 600}), fields());
   strips.longs(Ifd::k1, 513, {0xFFFFFFFF}).longs(Ifd::k1, 514, {7}).shorts(Ifd::k1, 259, {9});
   info = read(strips);
-  EXPECT_EQ(0u, info->thumbnail.offset);
-  EXPECT_EQ(9u, info->thumbnail.compression);
-  EXPECT_EQ(160u, info->thumbnail.width);
+  EXPECT_EQ((Numbers{1, 160, 120, 9, 0, 7}), fields());
 }
 
 TEST_F(ExifReader, FindsTheSegmentBehindOthers) {
@@ -230,7 +200,9 @@ TEST_F(ExifReader, FindsTheSegmentBehindOthers) {
 }
 
 TEST_F(ExifReader, RefusesWhatIsNoTiff) {
-  const Bytes head = ByteWriter().text({"Exif\0\0", 6});
+  const auto app1 = [](const Bytes& tiff) {
+    return segment(0xE1, ByteWriter().text({"Exif\0\0", 6}).block(tiff));
+  };
   const Bytes bad[] = {{},
                        {'I', 'I', 42, 0, 8, 0, 0},
                        {'I', 'I', 42, 0, 8, 0, 0, 0},
@@ -238,13 +210,12 @@ TEST_F(ExifReader, RefusesWhatIsNoTiff) {
                        {'I', 'I', 43, 0, 2, 0, 0, 0},
                        {'M', 'M', 42, 0, 0, 0, 0, 2}};
   for (const Bytes& tiff : bad) {
-    const Bytes app1 = segment(0xE1, ByteWriter().block(head).block(tiff));
-    EXPECT_FALSE(read(header_of({app1})));
-    EXPECT_EQ(nullptr, PELOJ_CreatExifInfoUseExifBuffer(app1.data(), static_cast<int>(app1.size())));
+    const Bytes block = app1(tiff);
+    EXPECT_FALSE(read(header_of({block})));
+    EXPECT_EQ(nullptr, PELOJ_CreatExifInfoUseExifBuffer(block.data(), static_cast<int>(block.size())));
   }
   // A sound header whose directory does not fit is EXIF without fields.
-  const Exif info =
-      read(header_of({segment(0xE1, ByteWriter().block(head).block({'I', 'I', 42, 0, 7, 0, 0, 0}))}));
+  const Exif info = read(header_of({app1({'I', 'I', 42, 0, 7, 0, 0, 0})}));
   ASSERT_TRUE(info);
   EXPECT_EQ(0u, info->orientation);
 }
@@ -270,17 +241,14 @@ TEST(JpegResolution, NeedsAWholeHeader) {
   };
   const Bytes good =
       header_of({segment(0xDB, Bytes(65)), segment(0xE5, Bytes(5000)), frame(6000, 11, 0xC2)});
-  for (size_t cut = 0; cut + 28 < good.size(); cut += cut < 5080 ? 97 : 1) {
-    EXPECT_EQ(201, size(Bytes(good.begin(), good.begin() + static_cast<ptrdiff_t>(cut)))) << cut;
-  }
+  for (size_t cut = 0; cut + 28 < good.size(); cut += cut < 5080 ? 97 : 1)
+    EXPECT_EQ(201, size(prefix(good, cut))) << cut;
   EXPECT_EQ(1u, width);
   EXPECT_EQ(2u, height);
   EXPECT_EQ(200, size(good));
   EXPECT_EQ(6000u, width);
   EXPECT_EQ(11u, height);
-  Bytes twelveBit = header_of({frame(5, 5)});
-  twelveBit[6] = 12;
-  EXPECT_EQ(201, size(twelveBit));
+  EXPECT_EQ(201, size(overwritten(header_of({frame(5, 5)}), 6, {12})));
   EXPECT_EQ(201, size(header_of({Bytes{0xFF, 0xC0, 0, 4, 8, 0}})));
   EXPECT_EQ(201, size(header_of({Bytes{0xFF, 0xDB, 0, 1}})));
 }

@@ -1,8 +1,8 @@
 // Damaged, cut and contradictory files, and memory that runs out: every decode ends inside its buffers.
 #include <sys/resource.h>
 
-#include "platform/fault_injection.h"
 #include "tests/gif/gif_decode.h"
+#include "tests/support/failures.h"
 
 namespace tests {
 namespace {
@@ -13,8 +13,7 @@ GifFile victim() {
   file.loops = true;
   file.images[0].control = GifControl{2, 4, 1};
   GifImage second = sample_gif(12, 9, 4, true).images[0];
-  second.left = 5;
-  second.top = 6;
+  second.left = 5, second.top = 6;
   second.palette = sample_palette(16, 7);
   second.control = GifControl{3, 4, -1};
   file.images.push_back(second);
@@ -33,10 +32,9 @@ Answers decode_all(Bytes file, int width = 23, int height = 19) {
   answers.reduced = decode_gif(file, 5, 4, 0, 0x4).answer;
   answers.frames = decode_frames(file, width, height);
   decode_frames(file, 31, 40, 10, 0x70C);
-  file.shrink_to_fit();
   const DecInfo decInfo = open_memory(file, 1);
   if (decInfo == nullptr) return answers;
-  GuardedPixels pixels(width, height, 1, kFill);
+  GuardedPixels pixels(width, height, 1);
   int calls = 0;
   do {
     answers.lines = TAVIRPELOI_DecodeGIFLine(decInfo.get(), pixels.data(), width, height, height);
@@ -51,47 +49,33 @@ Answers decode_all(Bytes file, int width = 23, int height = 19) {
 }
 
 TEST(GifHostile, EveryTruncation) {
-  const GifFile file = victim();
-  const Bytes bytes = file.bytes();
+  const Bytes bytes = victim().bytes();
   const Bytes whole = decode_gif(bytes, 23, 19).pixels;
   int good = 0;
-  for (size_t size = 1; size < bytes.size(); ++size) {
-    const Bytes cut(bytes.begin(), bytes.begin() + static_cast<ptrdiff_t>(size));
+  every_truncation(bytes, [&](const Bytes& cut) {
     const Answers answers = decode_all(cut);
     EXPECT_EQ(0, answers.frames.answer) << "no trailer";
-    const GifResult part = decode_gif(cut, 23, 19);
+    const Decode part = decode_gif(cut, 23, 19);
     EXPECT_EQ(part.answer, answers.lines);
     EXPECT_EQ(part.answer, answers.batches);
     good += part.answer;
     // Whole rows from the top, the rest untouched.
-    size_t row = 0;
-    const auto same = [&](const Bytes& other) {
-      const auto first = static_cast<ptrdiff_t>(row * 23 * 4);
-      return std::equal(part.pixels.begin() + first, part.pixels.begin() + first + 23 * 4,
-                        other.begin() + first);
-    };
-    while (row < 19 && same(whole)) ++row;
-    for (const Bytes empty(whole.size(), kFill); row < 19; ++row) ASSERT_TRUE(same(empty)) << size;
-  }
+    const auto differs = std::mismatch(whole.begin(), whole.end(), part.pixels.begin()).first;
+    Bytes want = prefix(whole, static_cast<size_t>(differs - whole.begin()) / (23 * 4) * (23 * 4));
+    want.resize(whole.size(), kFill);
+    ASSERT_EQ(want, part.pixels) << cut.size();
+  });
   EXPECT_GT(good, 100);
   // A source that claims to be longer than it is has not simply ended.
-  Bytes cut(bytes.begin(), bytes.begin() + 120);
-  MemoryStream stream{cut};
+  MemoryStream stream{prefix(bytes, 120)};
   const DecInfo decInfo = open_stream(stream, 7);
   decInfo->pIO->size = 300;
-  Bytes pixels(23 * 19 * 4);
-  EXPECT_EQ(0, TAVIRPELOI_DecodeGIF(decInfo.get(), pixels.data(), 23, 19));
+  EXPECT_EQ(0, decode(TAVIRPELOI_DecodeGIF, decInfo.get(), 23, 19).answer);
 }
 
 TEST(GifHostile, EveryFlippedByte) {
-  const Bytes bytes = victim().bytes();
-  for (size_t at = 0; at < bytes.size(); ++at) {
-    for (const uint8_t mask : {0xFF, 0x01, 0x80}) {
-      Bytes damaged = bytes;
-      damaged[at] ^= mask;
-      decode_all(damaged);
-    }
-  }
+  every_flip(victim().bytes(), {0xFF, 0x01, 0x80},
+             [](const Bytes& damaged, size_t) { decode_all(damaged); });
 }
 
 // Every field of screen, descriptor and control at its extremes.
@@ -102,23 +86,16 @@ TEST(GifHostile, FieldsAtTheirExtremes) {
   ASSERT_EQ(0xF9, bytes[kControl + 1]);
   constexpr size_t kDescriptor = kControl + 8;
   ASSERT_EQ(0x2C, bytes[kDescriptor]);
-  for (const size_t at :
-       {size_t{6}, size_t{8}, kDescriptor + 1, kDescriptor + 3, kDescriptor + 5, kDescriptor + 7}) {
+  const size_t d = kDescriptor;
+  for (const size_t at : {size_t{6}, size_t{8}, d + 1, d + 3, d + 5, d + 7}) {
     for (const int value : {0, 1, 22, 24, 255, 256, 4095, 32767, 65535}) {
-      Bytes damaged = bytes;
-      damaged[at] = static_cast<uint8_t>(value);
-      damaged[at + 1] = static_cast<uint8_t>(value >> 8);
+      const Bytes damaged = overwritten(bytes, at, ByteWriter(false).u16(value));
       decode_all(damaged);
       decode_all(damaged, 300, 2);
     }
   }
-  for (const size_t at :
-       {size_t{10}, size_t{11}, kControl + 3, kControl + 6, kDescriptor + 9, kDescriptor + 10}) {
-    for (int value = 0; value < 256; ++value) {
-      Bytes damaged = bytes;
-      damaged[at] = static_cast<uint8_t>(value);
-      decode_all(damaged);
-    }
+  for (const size_t at : {size_t{10}, size_t{11}, kControl + 3, kControl + 6, d + 9, d + 10}) {
+    for (int value = 0; value < 256; ++value) decode_all(overwritten(bytes, at, {uint8_t(value)}));
   }
   GifFile flat = file;
   flat.images[0].width = 0;
@@ -150,13 +127,8 @@ TEST(GifHostile, TooMuchAndTooLittleData) {
 
 // Sizes that the header claims are not taken from memory: what is refused stays within a few megabytes.
 TEST(GifHostile, HugeSizes) {
-  GifFile file;
-  file.width = file.height = 65535;
-  GifImage image;
-  image.width = image.height = 65535;
-  image.data = Bytes{2, 2, 0x44, 0x01, 0};
-  image.interlaced = true;
-  file.images.push_back(image);
+  GifFile file{65535, 65535, {}, {{.width = 65535, .height = 65535, .interlaced = true}}};
+  file.images[0].data = Bytes{2, 2, 0x44, 0x01, 0};
   const Bytes bytes = file.bytes();
   const auto peak = [] {  // KiB; what the library allocates it also clears
     rusage usage{};
@@ -169,45 +141,37 @@ TEST(GifHostile, HugeSizes) {
   EXPECT_LT(peak() - before, 64 * 1024);
   // Every index of a large screen out of little data: counted, not written.
   file.images[0].interlaced = false;
-  std::vector<std::pair<int, int>> codes{{4, 3}, {1, 3}};
+  GifCodes codes{{4, 3}, {1, 3}};
   int width = 3;
   for (int next = 6; next < 4096; ++next) {
     codes.emplace_back(next, width);
     if (next + 1 == 1 << width && width < 12) ++width;
   }
-  for (int i = 0; i < 50000; ++i) codes.emplace_back(4095, 12);
+  codes.insert(codes.end(), 50000, {4095, 12});
   file.images[0].data = image_data(2, pack_codes(codes));
   EXPECT_EQ(1, decode_gif(file.bytes(), 7, 7).answer);
 }
 
-// Each allocation fails in turn; the decode answers 0 and holds nothing, or goes on when it could.
+// Each allocation fails in turn; the decode answers 0 and holds nothing.
 TEST(GifHostile, MemoryRunsOutAtEveryAllocation) {
-  GifFile still = sample_gif(40, 30, 5, true);
-  Bytes bytes = still.bytes();
+  Bytes bytes = sample_gif(40, 30, 5, true).bytes();
   GuardedPixels pixels(40, 30, 7);
-  using Decode = int (*)(TAVIRPELO_DECINFO*, uint8_t*);
-  constexpr std::pair<Decode, int> kDecodes[] = {
-      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeGIF(d, out, 19, 17); }, 1},
-      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeGIFLine(d, out, 19, 17, 30); },
-       1},
-      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeGIFIter(d, out, 19, 17); }, 4},
-      {[](TAVIRPELO_DECINFO* d, uint8_t* out) { return TAVIRPELOI_DecodeAGIF(d, out, 19, 17); }, 3},
+  const auto lines = [](TAVIRPELO_DECINFO* d, void* out, int width, int height) {
+    return TAVIRPELOI_DecodeGIFLine(d, out, width, height, 30);
   };
-  for (const auto& [decode, success] : kDecodes) {
-    int answer = 0;
-    long k = 1;
-    for (; answer == 0 && k < 20; ++k) {
-      const DecInfo decInfo = open_memory(bytes, 7);
-      pelo::faults::allocations.arm(k);
-      answer = decode(decInfo.get(), pixels.data());
-      const bool failed = pelo::faults::allocations.calls >= k;
-      pelo::faults::allocations.arm(0);
-      EXPECT_EQ(failed ? 0 : success, answer) << k;
-      if (failed) EXPECT_EQ(nullptr, decInfo->pFormatInfo);
-      TAVIRPELOI_AborAGIF(decInfo.get());
-    }
-    EXPECT_EQ(success, answer);
-    EXPECT_GT(k, 4);
+  for (const auto& [decode, success] : {std::pair<Decoder, int>{TAVIRPELOI_DecodeGIF, 1},
+                                        {lines, 1},
+                                        {TAVIRPELOI_DecodeGIFIter, 4},
+                                        {TAVIRPELOI_DecodeAGIF, 3}}) {
+    DecInfo decInfo;
+    const auto run = [&] {
+      decInfo = open_memory(bytes, 7);
+      return decInfo ? decode(decInfo.get(), pixels.data(), 19, 17) : 0;
+    };
+    EXPECT_EQ(success, fail_each_allocation(run, [&](int answer) {
+                EXPECT_EQ(0, answer);
+                if (decInfo) EXPECT_EQ(nullptr, decInfo->pFormatInfo);
+              }));
   }
 }
 

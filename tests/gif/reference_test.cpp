@@ -33,15 +33,12 @@ class Reference {
   ~Reference() { DGifCloseFile(gif_, nullptr); }
   const GifFileType* operator->() const { return gif_; }
 
-  int transparent(int image) const {
-    GraphicsControlBlock control;
-    return DGifSavedExtensionToGCB(gif_, image, &control) == GIF_OK ? control.TransparentColor : -1;
+  GraphicsControlBlock control(int image) const {
+    GraphicsControlBlock control{0, false, 0, NO_TRANSPARENT_COLOR};
+    DGifSavedExtensionToGCB(gif_, image, &control);
+    return control;
   }
-  int disposal(int image) const {
-    GraphicsControlBlock control;
-    return DGifSavedExtensionToGCB(gif_, image, &control) == GIF_OK ? control.DisposalMode : 0;
-  }
-  Colour colour(int image, int index) const {
+  Rgba colour(int image, int index) const {
     const ColorMapObject* map = gif_->SavedImages[image].ImageDesc.ColorMap;
     const GifColorType& c = (map ? map : gif_->SColorMap)->Colors[index];
     return {c.Red, c.Green, c.Blue, 255};
@@ -53,28 +50,21 @@ class Reference {
 };
 
 // The first image in its place on a filled screen.
-Bytes still_of(const Reference& gif, int format) {
-  const int width = gif->SWidth, height = gif->SHeight;
-  const SavedImage& image = gif->SavedImages[0];
-  Bytes out(static_cast<size_t>(width * height * pelo::bytes_per_pixel(format)), kFill);
-  for (int y = 0; y < image.ImageDesc.Height; ++y) {
-    for (int x = 0; x < image.ImageDesc.Width; ++x) {
-      const int index = image.RasterBits[y * image.ImageDesc.Width + x];
-      const Colour c = index == gif.transparent(0) ? Colour{0, 0, 0, 0} : gif.colour(0, index);
-      const int column = x + image.ImageDesc.Left, row = y + image.ImageDesc.Top;
-      if (column < width && row < height) put_pixel(out, width, column, row, packed(c, format));
-    }
-  }
-  return out;
-}
-
 void expect_equal(const GifFile& file) {
   const Bytes bytes = file.bytes();
-  const Reference reference(bytes);
+  const Reference gif(bytes);
+  const SavedImage& image = gif->SavedImages[0];
+  const GifImageDesc& d = image.ImageDesc;
   for (const int format : {0, 1, 5, 7, 8, 10, 11}) {
-    const GifResult result = decode_gif(bytes, file.width, file.height, format);
+    const Placement place{{gif->SWidth, gif->SHeight}, {d.Width, d.Height}, 0, d.Left, d.Top};
+    const Bytes want = placed(place, format, [&](int x, int y) {
+      const int index = image.RasterBits[y * d.Width + x];
+      const bool clear = index == gif.control(0).TransparentColor;
+      return pixel_bytes(clear ? Rgba{0, 0, 0, 0} : gif.colour(0, index), format);
+    });
+    const Decode result = decode_gif(bytes, file.width, file.height, format);
     EXPECT_EQ(1, result.answer);
-    ASSERT_EQ(still_of(reference, format), result.pixels) << format;
+    ASSERT_EQ(want, result.pixels) << format;
   }
 }
 
@@ -123,18 +113,10 @@ TEST(GifReference, PlacesPalettesAndTransparency) {
   file.palette.clear();
   expect_equal(file);
   for (const auto& [left, top] : {std::pair(10, 5), {0, 39}, {59, 0}, {50, 30}}) {
-    image.left = left;
-    image.top = top;
+    image.left = left, image.top = top;
     expect_equal(file);
   }
-  for (const char* version : {"87a", "12Z"}) {
-    file.version = version;
-    image.control.reset();
-    const Bytes bytes = file.bytes();
-    EXPECT_EQ(1, decode_gif(bytes, 60, 40).answer);
-  }
   file.loops = true;
-  file.version = "89a";
   expect_equal(file);
 }
 
@@ -145,17 +127,13 @@ TEST(GifReference, AnimationsComposed) {
     seed = seed * 1664525 + 1013904223;
     return static_cast<int>((seed >> 8) % static_cast<uint32_t>(below));
   };
+  const auto put = [](Bytes& canvas, int x, int y, const Rgba& c) {
+    canvas = overwritten(std::move(canvas), static_cast<size_t>(4 * (y * 50 + x)), pixel_bytes(c, 7));
+  };
   for (int round = 0; round < 30; ++round) {
-    GifFile file;
-    file.width = 50;
-    file.height = 31;
-    file.palette = sample_palette(16);
-    file.background = 5;
-    file.loops = true;
+    GifFile file{50, 31, sample_palette(16), {}, 5, "89a", true};
     for (int i = 0; i < 6; ++i) {
-      GifImage image;
-      image.left = random(45);
-      image.top = random(28);
+      GifImage image{.left = random(45), .top = random(28)};
       image.width = 1 + random(50 - image.left);
       image.height = 1 + random(31 - image.top);
       image.indices = sample_indices(image.width, image.height, 16, seed);
@@ -173,20 +151,21 @@ TEST(GifReference, AnimationsComposed) {
     Bytes canvas(50 * 31 * 4, 0);
     for (int i = 0; i < 6; ++i) {
       const SavedImage& image = reference->SavedImages[i];
-      const int clear = reference.transparent(i);
-      const Colour under = clear >= 0
-                               ? Colour{0, 0, 0, 0}
-                               : Colour{file.palette[15], file.palette[16], file.palette[17], 255};
+      const GraphicsControlBlock control = reference.control(i);
+      const int clear = control.TransparentColor, disposal = control.DisposalMode;
+      const uint8_t* background = &file.palette[15];
+      const Rgba under =
+          clear >= 0 ? Rgba{0, 0, 0, 0} : Rgba{background[0], background[1], background[2], 255};
       Bytes shown = canvas;
       for (int p = 0; p < image.ImageDesc.Width * image.ImageDesc.Height; ++p) {
         const int x = image.ImageDesc.Left + p % image.ImageDesc.Width;
         const int y = image.ImageDesc.Top + p / image.ImageDesc.Width;
         const int index = image.RasterBits[p];
-        if (index != clear) put_pixel(shown, 50, x, y, packed(reference.colour(i, index), 7));
-        if (reference.disposal(i) == 2) put_pixel(canvas, 50, x, y, packed(under, 7));
+        if (index != clear) put(shown, x, y, reference.colour(i, index));
+        if (disposal == 2) put(canvas, x, y, under);
       }
       ASSERT_EQ(shown, result.frames[static_cast<size_t>(i)]) << round << " " << i;
-      if (reference.disposal(i) < 2 || reference.disposal(i) > 3) canvas = shown;
+      if (disposal < 2 || disposal > 3) canvas = shown;
     }
   }
 }

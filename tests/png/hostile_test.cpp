@@ -1,8 +1,6 @@
 // Damaged and contradictory files: refused or decoded as far as they go, never beyond any buffer.
-#include <random>
-
-#include "platform/fault_injection.h"
 #include "tests/png/png_decode.h"
+#include "tests/support/failures.h"
 
 namespace tests {
 namespace {
@@ -26,45 +24,31 @@ Bytes with_chunk(const Bytes& file, const std::string& type, const Bytes& data) 
 Bytes with_stream(const Bytes& zlib) {
   return build_png(small(), zlib);
 }
+Bytes lines_of(const PngImage& image) {
+  return png_scanlines(image, [](size_t) { return 0; });
+}
 
 TEST(PngHostile, EveryTruncation) {
   for (const uint8_t type : {2, 3}) {
-    const Bytes file = build_png(small(type));
-    for (size_t size = 1; size < file.size(); ++size) {
-      const Bytes cut(file.begin(), file.begin() + static_cast<ptrdiff_t>(size));
-      EXPECT_EQ(0, answer(cut)) << size;
-      MemoryStream stream{cut};
-      GuardedPixels pixels(20, 20, 7);
-      EXPECT_EQ(0, TAVIRPELOI_DecodePNG(open_stream(stream, 7).get(), pixels.data(), 20, 20)) << size;
-    }
+    every_truncation(build_png(small(type)), [](const Bytes& cut) {
+      from_every_source(cut, 7, 0, [&](TAVIRPELO_DECINFO* decInfo) {
+        EXPECT_EQ(0, decode(TAVIRPELOI_DecodePNG, decInfo, 20, 20).answer) << cut.size();
+      });
+    });
   }
 }
 
-// Any flipped bit is noticed by a checksum; but for the bytes after the empty chunk's type.
 TEST(PngHostile, EveryFlippedByte) {
-  const Bytes file = build_png(small(3));
-  for (size_t at = 0; at < file.size(); ++at) {
-    for (const uint8_t bit : {0x01, 0x80}) {
-      Bytes damaged = file;
-      damaged[at] ^= bit;
-      EXPECT_EQ(0, answer(damaged)) << at;
-    }
-  }
-}
-
-// Data whose checksum was made right again: everything behind the checksum meets any byte.
-TEST(PngHostile, EveryFlippedByteOfTheData) {
+  // Any flipped bit is noticed by a checksum.
+  every_flip(build_png(small(3)), {0x01, 0x80},
+             [](const Bytes& damaged, size_t at) { EXPECT_EQ(0, answer(damaged)) << at; });
+  // Data whose checksum was made right again: everything behind the checksum meets any byte.
   for (const bool interlaced : {false, true}) {
     const Bytes file = build_png(small(3, interlaced));
     for (const PngChunk& chunk : png_chunks(file)) {
-      for (size_t at = 0; at < chunk.data.size(); ++at) {
-        for (const uint8_t flip : {0x01, 0x10, 0x80, 0xFF}) {
-          Bytes data = chunk.data;
-          data[at] ^= flip;
-          const int got = answer(with_chunk(file, chunk.type, data), at % 2 ? 0 : 8);
-          EXPECT_TRUE(got == 0 || got == 1);
-        }
-      }
+      every_flip(chunk.data, {0x01, 0x10, 0x80, 0xFF}, [&](const Bytes& data, size_t at) {
+        EXPECT_LE(answer(with_chunk(file, chunk.type, data), at % 2 ? 0 : 8), 1);
+      });
     }
   }
 }
@@ -72,63 +56,43 @@ TEST(PngHostile, EveryFlippedByteOfTheData) {
 TEST(PngHostile, HeaderFields) {
   const Bytes file = build_png(small());
   const Bytes good = png_chunks(file)[0].data;
-  const auto with = [&](size_t at, Bytes bytes) {
-    Bytes data = good;
-    std::copy(bytes.begin(), bytes.end(), data.begin() + static_cast<ptrdiff_t>(at));
-    return answer(with_chunk(file, "IHDR", data));
+  const auto with = [&](size_t at, const Bytes& bytes) {
+    return answer(with_chunk(file, "IHDR", overwritten(good, at, bytes)));
   };
   EXPECT_EQ(1, answer(file));
   for (const size_t side : {0u, 4u}) {
-    EXPECT_EQ(0, with(side, {0, 0, 0, 0}));
-    EXPECT_EQ(0, with(side, {0x80, 0, 0, 0}));
-    EXPECT_EQ(0, with(side, {0xFF, 0xFF, 0xFF, 0xFF}));
+    for (const uint32_t value : {0u, 0x80000000u, 0xFFFFFFFFu})
+      EXPECT_EQ(0, with(side, ByteWriter().u32(value)));
   }
-  EXPECT_EQ(0, with(0, {0x7F, 0xFF, 0xFF, 0xFF, 0x7F, 0xFF, 0xFF, 0xFF}));  // rows of gigabytes
-  Bytes wide = good;
-  wide[0] = 0x04;  // rows of 2^26 pixels: more than is held
-  const PngResult refused = decode_png(with_chunk(file, "IHDR", wide), 9, 9, 1, TAVIRPELO_FIT_STRETCH);
-  EXPECT_EQ(0, refused.answer);
+  EXPECT_EQ(0, with(0, {0x7F, 0xFF, 0xFF, 0xFF, 0x7F, 0xFF, 0xFF, 0xFF}));    // rows of gigabytes
+  const Bytes wide = with_chunk(file, "IHDR", overwritten(good, 0, {0x04}));  // more than is held
+  EXPECT_EQ(0, decode_png(wide, 9, 9, 1, TAVIRPELO_FIT_STRETCH).answer);
   // Depth and type: exactly the standard's combinations.
-  const auto accepted = [](int depth, int type) {
-    switch (type) {
-      case 0:
-        return depth == 1 || depth == 2 || depth == 4 || depth == 8 || depth == 16;
-      case 3:
-        return depth == 1 || depth == 2 || depth == 4 || depth == 8;
-      case 2:
-      case 4:
-      case 6:
-        return depth == 8 || depth == 16;
-      default:
-        return false;
-    }
-  };
+  const std::vector<int> depths[9] = {{1, 2, 4, 8, 16}, {}, {8, 16}, {1, 2, 4, 8}, {8, 16}, {}, {8, 16}};
   const Bytes lines = zlib_stored(Bytes(20000, 0));
   for (int depth = 0; depth < 20; ++depth) {
-    for (int type = 0; type < 9; ++type) {
-      Bytes data = good;
-      data[8] = static_cast<uint8_t>(depth);
-      data[9] = static_cast<uint8_t>(type);
-      auto chunks = png_chunks(with_chunk(with_stream(lines), "IHDR", data));
+    for (size_t type = 0; type < 9; ++type) {
+      const Bytes header = overwritten(good, 8, {uint8_t(depth), uint8_t(type)});
+      auto chunks = png_chunks(with_chunk(with_stream(lines), "IHDR", header));
       chunks.insert(chunks.begin() + 1, {"PLTE", Bytes(6)});
-      EXPECT_EQ(accepted(depth, type), answer(join_png(chunks)) == 1) << depth << " " << type;
+      const auto accepted = std::count(depths[type].begin(), depths[type].end(), depth);
+      EXPECT_EQ(accepted, answer(join_png(chunks))) << depth << " " << type;
     }
   }
   for (const size_t method : {10u, 11u}) EXPECT_EQ(0, with(method, {1}));
   EXPECT_EQ(0, with(12, {2}));
-  EXPECT_EQ(0, answer(with_chunk(file, "IHDR", Bytes(good.begin(), good.end() - 1))));
+  EXPECT_EQ(0, answer(with_chunk(file, "IHDR", prefix(good, 12))));
 }
 
 TEST(PngHostile, PaletteAndTransparency) {
-  const PngImage image = small(3);
-  const Bytes file = build_png(image);
-  const auto plte = [&](size_t length) { return answer(with_chunk(file, "PLTE", Bytes(length, 7))); };
-  EXPECT_EQ(1, plte(768));
-  EXPECT_EQ(0, plte(771));
-  EXPECT_EQ(0, plte(100));
-  const auto trns = [&](size_t length) { return answer(with_chunk(file, "tRNS", Bytes(length, 7))); };
-  EXPECT_EQ(1, trns(200));
-  EXPECT_EQ(0, trns(201));  // more than the palette
+  const Bytes file = build_png(small(3));
+  for (const auto& [type, length, expected] : {std::tuple("PLTE", 768, 1),
+                                               {"PLTE", 771, 0},
+                                               {"PLTE", 100, 0},
+                                               {"tRNS", 200, 1},
+                                               {"tRNS", 201, 0}}) {  // more than the palette
+    EXPECT_EQ(expected, answer(with_chunk(file, type, Bytes(length, 7)))) << type << length;
+  }
   auto chunks = png_chunks(file);
   chunks.erase(chunks.begin() + 1);
   EXPECT_EQ(0, answer(join_png(chunks)));  // tRNS without PLTE
@@ -146,7 +110,7 @@ TEST(PngHostile, PaletteAndTransparency) {
 
 TEST(PngHostile, ChunkTable) {
   const PngImage image = random_png_image(1, 6, 8, 32, 32, false, false);
-  const Bytes lines = zlib_stored(png_scanlines(image, [](size_t) { return 0; }));
+  const Bytes lines = zlib_stored(lines_of(image));
   const Bytes file = build_png(image, lines, 2);
   ASSERT_LT(2048u, png_chunks(file).size());
   EXPECT_EQ(0, decode_png(file, 32, 32, 7).answer);
@@ -160,17 +124,10 @@ TEST(PngHostile, ChunkTable) {
 
 // ---- the compressed data ----
 
-Bytes lines_of(const PngImage& image) {
-  return png_scanlines(image, [](size_t) { return 0; });
-}
-
 TEST(PngHostile, ZlibHeader) {
   Bytes zlib = zlib_fixed(lines_of(small()));
   const auto with = [&](uint8_t method, uint8_t flags) {
-    Bytes changed = zlib;
-    changed[0] = method;
-    changed[1] = flags;
-    return answer(with_stream(changed));
+    return answer(with_stream(overwritten(zlib, 0, {method, flags})));
   };
   EXPECT_EQ(1, with(0x78, 0x55));  // the check value is not looked at
   EXPECT_EQ(1, with(0x08, 0x01));
@@ -186,19 +143,18 @@ TEST(PngHostile, ZlibHeader) {
 }
 
 TEST(PngHostile, RowsTooFewOrTooMany) {
-  const PngImage image = small();
-  const Bytes lines = lines_of(image);
-  const PngResult full = decode_png(build_png(image, zlib_fixed(lines)), 12, 10, 7);
-  Bytes more = lines;
+  const Bytes lines = lines_of(small());
+  const auto pixels = [](const Bytes& l) {
+    const Decode got = decode_png(with_stream(zlib_fixed(l)), 12, 10, 7);
+    EXPECT_EQ(1, got.answer);
+    return got.pixels;
+  };
+  Bytes expected = pixels(lines), more = lines;
   more.insert(more.end(), 100000, 1);
-  EXPECT_EQ(full.pixels, decode_png(build_png(image, zlib_fixed(more)), 12, 10, 7).pixels);
+  EXPECT_EQ(expected, pixels(more));
   // What is missing keeps what the buffer held; the answer is that of a complete stream.
-  const Bytes fewer(lines.begin(), lines.begin() + 5 * 37 + 20);
-  const PngResult part = decode_png(build_png(image, zlib_fixed(fewer)), 12, 10, 7);
-  EXPECT_EQ(1, part.answer);
-  Bytes expected = full.pixels;
-  std::fill(expected.begin() + 5 * 48, expected.end(), uint8_t{0x33});
-  EXPECT_EQ(expected, part.pixels);
+  std::fill(expected.begin() + 5 * 48, expected.end(), kFill);
+  EXPECT_EQ(expected, pixels(prefix(lines, 5 * 37 + 20)));
 }
 
 // A code of one's own: lengths as 4-bit numbers without repeats, then symbols.
@@ -238,14 +194,11 @@ DynamicBlock simple(size_t extra, size_t literals = 286, size_t distances = 30) 
   return block;
 }
 
-int decode_symbols(const DynamicBlock& block, const std::vector<std::pair<uint32_t, int>>& codes,
-                   Bytes* pixels = nullptr) {
+int decode_symbols(const DynamicBlock& block, const std::vector<std::pair<uint32_t, int>>& codes) {
   DeflateWriter writer;
   block.write(writer);
   for (const auto& [code, length] : codes) writer.code(code, length);
-  const PngResult result = decode_png(with_stream(writer.take()), 12, 10, 7);
-  if (pixels != nullptr) *pixels = result.pixels;
-  return result.answer;
+  return answer(with_stream(writer.take()));
 }
 
 TEST(PngHostile, PrefixCodes) {
@@ -273,24 +226,24 @@ TEST(PngHostile, DistancesBeforeTheStart) {
   DeflateWriter writer;
   writer.zlib_header();
   writer.block(true, 1);
-  writer.fixed_literal(0);  // filter type of the first row
+  writer.fixed_symbol(0);  // filter type of the first row
   writer.fixed_match(36, 32768);
-  writer.fixed_literal(0);
-  writer.fixed_literal(9);
+  writer.fixed_symbol(0);
+  writer.fixed_symbol(9);
   writer.fixed_match(3, 30000);
   writer.fixed_match(258, 1);
   writer.fixed_symbol(256);
-  const PngResult got = decode_png(with_stream(writer.take()), 12, 10, 1);
+  const Decode got = decode_png(with_stream(writer.take()), 12, 10, 1);
   EXPECT_EQ(1, got.answer);
   Bytes expected(12 * 3, 0);
   expected.push_back(9);
   expected.resize(12 * 6, 0);
-  EXPECT_TRUE(std::equal(expected.begin(), expected.end(), got.pixels.begin()));
+  EXPECT_EQ(expected, prefix(got.pixels, expected.size()));
 }
 
 TEST(PngHostile, StoredBlocks) {
   const Bytes lines = lines_of(small());
-  const PngResult whole = decode_png(with_stream(zlib_stored(lines)), 12, 10, 7);
+  const Decode whole = decode_png(with_stream(zlib_stored(lines)), 12, 10, 7);
   EXPECT_EQ(1, whole.answer);
   for (const size_t size : {1u, 36u, 100u}) {
     EXPECT_EQ(whole.pixels, decode_png(with_stream(zlib_stored(lines, size)), 12, 10, 7).pixels);
@@ -303,9 +256,9 @@ TEST(PngHostile, StoredBlocks) {
   DeflateWriter writer;
   writer.zlib_header();
   writer.block(false, 1);
-  for (size_t i = 0; i < 100; ++i) writer.fixed_literal(lines[i]);
+  for (size_t i = 0; i < 100; ++i) writer.fixed_symbol(lines[i]);
   writer.fixed_symbol(256);
-  writer.stored(true, Bytes(lines.begin() + 100, lines.end()));
+  writer.stored(true, suffix(lines, 100));
   EXPECT_EQ(whole.pixels, decode_png(with_stream(writer.take()), 12, 10, 7).pixels);
 }
 
@@ -313,7 +266,7 @@ TEST(PngHostile, UnknownFilterKeepsTheRow) {
   const PngImage image = small();
   Bytes lines = lines_of(image);
   lines[37] = 5;
-  const PngResult got = decode_png(build_png(image, zlib_stored(lines)), 12, 10, 1);
+  const Decode got = decode_png(build_png(image, zlib_stored(lines)), 12, 10, 1);
   EXPECT_EQ(1, got.answer);
   EXPECT_EQ(0, got.pixels[36]);
   EXPECT_EQ(lines[39], got.pixels[37]);
@@ -322,29 +275,8 @@ TEST(PngHostile, UnknownFilterKeepsTheRow) {
 TEST(PngHostile, ShortMemoryAtEveryStep) {
   for (const bool interlaced : {false, true}) {
     const Bytes file = build_png(random_png_image(2, 6, 8, 20, 20, interlaced, false));
-    const auto decode = [&] { return decode_png(file, 9, 9, 7, 0x1000); };
-    const PngResult whole = decode();
-    ASSERT_EQ(1, whole.answer);
-    for (int k = 1;; ++k) {
-      pelo::faults::allocations.arm(k);
-      const PngResult got = decode();
-      const bool reached = pelo::faults::allocations.calls >= k;
-      pelo::faults::allocations.arm(0);
-      if (!reached) break;
-      EXPECT_EQ(0, got.answer) << k;
-    }
+    EXPECT_EQ(1, fail_each_allocation([&] { return decode_png(file, 9, 9, 7, 0x1000).answer; }));
   }
-}
-
-TEST(PngHostile, MissingArguments) {
-  Bytes file = build_png(small());
-  const DecInfo decInfo = open_memory(file, 7);
-  uint8_t pixels[4];
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNG(nullptr, pixels, 1, 1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNG(decInfo.get(), nullptr, 1, 1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNG(decInfo.get(), pixels, -1, 1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNGLine(decInfo.get(), pixels, 1, 1, -1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNGIter(decInfo.get(), pixels, 1, -5));
 }
 
 }  // namespace

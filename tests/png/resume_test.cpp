@@ -1,7 +1,4 @@
 // Decoding by lines and by blocks, from every kind of source, and the merging of IDAT chunks.
-#include <cstdio>
-#include <fstream>
-
 #include "tests/png/png_decode.h"
 
 namespace tests {
@@ -20,42 +17,32 @@ Bytes in_pieces(const PngImage& image, size_t idatSize, size_t blockSize) {
 }
 
 Bytes whole(const Bytes& file, int width, int height, uint32_t option = 0) {
-  const PngResult result = decode_png(file, width, height, 7, option);
+  const Decode result = decode_png(file, width, height, 7, option);
   EXPECT_EQ(1, result.answer);
   return result.pixels;
 }
 
-TEST(PngResume, ChunksFromStreamsAsFromMemory) {
+void expect_from_every_source(const Bytes& want, const Bytes& file) {
+  const auto same = [&](TAVIRPELO_DECINFO* decInfo) {
+    ASSERT_EQ(want, decode(TAVIRPELOI_DecodePNG, decInfo, kSide, kSide).pixels);
+  };
+  // A stream may deliver any part of what is asked.
+  from_every_source(file, 7, 0, same, {1, 3, 4096});
+}
+
+TEST(PngResume, ChunksFromEverySource) {
   for (const bool interlaced : {false, true}) {
     const PngImage image = picture(interlaced);
     const Bytes plain = whole(build_png(image), kSide, kSide);
-    for (const size_t idatSize : {3u, 7u, 100u, 4096u}) {
-      const Bytes file = in_pieces(image, idatSize, 500);
-      ASSERT_EQ(plain, whole(file, kSide, kSide)) << idatSize;
-      for (const int limit : {1, 3, 4096}) {  // a stream may deliver any part of what is asked
-        MemoryStream stream{file};
-        stream.limit = limit;
-        GuardedPixels pixels(kSide, kSide, 7);
-        ASSERT_EQ(1, TAVIRPELOI_DecodePNG(open_stream(stream, 7).get(), pixels.data(), kSide, kSide));
-        ASSERT_EQ(plain, pixels.content()) << idatSize << " in reads of " << limit;
-      }
+    for (const size_t idatSize : {3u, 7u, 100u, 4096u})
+      expect_from_every_source(plain, in_pieces(image, idatSize, 500));
+    // A chunk between IDAT chunks is passed over, also where it takes the next header over a read's
+    // border.
+    for (const size_t filler : {1u, 4040u, 4070u, 4085u, 4100u}) {
+      auto chunks = png_chunks(in_pieces(image, 900, SIZE_MAX));
+      chunks.insert(chunks.begin() + 2, {"tEXt", Bytes(filler, 'x')});
+      expect_from_every_source(plain, join_png(chunks));
     }
-  }
-}
-
-// A chunk between IDAT chunks is passed over, also where it takes the next header over a read's border.
-TEST(PngResume, OtherChunksBetween) {
-  const PngImage image = picture();
-  const Bytes plain = whole(build_png(image), kSide, kSide);
-  for (const size_t filler : {1u, 4040u, 4070u, 4085u, 4100u}) {
-    auto chunks = png_chunks(in_pieces(image, 900, SIZE_MAX));
-    chunks.insert(chunks.begin() + 2, {"tEXt", Bytes(filler, 'x')});
-    const Bytes file = join_png(chunks);
-    MemoryStream stream{file};
-    GuardedPixels pixels(kSide, kSide, 7);
-    EXPECT_EQ(1, TAVIRPELOI_DecodePNG(open_stream(stream, 7).get(), pixels.data(), kSide, kSide));
-    EXPECT_EQ(plain, pixels.content());
-    EXPECT_EQ(plain, whole(file, kSide, kSide));
   }
 }
 
@@ -66,7 +53,7 @@ TEST(PngResume, MergedChunksStandInTheCallersBuffer) {
   ASSERT_LT(4u, before);
   Bytes data;
   for (const PngChunk& chunk : png_chunks(file)) {
-    if (chunk.type == "IDAT") data.insert(data.end(), chunk.data.begin(), chunk.data.end());
+    if (chunk.type == "IDAT") append(data, chunk.data);
   }
   GuardedPixels pixels(kSide, kSide, 7);
   EXPECT_EQ(1, TAVIRPELOI_DecodePNG(open_memory(file, 7).get(), pixels.data(), kSide, kSide));
@@ -79,38 +66,27 @@ TEST(PngResume, MergedChunksStandInTheCallersBuffer) {
 }
 
 // Rows by `lines` at a time, each call into a buffer of its own.
-void expect_lines(DecInfo decInfo, const Bytes& expected, int width, int height, int outHeight,
-                  int lines) {
-  const size_t rowBytes = static_cast<size_t>(width) * 4;
-  int done = 0;
-  for (int answer = 4; answer == 4; done += lines) {
-    GuardedPixels band(width, lines, 7);
-    answer = TAVIRPELOI_DecodePNGLine(decInfo.get(), band.data(), width, height, lines);
-    const int rows = std::min(lines, outHeight - done);
-    ASSERT_EQ(done + lines >= outHeight ? 1 : 4, answer) << done;
-    const Bytes got = band.content();
-    ASSERT_TRUE(std::equal(got.begin(), got.begin() + static_cast<ptrdiff_t>(rowBytes) * rows,
-                           expected.begin() + static_cast<ptrdiff_t>(rowBytes) * done))
-        << done;
+void expect_lines(TAVIRPELO_DECINFO* decInfo, const Bytes& expected, Size size, int lines) {
+  Bytes got;
+  for (int answer = 4, done = 0; answer == 4; done += lines) {
+    GuardedPixels band(size.width, lines, 7);
+    answer = TAVIRPELOI_DecodePNGLine(decInfo, band.data(), size.width, size.height, lines);
+    const int rows = std::min(lines, size.height - done);
+    ASSERT_EQ(done + lines >= size.height ? 1 : 4, answer) << done;
+    append(got, prefix(band.content(), bytes_of(7, size.width, rows)));
   }
-  EXPECT_LE(outHeight, done);
+  EXPECT_EQ(expected, got);
   EXPECT_EQ(nullptr, decInfo->pFormatInfo);
 }
 
 TEST(PngResume, LinesEqualTheWhole) {
-  const PngImage image = picture();
-  Bytes file = in_pieces(image, 300, 200);
-  struct Size {
-    int width, height;
-  };
+  const Bytes file = in_pieces(picture(), 300, 200);
   for (const Size size : {Size{31, 33}, Size{20, 70}, Size{50, 9}}) {  // as it is, taller, flatter
     const Bytes expected = whole(file, size.width, size.height, TAVIRPELO_FIT_STRETCH);
     for (int lines = 1; lines <= size.height + 1; ++lines) {
-      expect_lines(open_memory(file, 7, TAVIRPELO_FIT_STRETCH), expected, size.width, size.height,
-                   size.height, lines);
-      MemoryStream stream{file};
-      expect_lines(open_stream(stream, 7, TAVIRPELO_FIT_STRETCH), expected, size.width, size.height,
-                   size.height, lines);
+      from_every_source(file, 7, TAVIRPELO_FIT_STRETCH, [&](TAVIRPELO_DECINFO* decInfo) {
+        expect_lines(decInfo, expected, size, lines);
+      });
     }
   }
 }
@@ -148,6 +124,8 @@ TEST(PngResume, AnotherRequestEndsTheDecode) {
   EXPECT_EQ(1, TAVIRPELOI_AbortPNGIter(decInfo.get()));
   EXPECT_EQ(nullptr, decInfo->pFormatInfo);
   EXPECT_EQ(0, TAVIRPELOI_AbortPNGIter(nullptr));
+  EXPECT_EQ(0, TAVIRPELOI_DecodePNGLine(decInfo.get(), pixels.data(), 1, 1, -1));
+  EXPECT_EQ(0, TAVIRPELOI_DecodePNGIter(decInfo.get(), pixels.data(), 1, -5));
 }
 
 TEST(PngResume, InterlacedPicturesHaveNoLines) {

@@ -2,12 +2,8 @@
 #pragma once
 
 #include <array>
-#include <cstdint>
-#include <initializer_list>
-#include <string_view>
-#include <vector>
 
-#include "tests/support/jpeg_samples.h"
+#include "tests/support/bytes.h"
 
 namespace tests {
 

@@ -7,24 +7,15 @@
 namespace tests {
 namespace {
 
-void put16(Bytes& out, int value) {
-  out.push_back(static_cast<uint8_t>(value));
-  out.push_back(static_cast<uint8_t>(value >> 8));
-}
-
-void append(Bytes& out, const Bytes& more) {
-  out.insert(out.end(), more.begin(), more.end());
-}
-
 // The flag and size bits of a palette's descriptor.
 int table_flags(const Bytes& palette) {
   return palette.empty() ? 0 : 0x80 | (static_cast<int>(std::bit_width(palette.size() / 3)) - 2);
 }
 
 // A dictionary of (prefix code, index), the textbook way.
-std::vector<std::pair<int, int>> lzw_codes(const Bytes& indices, const LzwStyle& style) {
+GifCodes lzw_codes(const Bytes& indices, const LzwStyle& style) {
   const int clear = 1 << style.minimumCodeSize;
-  std::vector<std::pair<int, int>> codes;
+  GifCodes codes;
   std::map<std::pair<int, int>, int> table;
   int next = clear + 2, width = style.minimumCodeSize + 1, since = 0;
   const auto emit = [&](int code) { codes.emplace_back(code, width); };
@@ -81,26 +72,20 @@ Bytes in_pass_order(const GifImage& image) {
   return rows;
 }
 
-void put_control(Bytes& out, const GifControl& control) {
-  const int flags = control.disposal << 2 | (control.transparent >= 0 ? 1 : 0);
-  append(out, {0x21, 0xF9, 4, static_cast<uint8_t>(flags)});
-  put16(out, control.delay);
-  append(out, {static_cast<uint8_t>(std::max(control.transparent, 0)), 0});
-}
-
-void put_image(Bytes& out, const GifImage& image) {
-  if (image.control) put_control(out, *image.control);
-  out.push_back(0x2C);
-  for (const int value : {image.left, image.top, image.width, image.height}) put16(out, value);
-  out.push_back(static_cast<uint8_t>(table_flags(image.palette) | (image.interlaced ? 0x40 : 0)));
-  append(out, image.palette);
-  if (image.data) {
-    append(out, *image.data);
-  } else {
-    append(out,
-           image_data(image.lzw.minimumCodeSize, pack_codes(lzw_codes(in_pass_order(image), image.lzw)),
-                      image.lzw.blockBytes));
+void put_image(ByteWriter& out, const GifImage& image) {
+  if (const auto& control = image.control) {
+    const int flags = control->disposal << 2 | (control->transparent >= 0 ? 1 : 0);
+    out.u24(0x04F921).u8(flags).u16(control->delay);
+    out.u8(std::max(control->transparent, 0)).u8(0);
   }
+  out.u8(0x2C);
+  for (const int value : {image.left, image.top, image.width, image.height}) out.u16(value);
+  out.u8(table_flags(image.palette) | (image.interlaced ? 0x40 : 0));
+  const LzwStyle& lzw = image.lzw;
+  out.block(image.palette)
+      .block(image.data ? *image.data
+                        : image_data(lzw.minimumCodeSize,
+                                     pack_codes(lzw_codes(in_pass_order(image), lzw)), lzw.blockBytes));
 }
 
 uint32_t next_random(uint32_t& seed) {
@@ -109,7 +94,7 @@ uint32_t next_random(uint32_t& seed) {
 
 }  // namespace
 
-Bytes pack_codes(const std::vector<std::pair<int, int>>& codes) {
+Bytes pack_codes(const GifCodes& codes) {
   Bytes out;
   uint32_t bits = 0;
   int count = 0;
@@ -126,27 +111,29 @@ Bytes image_data(int minimumCodeSize, const Bytes& packed, int blockBytes) {
   for (size_t at = 0; at < packed.size(); at += static_cast<size_t>(blockBytes)) {
     const size_t count = std::min(packed.size() - at, static_cast<size_t>(blockBytes));
     out.push_back(static_cast<uint8_t>(count));
-    const auto first = packed.begin() + static_cast<ptrdiff_t>(at);
-    out.insert(out.end(), first, first + static_cast<ptrdiff_t>(count));
+    append(out, prefix(suffix(packed, at), count));
   }
   out.push_back(0);
   return out;
 }
 
 Bytes GifFile::bytes() const {
-  Bytes out{'G', 'I', 'F'};
-  for (const char c : version) out.push_back(static_cast<uint8_t>(c));
-  put16(out, width);
-  put16(out, height);
-  append(out, {static_cast<uint8_t>(table_flags(palette) | 0x70), static_cast<uint8_t>(background), 0});
-  append(out, palette);
-  if (loops) {
-    append(out, {0x21, 0xFF, 11, 'N', 'E', 'T', 'S', 'C', 'A', 'P', 'E', '2', '.', '0', 3, 1, 0, 0, 0});
-    append(out, {0x21, 0xFE, 3, ';', ',', '!', 0});
-  }
+  ByteWriter out(false);
+  out.text("GIF").text(version).u16(width).u16(height);
+  out.u8(table_flags(palette) | 0x70).u8(background).u8(0);
+  out.block(palette);
+  if (loops)
+    out.u24(0x0BFF21).text("NETSCAPE2.0").block({3, 1, 0, 0, 0, 0x21, 0xFE, 3, ';', ',', '!', 0});
   for (const GifImage& image : images) put_image(out, image);
-  if (trailer) out.push_back(0x3B);
-  return out;
+  return out.u8(0x3B);
+}
+
+Rgba GifFile::pixel(int x, int y) const {
+  const GifImage& image = images[0];
+  const int index = image.indices[static_cast<size_t>((y - image.top) * image.width + x - image.left)];
+  if (image.control && image.control->transparent == index) return {0, 0, 0, 0};
+  const uint8_t* p = (image.palette.empty() ? palette : image.palette).data() + 3 * index;
+  return {p[0], p[1], p[2], 255};
 }
 
 Bytes sample_indices(int width, int height, int colours, uint32_t seed) {
@@ -179,18 +166,12 @@ Bytes sample_palette(int colours, uint32_t seed) {
 }
 
 GifFile sample_gif(int width, int height, int bits, bool interlaced) {
-  GifFile file;
-  file.width = width;
-  file.height = height;
-  file.palette = sample_palette(1 << bits);
-  GifImage image;
-  image.width = width;
-  image.height = height;
-  image.indices = sample_indices(width, height, 1 << bits);
-  image.interlaced = interlaced;
-  image.lzw.minimumCodeSize = std::max(bits, 2);
-  file.images.push_back(image);
-  return file;
+  const GifImage image{.width = width,
+                       .height = height,
+                       .indices = sample_indices(width, height, 1 << bits),
+                       .interlaced = interlaced,
+                       .lzw = {.minimumCodeSize = std::max(bits, 2)}};
+  return {width, height, sample_palette(1 << bits), {image}};
 }
 
 }  // namespace tests

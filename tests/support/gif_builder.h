@@ -1,15 +1,14 @@
 // GIF files for tests, written without the library: any structure the format has, and its mistakes.
 #pragma once
 
-#include <cstdint>
 #include <optional>
 #include <string>
 #include <utility>
-#include <vector>
+
+#include "tests/support/bytes.h"
+#include "tests/support/pixels.h"
 
 namespace tests {
-
-using Bytes = std::vector<uint8_t>;
 
 // How an image's indices are coded.
 struct LzwStyle {
@@ -28,28 +27,30 @@ struct GifControl {
 
 struct GifImage {
   int left = 0, top = 0, width = 0, height = 0;
-  Bytes indices;  // rows from top to bottom
-  Bytes palette;  // R, G, B triples, a power of two of them; empty: the global one counts
+  Bytes indices = {};  // rows from top to bottom
+  Bytes palette = {};  // R, G, B triples, a power of two of them; empty: the global one counts
   bool interlaced = false;
-  std::optional<GifControl> control;
-  LzwStyle lzw;
-  std::optional<Bytes> data;  // what follows the descriptor, instead of the coded indices
+  std::optional<GifControl> control = {};
+  LzwStyle lzw = {};
+  std::optional<Bytes> data = {};  // what follows the descriptor, instead of the coded indices
 };
 
 struct GifFile {
   int width = 0, height = 0;
-  Bytes palette;
+  Bytes palette = {};
+  std::vector<GifImage> images = {};
   int background = 0;
   std::string version = "89a";
   bool loops = false;  // with the extension that repeats an animation, and a comment
-  std::vector<GifImage> images;
-  bool trailer = true;
 
   Bytes bytes() const;
+  // A pixel of the screen by the first image; zeros where that is transparent.
+  Rgba pixel(int x, int y) const;
 };
 
 // Codes and their widths, packed least significant bit first.
-Bytes pack_codes(const std::vector<std::pair<int, int>>& codes);
+using GifCodes = std::vector<std::pair<int, int>>;
+Bytes pack_codes(const GifCodes& codes);
 
 // Data in sub-blocks behind their minimum code size, with the empty one.
 Bytes image_data(int minimumCodeSize, const Bytes& packed, int blockBytes = 255);
@@ -57,7 +58,7 @@ Bytes image_data(int minimumCodeSize, const Bytes& packed, int blockBytes = 255)
 // Indices below `colours`: runs, repeats and noise.
 Bytes sample_indices(int width, int height, int colours, uint32_t seed = 1);
 
-// `colours` R, G, B triples, all different.
+// `colours` R, G, B triples, all different in R.
 Bytes sample_palette(int colours, uint32_t seed = 1);
 
 // A file of one image that fills the screen, with a palette of 2^bits colours.

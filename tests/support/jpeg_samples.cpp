@@ -1,11 +1,10 @@
 #include "tests/support/jpeg_samples.h"
 
+#include <gtest/gtest.h>
+
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
-#include <cstring>
-
-#include "tavirpelo/tavirpelo.h"
 
 #ifdef TAVIR_HAVE_LIBJPEG
 #include <jpeglib.h>
@@ -20,27 +19,33 @@ Bytes sample_pixels(int width, int height) {
     for (int x = 0; x < width; ++x) {
       noise = noise * 1664525 + 1013904223;
       const int edge = (x / 9 + y / 7) % 2 * 60;
-      pixels.push_back(static_cast<uint8_t>((x * 5 + edge) % 256));
-      pixels.push_back(static_cast<uint8_t>((y * 3 + edge + static_cast<int>(noise >> 28)) % 256));
-      pixels.push_back(static_cast<uint8_t>((x + y * 2) % 256));
+      for (const int v : {x * 5 + edge, y * 3 + edge + static_cast<int>(noise >> 28), x + y * 2})
+        pixels.push_back(static_cast<uint8_t>(v % 256));
     }
   }
   return pixels;
 }
 
-Bytes encode_own(int width, int height, int quality, bool grey) {
-  const Bytes pixels = sample_pixels(width, height);
-  TAVIRPELO_RAWINFO raw{};
-  raw.width = static_cast<uint32_t>(width);
-  raw.height = static_cast<uint32_t>(height);
-  raw.pData = const_cast<uint8_t*>(pixels.data());
-  raw.format = grey ? TAVIRPELO_GREY8 : TAVIRPELO_RGB888;
-  int size = 1024;
-  auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(1024));
-  if (!TAVIRPELO_EncodeJpegToBuffer(&raw, &buffer, &size, quality)) return {};
-  Bytes jpeg(buffer, buffer + size);
+Bytes encode_pixels(const Bytes& pixels, int width, int height, uint32_t format,
+                    const TAVIRPELO_ENCOPTION& options, int capacity) {
+  const Bytes copy(pixels);  // a heap block of its own: reads past it are seen
+  const TAVIRPELO_RAWINFO raw = raw_image(copy, width, height, format);
+  auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(static_cast<size_t>(capacity)));
+  if (buffer == nullptr) return {};
+  Bytes jpeg;
+  if (elo_enc_jpeg_to_buffer_ex(&raw, &buffer, &capacity, &options)) {
+    jpeg.assign(buffer, buffer + capacity);
+  } else {
+    EXPECT_EQ(nullptr, buffer);
+    EXPECT_EQ(0, capacity);
+  }
   TAVIRPELO_OsFree(buffer);
   return jpeg;
+}
+
+Bytes encode_own(int width, int height, int quality, bool grey) {
+  return encode_pixels(sample_pixels(width, height), width, height,
+                       grey ? TAVIRPELO_GREY8 : TAVIRPELO_RGB888, {quality, nullptr, 0});
 }
 
 #ifdef TAVIR_HAVE_LIBJPEG
@@ -49,6 +54,22 @@ namespace {
 // Each component in a scan of its own.
 const jpeg_scan_info kSeparate[3] = {
     {1, {0, 0, 0, 0}, 0, 63, 0, 0}, {1, {1, 0, 0, 0}, 0, 63, 0, 0}, {1, {2, 0, 0, 0}, 0, 63, 0, 0}};
+
+// A JPEG whose header libjpeg has read.
+struct Decompressor : jpeg_decompress_struct {
+  explicit Decompressor(const Bytes& jpeg) {
+    err = jpeg_std_error(&errors);
+    jpeg_create_decompress(this);
+    jpeg_mem_src(this, jpeg.data(), static_cast<unsigned long>(jpeg.size()));
+    jpeg_read_header(this, TRUE);
+  }
+  ~Decompressor() {
+    jpeg_finish_decompress(this);
+    jpeg_destroy_decompress(this);
+  }
+  Decompressor(const Decompressor&) = delete;
+  jpeg_error_mgr errors;
+};
 
 }  // namespace
 
@@ -90,61 +111,49 @@ Bytes encode_libjpeg(int width, int height, const JpegStyle& style) {
 }
 
 Decoded decode_libjpeg(const Bytes& jpeg, int numerator) {
-  jpeg_decompress_struct d;
-  jpeg_error_mgr errors;
-  d.err = jpeg_std_error(&errors);
-  jpeg_create_decompress(&d);
-  jpeg_mem_src(&d, jpeg.data(), static_cast<unsigned long>(jpeg.size()));
-  jpeg_read_header(&d, TRUE);
+  Decompressor d(jpeg);
   d.scale_num = static_cast<unsigned>(numerator);
   d.scale_denom = 8;
   d.do_fancy_upsampling = FALSE;
   jpeg_start_decompress(&d);
-  Decoded out{static_cast<int>(d.output_width), static_cast<int>(d.output_height), d.output_components, {}};
-  const size_t stride = static_cast<size_t>(out.width) * static_cast<size_t>(out.components);
-  out.pixels.resize(stride * static_cast<size_t>(out.height));
+  const size_t stride = size_t{d.output_width} * static_cast<size_t>(d.output_components);
+  Bytes pixels(stride * d.output_height);
   while (d.output_scanline < d.output_height) {
-    JSAMPROW row = out.pixels.data() + stride * d.output_scanline;
+    JSAMPROW row = pixels.data() + stride * d.output_scanline;
     jpeg_read_scanlines(&d, &row, 1);
   }
-  jpeg_finish_decompress(&d);
-  jpeg_destroy_decompress(&d);
-  return out;
+  return {static_cast<int>(d.output_width), static_cast<int>(d.output_height), d.output_components,
+          pixels};
 }
 
 std::vector<Plane> read_coefficients(const Bytes& jpeg) {
-  jpeg_decompress_struct d;
-  jpeg_error_mgr errors;
-  d.err = jpeg_std_error(&errors);
-  jpeg_create_decompress(&d);
-  jpeg_mem_src(&d, jpeg.data(), static_cast<unsigned long>(jpeg.size()));
-  jpeg_read_header(&d, TRUE);
+  Decompressor d(jpeg);
   jvirt_barray_ptr* arrays = jpeg_read_coefficients(&d);
   std::vector<Plane> planes;
   for (int c = 0; c < d.num_components; ++c) {
     const jpeg_component_info& info = d.comp_info[c];
-    Plane plane{info.h_samp_factor, info.v_samp_factor, static_cast<int>(info.width_in_blocks),
-                static_cast<int>(info.height_in_blocks), {}, {}};
-    plane.quant.assign(info.quant_table->quantval, info.quant_table->quantval + 64);
+    const uint16_t* quant = info.quant_table->quantval;
+    Plane plane{info.h_samp_factor,
+                info.v_samp_factor,
+                static_cast<int>(info.width_in_blocks),
+                static_cast<int>(info.height_in_blocks),
+                {quant, quant + 64},
+                {}};
     for (JDIMENSION row = 0; row < info.height_in_blocks; ++row) {
-      JBLOCKARRAY blocks = d.mem->access_virt_barray(reinterpret_cast<j_common_ptr>(&d), arrays[c], row, 1, FALSE);
-      for (JDIMENSION column = 0; column < info.width_in_blocks; ++column) {
+      JBLOCKARRAY blocks =
+          d.mem->access_virt_barray(reinterpret_cast<j_common_ptr>(&d), arrays[c], row, 1, FALSE);
+      for (JDIMENSION column = 0; column < info.width_in_blocks; ++column)
         plane.coefficients.insert(plane.coefficients.end(), blocks[0][column], blocks[0][column] + 64);
-      }
     }
     planes.push_back(plane);
   }
-  jpeg_finish_decompress(&d);
-  jpeg_destroy_decompress(&d);
   return planes;
 }
 #endif
 
 Bytes sample_jpeg(int width, int height, bool grey) {
 #ifdef TAVIR_HAVE_LIBJPEG
-  JpegStyle style;
-  style.components = grey ? 1 : 3;
-  return encode_libjpeg(width, height, style);
+  return encode_libjpeg(width, height, {.components = grey ? 1 : 3});
 #else
   return encode_own(width, height, 90, grey);
 #endif

@@ -2,17 +2,25 @@
 // one never writes.
 #pragma once
 
-#include <cstdint>
-#include <vector>
+#include "tavirpelo/tavirpelo.h"
+#include "tests/support/bytes.h"
 
 namespace tests {
-
-using Bytes = std::vector<uint8_t>;
 
 // R, G, B rows of a picture with gradients, edges and some noise.
 Bytes sample_pixels(int width, int height);
 
-// The same picture from the library's encoder: 4:2:0 or grey.
+inline TAVIRPELO_RAWINFO raw_image(const Bytes& pixels, int width, int height, uint32_t format) {
+  return {static_cast<uint32_t>(width), static_cast<uint32_t>(height),
+          const_cast<uint8_t*>(pixels.data()), format};
+}
+
+// Pixels through the library's encoder into a buffer of that capacity at first; empty when it fails,
+// which must leave no buffer.
+Bytes encode_pixels(const Bytes& pixels, int width, int height, uint32_t format,
+                    const TAVIRPELO_ENCOPTION& options, int capacity = 1024);
+
+// The sample picture from the library's encoder: 4:2:0 or grey.
 Bytes encode_own(int width, int height, int quality, bool grey = false);
 
 // The same picture from whichever encoder the build has.
@@ -41,7 +49,7 @@ Decoded decode_libjpeg(const Bytes& jpeg, int numerator);
 // The picture's quantised coefficients (natural order) and layout.
 struct Plane {
   int h, v, blocksWide, blocksHigh;
-  std::vector<uint16_t> quant;      // natural order
+  std::vector<uint16_t> quant;  // natural order
   std::vector<int16_t> coefficients;
 };
 std::vector<Plane> read_coefficients(const Bytes& jpeg);

@@ -6,7 +6,7 @@
 #include <cstring>
 
 #include "tavirpelo/io.h"
-#include "tests/support/jpeg_samples.h"
+#include "tests/support/bytes.h"
 
 namespace tests {
 

@@ -6,14 +6,6 @@
 namespace tests {
 namespace {
 
-void append(Bytes& to, const Bytes& from) {
-  to.insert(to.end(), from.begin(), from.end());
-}
-
-void put_be32(Bytes& out, uint32_t value) {
-  for (int shift = 24; shift >= 0; shift -= 8) out.push_back(static_cast<uint8_t>(value >> shift));
-}
-
 // The checksum by its definition, a bit at a time.
 uint32_t crc32(const Bytes& data) {
   uint32_t crc = 0xFFFFFFFF;
@@ -25,18 +17,9 @@ uint32_t crc32(const Bytes& data) {
 }
 
 uint8_t to_byte(uint16_t v, int depth) {
-  switch (depth) {
-    case 1:
-      return v ? 255 : 0;
-    case 2:
-      return static_cast<uint8_t>(v << 6 | 63);
-    case 4:
-      return static_cast<uint8_t>(v << 4 | 15);
-    case 16:
-      return static_cast<uint8_t>(v >> 8);
-    default:
-      return static_cast<uint8_t>(v);
-  }
+  if (depth == 1) return v ? 255 : 0;
+  if (depth == 16) return static_cast<uint8_t>(v >> 8);
+  return static_cast<uint8_t>(v << (8 - depth) | ((1 << (8 - depth)) - 1));
 }
 
 Bytes pack_row(const PngImage& image, uint32_t y, uint32_t firstColumn, uint32_t step) {
@@ -59,20 +42,9 @@ Bytes pack_row(const PngImage& image, uint32_t y, uint32_t firstColumn, uint32_t
 }
 
 uint8_t predictor(int type, int a, int b, int c) {
-  switch (type) {
-    case 1:
-      return static_cast<uint8_t>(a);
-    case 2:
-      return static_cast<uint8_t>(b);
-    case 3:
-      return static_cast<uint8_t>((a + b) / 2);
-    case 4: {
-      const int p = a + b - c, pa = std::abs(p - a), pb = std::abs(p - b), pc = std::abs(p - c);
-      return static_cast<uint8_t>(pa <= pb && pa <= pc ? a : pb <= pc ? b : c);
-    }
-    default:
-      return 0;
-  }
+  const int p = a + b - c, pa = std::abs(p - a), pb = std::abs(p - b), pc = std::abs(p - c);
+  const int paeth = pa <= pb && pa <= pc ? a : pb <= pc ? b : c;
+  return static_cast<uint8_t>(std::array{0, a, b, (a + b) / 2, paeth}.at(static_cast<size_t>(type)));
 }
 
 Bytes filter_row(const Bytes& row, const Bytes& above, int type, size_t bpp) {
@@ -103,26 +75,24 @@ uint16_t PngImage::sample(uint32_t x, uint32_t y, int channel) const {
                  static_cast<size_t>(channel)];
 }
 
-std::array<uint8_t, 4> PngImage::rgba(uint32_t x, uint32_t y) const {
+Rgba PngImage::rgba(int column, int row) const {
+  const auto x = static_cast<uint32_t>(column), y = static_cast<uint32_t>(row);
   const auto value = [&](int c) { return to_byte(sample(x, y, c), depth); };
-  const auto key = [&](size_t i) { return trns[2 * i] << 8 | trns[2 * i + 1]; };
   if (type == 3) {
     const size_t i = sample(x, y, 0);
-    const auto alpha = static_cast<uint8_t>(hasTrns && i < trns.size() ? trns[i] : 255);
+    const uint8_t alpha = hasTrns && i < trns.size() ? trns[i] : 255;
     if (3 * i + 2 >= palette.size()) return {0, 0, 0, alpha};
     return {palette[3 * i], palette[3 * i + 1], palette[3 * i + 2], alpha};
   }
   if (type == 4) return {value(0), value(0), value(0), value(1)};
   if (type == 6) return {value(0), value(1), value(2), value(3)};
-  const bool grey = type == 0;
+  const int ignored = depth == 16 ? 8 : 0;  // of 16 bits the upper half counts
   bool transparent = hasTrns;
-  for (size_t c = 0; hasTrns && c < (grey ? 1 : 3); ++c) {
-    const int k = depth == 16 ? key(c) >> 8 : key(c);  // of 16 bits the upper half counts
-    transparent &=
-        k == (depth == 16 ? sample(x, y, static_cast<int>(c)) >> 8 : sample(x, y, static_cast<int>(c)));
+  for (size_t c = 0; hasTrns && c < (type == 0 ? 1 : 3); ++c) {
+    const int key = trns[2 * c] << 8 | trns[2 * c + 1];
+    transparent &= key >> ignored == sample(x, y, static_cast<int>(c)) >> ignored;
   }
-  return {value(0), value(grey ? 0 : 1), value(grey ? 0 : 2),
-          static_cast<uint8_t>(transparent ? 0 : 255)};
+  return {value(0), value(type / 2), value(type), static_cast<uint8_t>(transparent ? 0 : 255)};
 }
 
 PngImage random_png_image(uint32_t seed, uint8_t type, uint8_t depth, uint32_t width, uint32_t height,
@@ -132,9 +102,8 @@ PngImage random_png_image(uint32_t seed, uint8_t type, uint8_t depth, uint32_t w
   const uint32_t entries = std::min(200u, 1u << depth);
   const uint32_t top = type == 3 ? entries - 1 : (1u << depth) - 1;
   if (type == 3) {
-    for (uint32_t i = 0; i < 3 * entries; ++i) image.palette.push_back(static_cast<uint8_t>(random()));
-    for (uint32_t i = 0; trns && i < (entries + 1) / 2; ++i)
-      image.trns.push_back(static_cast<uint8_t>(random()));
+    image.palette = random_bytes(3 * entries, seed);
+    if (trns) image.trns = random_bytes((entries + 1) / 2, seed + 1);
   }
   // Few values, so that neighbours repeat and the colour key occurs.
   const size_t count = size_t{width} * height * static_cast<size_t>(image.channels());
@@ -142,12 +111,9 @@ PngImage random_png_image(uint32_t seed, uint8_t type, uint8_t depth, uint32_t w
     image.samples.push_back(
         static_cast<uint16_t>(random() % 4 ? (random() % 3) * top / 2 : random() % (top + 1)));
   }
-  if (trns && type != 3) {
-    for (int c = 0; c < (type == 0 ? 1 : 3); ++c) {
-      image.trns.push_back(static_cast<uint8_t>(image.sample(0, 0, c) >> 8));
-      image.trns.push_back(static_cast<uint8_t>(image.sample(0, 0, c)));
-    }
-  }
+  ByteWriter key;
+  for (int c = 0; c < (type == 0 ? 1 : 3); ++c) key.u16(image.sample(0, 0, c));
+  if (trns && type != 3) image.trns = key;
   return image;
 }
 
@@ -169,13 +135,8 @@ Bytes png_scanlines(const PngImage& image, const std::function<int(size_t)>& fil
 }
 
 Bytes png_chunk(const std::string& type, const Bytes& data) {
-  Bytes out;
-  put_be32(out, static_cast<uint32_t>(data.size()));
-  Bytes checked(type.begin(), type.end());
-  append(checked, data);
-  append(out, checked);
-  put_be32(out, crc32(checked));
-  return out;
+  const Bytes checked = ByteWriter().text(type).block(data);
+  return ByteWriter().u32(static_cast<uint32_t>(data.size())).block(checked).u32(crc32(checked));
 }
 
 namespace {
@@ -183,13 +144,11 @@ const Bytes kSignature{137, 'P', 'N', 'G', 13, 10, 26, 10};
 }
 
 Bytes png_header(const PngImage& image) {
-  Bytes data;
-  put_be32(data, image.width);
-  put_be32(data, image.height);
-  append(data, {image.depth, image.type, 0, 0, static_cast<uint8_t>(image.interlaced)});
-  Bytes out = kSignature;
-  append(out, png_chunk("IHDR", data));
-  return out;
+  const Bytes data = ByteWriter()
+                         .u32(image.width)
+                         .u32(image.height)
+                         .block({image.depth, image.type, 0, 0, image.interlaced});
+  return ByteWriter().block(kSignature).block(png_chunk("IHDR", data));
 }
 
 std::vector<PngChunk> png_chunks(const Bytes& file) {
@@ -215,12 +174,8 @@ Bytes build_png(const PngImage& image, const Bytes& zlib, size_t idatSize) {
   Bytes out = png_header(image);
   if (!image.palette.empty()) append(out, png_chunk("PLTE", image.palette));
   if (image.hasTrns) append(out, png_chunk("tRNS", image.trns));
-  for (size_t at = 0; at < zlib.size(); at += std::min(idatSize, zlib.size() - at)) {
-    const auto from = zlib.begin() + static_cast<ptrdiff_t>(at);
-    append(out,
-           png_chunk("IDAT",
-                     Bytes(from, from + static_cast<ptrdiff_t>(std::min(idatSize, zlib.size() - at)))));
-  }
+  for (size_t at = 0; at < zlib.size(); at += std::min(idatSize, zlib.size() - at))
+    append(out, png_chunk("IDAT", prefix(suffix(zlib, at), std::min(idatSize, zlib.size() - at))));
   append(out, png_chunk("IEND", {}));
   return out;
 }
@@ -311,13 +266,10 @@ Bytes zlib_stored(const Bytes& data, size_t blockSize) {
   size_t at = 0;
   do {
     const size_t count = std::min(blockSize, data.size() - at);
-    const auto from = data.begin() + static_cast<ptrdiff_t>(at);
-    writer.stored(at + count == data.size(), Bytes(from, from + static_cast<ptrdiff_t>(count)));
+    writer.stored(at + count == data.size(), prefix(suffix(data, at), count));
     at += count;
   } while (at < data.size());
-  Bytes out = writer.take();
-  put_be32(out, adler32(data));
-  return out;
+  return ByteWriter().block(writer.take()).u32(adler32(data));
 }
 
 Bytes zlib_fixed(const Bytes& data, size_t blockSize) {
@@ -337,14 +289,12 @@ Bytes zlib_fixed(const Bytes& data, size_t blockSize) {
         writer.fixed_match(static_cast<uint32_t>(best), static_cast<uint32_t>(distance));
         at += best;
       } else {
-        writer.fixed_literal(data[at++]);
+        writer.fixed_symbol(data[at++]);
       }
     }
     writer.fixed_symbol(256);
   } while (at < data.size());
-  Bytes out = writer.take();
-  put_be32(out, adler32(data));
-  return out;
+  return ByteWriter().block(writer.take()).u32(adler32(data));
 }
 
 }  // namespace tests

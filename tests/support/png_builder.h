@@ -2,13 +2,10 @@
 // control.
 #pragma once
 
-#include <array>
-#include <cstddef>
-#include <cstdint>
 #include <functional>
 #include <string>
 
-#include "tests/support/jpeg_samples.h"
+#include "tests/support/pixels.h"
 
 namespace tests {
 
@@ -25,7 +22,7 @@ struct PngImage {
   int channels() const;
   uint16_t sample(uint32_t x, uint32_t y, int channel) const;
   // The pixel as four bytes, by the rules of this codec.
-  std::array<uint8_t, 4> rgba(uint32_t x, uint32_t y) const;
+  Rgba rgba(int x, int y) const;
 };
 
 // Random samples; indices stay within a palette of 2^depth entries (at most 200), which is made too.
@@ -62,13 +59,9 @@ class DeflateWriter {
   void zlib_header() { byte(0x78), byte(0x01); }
   void block(bool last, int type) { bits(last, 1), bits(static_cast<uint32_t>(type), 2); }
   void stored(bool last, const Bytes& data);  // at most 65535 bytes
-  void fixed_literal(uint8_t value) { fixed_symbol(value); }
   void fixed_symbol(uint32_t symbol);
   void fixed_match(uint32_t length, uint32_t distance);
-  Bytes take() {
-    align();
-    return std::move(bytes_);
-  }
+  Bytes take() { return align(), std::move(bytes_); }
 
  private:
   Bytes bytes_;
