@@ -1,12 +1,8 @@
 // Full-size decodes against slow formulas: coefficients as libjpeg reads them, the transform member by
 // last position, replication, four-point or centre sampling by division, and colour by multiplication.
-#include <gtest/gtest.h>
-
-#include <algorithm>
-
 #include "codec/jpeg/decoder/idct.h"
 #include "codec/jpeg/tables.h"
-#include "tavirpelo/tavirpelo.h"
+#include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_samples.h"
 
 #ifdef TAVIR_HAVE_LIBJPEG
@@ -58,135 +54,106 @@ Grid reference_grid(const Plane& plane, int hMax, int vMax, bool progressive) {
   return grid;
 }
 
-int clamp255(int v) { return std::clamp(v, 0, 255); }
-
 struct Case {
-  int width, height;
+  Size size;
   JpegStyle style;
-  int outWidth, outHeight;
+  Size out;
 };
 
 // One output pixel's samples: the average of the four points, or the centre's.
 int sample(const Grid& grid, const Case& c, int x, int y, bool centre) {
-  const auto at = [](int64_t i, int64_t in, int64_t out, int64_t q) { return static_cast<int>((i * in + q) / out); };
-  if (c.width == c.outWidth && c.height == c.outHeight) return grid.at(x, y);
-  if (centre) return grid.at(at(x, c.width, c.outWidth, c.width / 2), at(y, c.height, c.outHeight, c.height / 2));
+  const auto [width, height] = c.size;
+  if (width == c.out.width && height == c.out.height) return grid.at(x, y);
+  if (centre)
+    return grid.at(position(x, width, c.out.width, width / 2),
+                   position(y, height, c.out.height, height / 2));
   int sum = 0;
-  for (const int qx : {c.width / 4, 3 * c.width / 4}) {
-    for (const int qy : {c.height / 4, 3 * c.height / 4}) {
-      sum += grid.at(at(x, c.width, c.outWidth, qx), at(y, c.height, c.outHeight, qy));
-    }
-  }
+  four_points(c.size, c.out, x, y, [&](int u, int v) { sum += grid.at(u, v); });
   return sum / 4;
 }
 
 Bytes reference(const Case& c, const std::vector<Plane>& planes, bool centre) {
   std::vector<Grid> grids;
-  for (const Plane& plane : planes) grids.push_back(reference_grid(plane, planes[0].h, planes[0].v, c.style.progressive));
-  Bytes out;
-  for (int y = 0; y < c.outHeight; ++y) {
-    for (int x = 0; x < c.outWidth; ++x) {
-      int s[3];
-      for (size_t i = 0; i < 3; ++i) s[i] = sample(grids[planes.size() == 1 ? 0 : i], c, x, y, centre);
-      if (planes.size() == 1 || c.style.rgb) {
-        for (const int v : s) out.push_back(static_cast<uint8_t>(v));
-        continue;
-      }
-      const int u = s[1] - 128;
-      const int v = s[2] - 128;
-      out.push_back(static_cast<uint8_t>(clamp255(s[0] + (v * 91881 >> 16))));
-      out.push_back(static_cast<uint8_t>(clamp255(s[0] - ((u * 22554 + v * 46802) >> 16))));
-      out.push_back(static_cast<uint8_t>(clamp255(s[0] + (u * 116130 >> 16))));
+  for (const Plane& plane : planes)
+    grids.push_back(reference_grid(plane, planes[0].h, planes[0].v, c.style.progressive));
+  return placed(centred(c.out, c.out), 1, [&](int x, int y) {
+    int s[3];
+    for (size_t i = 0; i < 3; ++i) s[i] = sample(grids[planes.size() == 1 ? 0 : i], c, x, y, centre);
+    if (planes.size() > 1 && !c.style.rgb) {
+      const int u = s[1] - 128, v = s[2] - 128;
+      s[1] = s[0] - ((u * 22554 + v * 46802) >> 16);
+      s[2] = s[0] + (u * 116130 >> 16);
+      s[0] += v * 91881 >> 16;
     }
-  }
-  return out;
+    Bytes pixel;
+    for (const int v : s) pixel.push_back(static_cast<uint8_t>(std::clamp(v, 0, 255)));
+    return pixel;
+  });
 }
 
-Bytes decode(Bytes jpeg, int width, int height) {
-  TAVIRPELO_RAWINFO* raw = TAVIRPELO_CreateRawInfo(width, height, TAVIRPELO_RGB888);
-  EXPECT_EQ(1, TAVIRPELO_DecodeJpegFromBuffer(jpeg.data(), static_cast<int>(jpeg.size()), raw,
-                                              TAVIRPELO_FIT_STRETCH | TAVIRPELO_THUMBNAIL_NEVER));
-  const auto* bytes = static_cast<const uint8_t*>(raw->pData);
-  Bytes out(bytes, bytes + static_cast<size_t>(3 * width) * static_cast<size_t>(height));
-  TAVIRPELO_DestroyRawInfo(raw);
-  return out;
-}
-
-JpegStyle style(int h, int v, int restart = 0, bool separate = false) {
-  JpegStyle s;
-  s.h = h;
-  s.v = v;
-  s.restartInterval = restart;
-  s.separateScans = separate;
-  return s;
-}
-JpegStyle grey() {
-  JpegStyle s;
-  s.components = 1;
-  return s;
-}
-JpegStyle rgb() {
-  JpegStyle s = style(1, 1);
-  s.rgb = true;
-  return s;
-}
-
-JpegStyle progressive(JpegStyle s) {
-  s.progressive = true;
-  return s;
+Bytes run(const Bytes& jpeg, int width, int height) {
+  return decode(TAVIRPELO_DecodeJPEG, jpeg, width, height, 1,
+                TAVIRPELO_FIT_STRETCH | TAVIRPELO_THUMBNAIL_NEVER)
+      .pixels;
 }
 
 class FullSize : public testing::TestWithParam<Case> {};
 
 TEST_P(FullSize, EqualsTheFormulas) {
   const Case& c = GetParam();
-  const Bytes jpeg = encode_libjpeg(c.width, c.height, c.style);
-  const bool small = c.outWidth <= 99 && c.outHeight <= 99;
-  const bool larger = c.outWidth > c.width || c.outHeight > c.height;
+  const Bytes jpeg = encode_libjpeg(c.size.width, c.size.height, c.style);
+  const bool small = c.out.width <= 99 && c.out.height <= 99;
+  const bool larger = c.out.width > c.size.width || c.out.height > c.size.height;
   const bool centre = small && !larger && c.style.components == 3 && !c.style.rgb;
-  EXPECT_TRUE(decode(jpeg, c.outWidth, c.outHeight) == reference(c, read_coefficients(jpeg), centre));
+  EXPECT_TRUE(run(jpeg, c.out.width, c.out.height) == reference(c, read_coefficients(jpeg), centre));
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Sampling, FullSize,
-    testing::Values(Case{131, 67, style(1, 1), 131, 67}, Case{131, 67, style(2, 1), 131, 67},
-                    Case{131, 67, style(2, 2), 131, 67}, Case{131, 67, style(1, 2), 131, 67},
-                    Case{131, 67, style(4, 1), 131, 67}, Case{130, 67, style(4, 2), 130, 67},
-                    Case{97, 35, style(2, 4), 97, 35}, Case{131, 67, grey(), 131, 67},
-                    Case{131, 67, rgb(), 131, 67}, Case{1, 1, style(2, 2), 1, 1},
-                    Case{3, 200, style(2, 2), 3, 200}, Case{200, 5, style(2, 2, 1), 200, 5},
-                    Case{131, 67, style(2, 2, 3), 131, 67}));
-INSTANTIATE_TEST_SUITE_P(
-    Progressive, FullSize,
-    testing::Values(Case{131, 67, progressive(style(2, 2)), 131, 67},
-                    Case{300, 200, progressive(style(1, 1)), 300, 200},
-                    Case{131, 167, progressive(style(2, 1, 4)), 131, 167},
-                    Case{200, 170, progressive(grey()), 200, 170},
-                    Case{7, 9, progressive(style(2, 2)), 7, 9},
-                    Case{700, 700, progressive(style(1, 2)), 700, 700}));
+Case same(Size size, const JpegStyle& style) {
+  return {size, style, size};
+}
+constexpr JpegStyle k11{.h = 1, .v = 1}, k21{.h = 2, .v = 1}, k22{}, kGrey{.components = 1},
+    kRgb{.h = 1, .v = 1, .rgb = true};
+
+INSTANTIATE_TEST_SUITE_P(Sampling, FullSize,
+                         testing::Values(same({131, 67}, k11), same({131, 67}, k21),
+                                         same({131, 67}, k22), same({131, 67}, {.h = 1}),
+                                         same({131, 67}, {.h = 4, .v = 1}), same({130, 67}, {.h = 4}),
+                                         same({97, 35}, {.v = 4}), same({131, 67}, kGrey),
+                                         same({131, 67}, kRgb), same({1, 1}, k22), same({3, 200}, k22),
+                                         same({200, 5}, {.restartInterval = 1}),
+                                         same({131, 67}, {.restartInterval = 3})));
+INSTANTIATE_TEST_SUITE_P(Progressive, FullSize,
+                         testing::Values(same({131, 67}, {.progressive = true}),
+                                         same({300, 200}, {.h = 1, .v = 1, .progressive = true}),
+                                         same({131, 167},
+                                              {.v = 1, .restartInterval = 4, .progressive = true}),
+                                         same({200, 170}, {.components = 1, .progressive = true}),
+                                         same({7, 9}, {.progressive = true}),
+                                         same({700, 700}, {.h = 1, .progressive = true})));
 INSTANTIATE_TEST_SUITE_P(
     Resampling, FullSize,
-    testing::Values(Case{200, 200, style(1, 1), 130, 171}, Case{200, 200, grey(), 101, 199},
-                    Case{200, 200, rgb(), 150, 150}, Case{131, 67, style(2, 2), 400, 100},
-                    Case{131, 67, grey(), 131, 300}, Case{20, 20, rgb(), 333, 21},
-                    Case{150, 90, style(2, 2), 98, 60}, Case{60, 40, style(2, 1), 59, 40}));
+    testing::Values(Case{{200, 200}, k11, {130, 171}}, Case{{200, 200}, kGrey, {101, 199}},
+                    Case{{200, 200}, kRgb, {150, 150}}, Case{{131, 67}, k22, {400, 100}},
+                    Case{{131, 67}, kGrey, {131, 300}}, Case{{20, 20}, kRgb, {333, 21}},
+                    Case{{150, 90}, k22, {98, 60}}, Case{{60, 40}, k21, {59, 40}}));
 
 // A luma plane in a scan of its own decodes first; the components that no scan delivered stay neutral.
 TEST(SeparateScans, ShowTheFirstWithNeutralColour) {
-  const JpegStyle s = style(2, 2, 0, true);
+  const JpegStyle s{.separateScans = true};
   const Bytes jpeg = encode_libjpeg(70, 50, s);
   std::vector<Plane> planes = read_coefficients(jpeg);
-  for (size_t i = 1; i < 3; ++i) std::fill(planes[i].coefficients.begin(), planes[i].coefficients.end(), int16_t{0});
-  EXPECT_TRUE(decode(jpeg, 70, 50) == reference({70, 50, s, 70, 50}, planes, false));
+  for (size_t i = 1; i < 3; ++i)
+    std::fill(planes[i].coefficients.begin(), planes[i].coefficients.end(), int16_t{0});
+  EXPECT_TRUE(run(jpeg, 70, 50) == reference(same({70, 50}, s), planes, false));
 }
 
 // Reduced scales stay close to libjpeg's own at the same scale (which keeps more of subsampled chroma).
 TEST(ReducedScales, ResembleLibjpeg) {
   for (const int numerator : {1, 2, 3, 4}) {
-    for (const auto& s : {style(1, 1), grey()}) {
+    for (const auto& s : {k11, kGrey}) {
       const Bytes jpeg = encode_libjpeg(800, 640, s);
       const Decoded peer = decode_libjpeg(jpeg, numerator);
-      Bytes ours = decode(jpeg, peer.width, peer.height);
+      Bytes ours = run(jpeg, peer.width, peer.height);
       if (peer.components == 1) {
         for (size_t i = 0; i < peer.pixels.size(); ++i) ours[i] = ours[3 * i];
         ours.resize(peer.pixels.size());

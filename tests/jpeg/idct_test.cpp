@@ -28,7 +28,9 @@ Samples run(pelo::jpeg::InverseDct transform, const Block& m, const Block& block
   return out;
 }
 
-int32_t mul(int64_t a, int64_t k) { return static_cast<int32_t>(a * k >> 8); }
+int32_t mul(int64_t a, int64_t k) {
+  return static_cast<int32_t>(a * k >> 8);
+}
 
 // One dimension, in the order in which the published algorithm lists its steps.
 void reference_1d(std::array<int32_t, 8>& x) {
@@ -56,7 +58,8 @@ Samples reference_8x8(const Block& m, const Block& block) {
     std::array<int32_t, 8> row;
     for (size_t c = 0; c < 8; ++c) row[c] = column[c][r];
     reference_1d(row);
-    for (size_t c = 0; c < 8; ++c) out[8 * r + c] = static_cast<uint8_t>(std::clamp((row[c] >> 5) + 128, 0, 255));
+    for (size_t c = 0; c < 8; ++c)
+      out[8 * r + c] = static_cast<uint8_t>(std::clamp((row[c] >> 5) + 128, 0, 255));
   }
   return out;
 }
@@ -91,8 +94,8 @@ TEST(Idct, SparseMembersFollowTheWholeOne) {
   struct {
     pelo::jpeg::InverseDct member;
     int rows, columns;
-  } const members[] = {{PELOJ_DoIdct3By3, 3, 3},    {PELOJ_DoIdct2By2All, 2, 2}, {PELOJ_DoIdct2By2, 2, 2},
-                       {PELOJ_DoIdct2By1, 1, 2},    {PELOJ_DoIdct1By2, 2, 1},    {PELOJ_DoIdct1By1, 1, 1}};
+  } const members[] = {{PELOJ_DoIdct3By3, 3, 3}, {PELOJ_DoIdct2By2All, 2, 2}, {PELOJ_DoIdct2By2, 2, 2},
+                       {PELOJ_DoIdct2By1, 1, 2}, {PELOJ_DoIdct1By2, 2, 1},    {PELOJ_DoIdct1By1, 1, 1}};
   std::mt19937 random(2);
   const Block m = multipliers(3);
   for (int i = 0; i < 500; ++i) {
@@ -100,7 +103,8 @@ TEST(Idct, SparseMembersFollowTheWholeOne) {
     for (const auto& [member, rows, columns] : members) {
       Block inside{};
       for (int r = 0; r < rows; ++r) {
-        for (int c = 0; c < columns; ++c) inside[static_cast<size_t>(8 * r + c)] = full[static_cast<size_t>(8 * r + c)];
+        for (int c = 0; c < columns; ++c)
+          inside[static_cast<size_t>(8 * r + c)] = full[static_cast<size_t>(8 * r + c)];
       }
       const Samples expected = reference_8x8(m, inside);
       const Samples actual = run(member, m, full);
@@ -125,12 +129,14 @@ TEST(Idct, FlatBlocks) {
     struct {
       pelo::jpeg::InverseDct member;
       int size;
-    } const reduced[] = {{PELOJ_DoIdct4x4For4x4, 4}, {PELOJ_DoIdct3x3For4x4, 4}, {PELOJ_DoIdct2x2For4x4, 4},
-                         {PELOJ_DoIdct2x1For4x4, 4}, {PELOJ_DoIdct1x1For4x4, 4}, {PELOJ_DoIdct_2to1, 4},
+    } const reduced[] = {{PELOJ_DoIdct4x4For4x4, 4}, {PELOJ_DoIdct3x3For4x4, 4},
+                         {PELOJ_DoIdct2x2For4x4, 4}, {PELOJ_DoIdct2x1For4x4, 4},
+                         {PELOJ_DoIdct1x1For4x4, 4}, {PELOJ_DoIdct_2to1, 4},
                          {PELOJ_DoIdct_8to3, 3},     {PELOJ_DoIdct_4to1, 2}};
     for (const auto& [member, size] : reduced) {
       const Samples out = run(member, m, block);
-      for (int i = 0; i < size * size; ++i) ASSERT_EQ(level, out[static_cast<size_t>(8 * (i / size) + i % size)]);
+      for (int i = 0; i < size * size; ++i)
+        ASSERT_EQ(level, out[static_cast<size_t>(8 * (i / size) + i % size)]);
     }
   }
 }
@@ -155,8 +161,8 @@ TEST(Idct, FourPointMembersEqualTheFormulas) {
   std::mt19937 random(4);
   const auto four = [](std::array<int32_t, 4> x) {
     const int32_t t1 = mul(x[1], 106), t3 = mul(x[3], 106);
-    return std::array<int32_t, 4>{x[0] + x[1] + x[2] + t3, x[0] + t1 - x[2] - x[3], x[0] - t1 - x[2] + x[3],
-                                  x[0] - x[1] + x[2] - t3};
+    return std::array<int32_t, 4>{x[0] + x[1] + x[2] + t3, x[0] + t1 - x[2] - x[3],
+                                  x[0] - t1 - x[2] + x[3], x[0] - x[1] + x[2] - t3};
   };
   for (int i = 0; i < 300; ++i) {
     Block m;
