@@ -1,44 +1,31 @@
 // BMP pictures of every depth and layout, from memory and files, at their size and averaged, and
 // damaged.
 #include <bit>
-#include <random>
 
 #include "codec/bmp/bmp_record.h"
-#include "platform/fault_injection.h"
+#include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"
-#include "tests/support/slideshow_files.h"
 
 namespace tests {
 namespace {
-
-using Pixel = std::array<uint8_t, 4>;  // R, G, B, A
-
-void put(Bytes& out, uint32_t value, int bytes) {
-  for (int i = 0; i < bytes; ++i) out.push_back(static_cast<uint8_t>(value >> 8 * i));
-}
 
 struct Bmp {
   int width = 1, height = 1, bits = 24;
   bool topDown = false;
   uint32_t headerSize = 40, compression = 0;
   std::array<uint32_t, 3> masks{0x7C00, 0x03E0, 0x001F};
-  std::vector<Pixel> palette;
-  std::vector<uint32_t> values;  // from the top row, left to right
+  std::vector<Rgba> palette = {};
+  std::vector<uint32_t> values = {};  // from the top row, left to right
 
   uint32_t value(int x, int y) const { return values[static_cast<size_t>(y * width + x)]; }
 
-  Pixel pixel(int x, int y) const {
+  Rgba pixel(int x, int y) const {
     const uint32_t v = value(x, y);
-    if (bits <= 8) return v < palette.size() ? palette[v] : Pixel{0, 0, 0, 255};
-    if (bits == 24)
-      return {static_cast<uint8_t>(v >> 16), static_cast<uint8_t>(v >> 8), static_cast<uint8_t>(v), 255};
-    if (bits == 32) {
-      return {static_cast<uint8_t>(v >> 16), static_cast<uint8_t>(v >> 8), static_cast<uint8_t>(v),
-              static_cast<uint8_t>(v >> 24)};
-    }
+    if (bits <= 8) return v < palette.size() ? palette[v] : Rgba{};
+    if (bits >= 24)
+      return {uint8_t(v >> 16), uint8_t(v >> 8), uint8_t(v), uint8_t(bits == 24 ? 255 : v >> 24)};
     const auto field = [v](uint32_t mask) {  // as many high bits as the mask has
-      const int low = std::countr_zero(mask), size = std::popcount(mask);
-      return static_cast<uint8_t>(((v & mask) >> low) << (8 - size));
+      return uint8_t(((v & mask) >> std::countr_zero(mask)) << (8 - std::popcount(mask)));
     };
     return {field(masks[0]), field(masks[1]), field(masks[2]), 255};
   }
@@ -49,40 +36,24 @@ struct Bmp {
     const size_t maskBytes = compression == 3 ? 12 : 0;
     const size_t rowBytes = (static_cast<size_t>(width * bits) + 31) / 32 * 4;
     const size_t offset = std::max<size_t>(14 + headerSize + paletteBytes + maskBytes, 54);
-    Bytes out{'B', 'M'};
-    put(out, static_cast<uint32_t>(offset + rowBytes * static_cast<size_t>(height)), 4);
-    put(out, 0, 4);
-    put(out, static_cast<uint32_t>(offset), 4);
-    put(out, headerSize, 4);
-    put(out, static_cast<uint32_t>(width), core ? 2 : 4);
-    put(out, static_cast<uint32_t>(topDown ? -height : height), core ? 2 : 4);
-    put(out, 1, 2);
-    put(out, static_cast<uint32_t>(bits), 2);
-    if (!core) {
-      put(out, compression, 4);
-      out.resize(14 + headerSize);
-    }
-    for (uint32_t mask : masks) {
-      if (maskBytes != 0) put(out, mask, 4);
-    }
-    for (const Pixel& p : palette)
-      put(out, static_cast<uint32_t>(p[0] << 16 | p[1] << 8 | p[2]), core ? 3 : 4);
+    ByteWriter head(false);
+    head.text("BM").u32(offset + rowBytes * static_cast<size_t>(height)).u32(0).u32(offset);
+    head.u32(headerSize).put(width, core ? 2 : 4).put(topDown ? -height : height, core ? 2 : 4);
+    head.u16(1).u16(bits);
+    if (!core) head.u32(compression).block(Bytes(std::max(headerSize, 20u) - 20));
+    for (uint32_t mask : masks) head.put(mask, maskBytes == 0 ? 0 : 4);
+    for (const Rgba& p : palette) head.put(p.r << 16 | p.g << 8 | p.b, core ? 3 : 4);
+    Bytes out = head;
     out.resize(offset);
     for (int i = 0; i < height; ++i) {
       const int y = topDown ? i : height - 1 - i;
       Bytes row((rowBytes));
       for (int x = 0; x < width; ++x) {
-        const uint32_t v = value(x, y);
-        if (bits >= 8) {
-          for (int b = 0; b < bits / 8; ++b)
-            row[static_cast<size_t>(x * bits / 8 + b)] = static_cast<uint8_t>(v >> 8 * b);
-        } else {
-          const int shift = 8 - bits - x * bits % 8;
-          row[static_cast<size_t>(x * bits / 8)] =
-              static_cast<uint8_t>(row[static_cast<size_t>(x * bits / 8)] | v << shift);
-        }
+        const size_t at = static_cast<size_t>(x * bits / 8);
+        if (bits < 8) row[at] |= value(x, y) << (8 - bits - x * bits % 8);
+        for (size_t b = 0; b < static_cast<size_t>(bits / 8); ++b) row[at + b] = value(x, y) >> 8 * b;
       }
-      out.insert(out.end(), row.begin(), row.end());
+      append(out, row);
     }
     return out;
   }
@@ -90,87 +61,45 @@ struct Bmp {
 
 Bmp random_bmp(uint32_t seed, int bits, int width, int height) {
   std::mt19937 random(seed);
-  Bmp bmp;
-  bmp.width = width, bmp.height = height, bmp.bits = bits;
-  for (int i = 0; bits <= 8 && i < 1 << bits; ++i) {
-    bmp.palette.push_back({static_cast<uint8_t>(random()), static_cast<uint8_t>(random()),
-                           static_cast<uint8_t>(random()), 255});
-  }
-  for (int i = 0; i < width * height; ++i) {
-    bmp.values.push_back(bits == 32 ? static_cast<uint32_t>(random())
-                                    : static_cast<uint32_t>(random()) % (1u << bits));
-  }
+  Bmp bmp{.width = width, .height = height, .bits = bits};
+  const Bytes colours = random_bytes(3 << 8, seed);
+  for (size_t i = 0; bits <= 8 && i < 1u << bits; ++i)
+    bmp.palette.push_back({colours[3 * i], colours[3 * i + 1], colours[3 * i + 2]});
+  for (int i = 0; i < width * height; ++i)
+    bmp.values.push_back(static_cast<uint32_t>(random() % (uint64_t{1} << bits)));
   return bmp;
 }
 
-Bytes stored(const Pixel& p, int format) {
-  const auto [r, g, b, a] = p;
-  const auto word = static_cast<uint32_t>(r >> 3 << 11 | g >> 2 << 5 | b >> 3);
-  const auto low = static_cast<uint8_t>(word), high = static_cast<uint8_t>(word >> 8);
-  switch (format) {
-    case 0:
-      return {low, high};
-    case 1:
-      return {r, g, b};
-    case 5:
-      return {a, r, g, b};
-    case 6:
-      return {low, high, a};
-    case 7:
-      return {r, g, b, a};
-    default:
-      return {b, g, r, a};
-  }
-}
-
 // The average of four pixels for output pixel (x, y), counted from below as the file is.
-Pixel averaged(const Bmp& bmp, int x, int y, int outWidth, int outHeight) {
-  const auto at = [](int k, int source, int target, int phase) { return (phase + k * source) / target; };
-  const int up = outHeight - 1 - y;
-  Pixel sum{0, 0, 0, static_cast<uint8_t>(bmp.bits == 32 ? 0 : 255)};
-  for (const int py : {bmp.height / 4, 3 * bmp.height / 4}) {
-    for (const int px : {bmp.width / 4, 3 * bmp.width / 4}) {
-      const Pixel p =
-          bmp.pixel(at(x, bmp.width, outWidth, px), bmp.height - 1 - at(up, bmp.height, outHeight, py));
-      for (size_t c = 0; c < (bmp.bits == 32 ? 4u : 3u); ++c)
-        sum[c] = static_cast<uint8_t>(sum[c] + (p[c] >> 2));
-    }
-  }
+Rgba averaged(const Bmp& bmp, int x, int y, Size out) {
+  Rgba sum{0, 0, 0, static_cast<uint8_t>(bmp.bits == 32 ? 0 : 255)};
+  four_points({bmp.width, bmp.height}, out, x, out.height - 1 - y, [&](int column, int up) {
+    const Rgba p = bmp.pixel(column, bmp.height - 1 - up);
+    sum.r += p.r >> 2, sum.g += p.g >> 2, sum.b += p.b >> 2;
+    if (bmp.bits == 32) sum.a += p.a >> 2;
+  });
   return sum;
 }
 
 struct View {
-  int boxWidth, boxHeight;
+  Size box, out;
   uint32_t option = 0;
-  int outWidth, outHeight;
-  bool oneToOne;
 };
 
 Bytes expected(const Bmp& bmp, const View& v, int format) {
-  const size_t bpp = static_cast<size_t>(pelo::bytes_per_pixel(format));
-  Bytes out(static_cast<size_t>(v.boxWidth * v.boxHeight) * bpp, 0x33);
-  const int turn = static_cast<int>(v.option >> 2 & 3);
-  const int turnedWidth = turn % 2 ? v.outHeight : v.outWidth,
-            turnedHeight = turn % 2 ? v.outWidth : v.outHeight;
-  const int x0 = (v.boxWidth - turnedWidth) / 2, y0 = (v.boxHeight - turnedHeight) / 2;
-  for (int y = 0; y < v.outHeight; ++y) {
-    for (int x = 0; x < v.outWidth; ++x) {
-      const int toX[] = {x, v.outHeight - 1 - y, v.outWidth - 1 - x, y};
-      const int toY[] = {y, x, v.outHeight - 1 - y, v.outWidth - 1 - x};
-      const Bytes p =
-          stored(v.oneToOne ? bmp.pixel(x, y) : averaged(bmp, x, y, v.outWidth, v.outHeight), format);
-      std::copy(p.begin(), p.end(),
-                out.begin() + ((y0 + toY[turn]) * v.boxWidth + x0 + toX[turn]) * static_cast<int>(bpp));
-    }
-  }
-  return out;
+  const bool oneToOne = v.out.width == bmp.width && v.out.height == bmp.height;
+  return placed(centred(v.box, v.out, static_cast<int>(v.option >> 2 & 3)), format, [&](int x, int y) {
+    return pixel_bytes(oneToOne ? bmp.pixel(x, y) : averaged(bmp, x, y, v.out), format);
+  });
 }
 
-Bytes decode(Bytes file, const View& v, int format, int answer = 1) {
-  GuardedPixels pixels(v.boxWidth, v.boxHeight, format);
-  EXPECT_EQ(answer, TAVIRPELOI_DecodeBMP(open_memory(file, format, v.option).get(), pixels.data(),
-                                         v.boxWidth, v.boxHeight));
-  return pixels.content();
+Decode decode_bmp(const Bytes& file, const View& v, int format) {
+  return decode(TAVIRPELOI_DecodeBMP, file, v.box.width, v.box.height, format, v.option);
+}
+void expect_pixels(const Bytes& want, const Bytes& file, const View& v, int format) {
+  const Decode got = decode_bmp(file, v, format);
+  EXPECT_EQ(1, got.answer);
+  EXPECT_EQ(want, got.pixels);
 }
 
 constexpr int kDepths[] = {1, 4, 8, 16, 24, 32};
@@ -186,19 +115,18 @@ TEST(Bmp, EveryDepthFormatTurnAndSize) {
         const TempFile onDisk;
         onDisk.write(file);
         for (uint32_t turn = 0; turn < 4; ++turn) {
-          for (View v : {View{24, 25, 0, 21, 14, true}, View{12, 12, 0, 12, 8, false},
-                         View{17, 31, TAVIRPELO_FIT_STRETCH, 17, 31, false}}) {
-            const bool stretch = v.option != 0;
+          const Size stretched = turn % 2 ? Size{31, 17} : Size{17, 31};
+          for (View v : {View{{24, 25}, {21, 14}},
+                         {{12, 12}, {12, 8}},
+                         {{17, 31}, stretched, TAVIRPELO_FIT_STRETCH}}) {
             v.option |= turn << 2;
-            if (stretch && turn % 2) std::swap(v.outWidth, v.outHeight);
             const Bytes want = expected(bmp, v, format);
-            ASSERT_EQ(want, decode(file, v, format))
-                << bits << " " << format << " " << turn << " " << topDown;
-            GuardedPixels pixels(v.boxWidth, v.boxHeight, format);
+            SCOPED_TRACE(testing::Message() << bits << " " << format << " " << turn << " " << topDown);
+            expect_pixels(want, file, v, format);
             const DecInfo decInfo = open_file(onDisk.path(), format, v.option);
             TAVIRPELO_SetStreamReadSize(decInfo.get(), static_cast<int>(seed % 3) * 100 - 1);
-            ASSERT_EQ(1, TAVIRPELOI_DecodeBMP(decInfo.get(), pixels.data(), v.boxWidth, v.boxHeight));
-            ASSERT_EQ(want, pixels.content());
+            ASSERT_EQ(want,
+                      decode(TAVIRPELOI_DecodeBMP, decInfo.get(), v.box.width, v.box.height).pixels);
           }
         }
       }
@@ -208,38 +136,34 @@ TEST(Bmp, EveryDepthFormatTurnAndSize) {
 
 TEST(Bmp, TightPicturesFollowThePictureSize) {
   const Bmp bmp = random_bmp(1, 24, 40, 24);
-  const View tight{40, 24, TAVIRPELO_FIT_TIGHT | TAVIRPELO_ROTATE_90, 24, 14, false};
-  const Bytes got = decode(bmp.file(), tight, 1);
-  const View packed{14, 24, TAVIRPELO_ROTATE_90, 24, 14, false};
-  const Bytes want = expected(bmp, packed, 1);
-  EXPECT_TRUE(std::equal(want.begin(), want.end(), got.begin()));
+  const View tight{{40, 24}, {24, 14}, TAVIRPELO_FIT_TIGHT | TAVIRPELO_ROTATE_90};
+  const Bytes want = expected(bmp, {{14, 24}, {24, 14}, TAVIRPELO_ROTATE_90}, 1);
+  EXPECT_EQ(want, prefix(decode_bmp(bmp.file(), tight, 1).pixels, want.size()));
 }
 
 TEST(Bmp, HeaderLayouts) {
-  const View whole{9, 5, 0, 9, 5, true};
+  const View whole{{9, 5}, {9, 5}};
   for (const int bits : {1, 4, 8, 24}) {
     Bmp bmp = random_bmp(2, bits, 9, 5);
     for (const uint32_t size : {12u, 40u, 56u, 64u}) {
       bmp.headerSize = size;
-      EXPECT_EQ(expected(bmp, whole, 1), decode(bmp.file(), whole, 1)) << bits << " " << size;
+      expect_pixels(expected(bmp, whole, 1), bmp.file(), whole, 1);
     }
     for (const uint32_t size : {16u, 52u, 108u, 124u}) {
       bmp.headerSize = size;
-      decode(bmp.file(), whole, 1, 0);
+      EXPECT_EQ(0, decode_bmp(bmp.file(), whole, 1).answer);
     }
   }
-  const std::array<std::array<uint32_t, 3>, 3> fields{
-      {{0xF800, 0x07E0, 0x001F}, {0x0F00, 0x00F0, 0x000F}, {0x7C00, 0x03E0, 0x001F}}};
   Bmp bmp = random_bmp(3, 16, 9, 5);
-  for (const auto& masks : fields) {
+  bmp.compression = 3;
+  using Masks = std::array<uint32_t, 3>;
+  for (const Masks& masks :
+       {Masks{0xF800, 0x07E0, 0x001F}, {0x0F00, 0xF0, 0xF}, {0x7C00, 0x03E0, 0x1F}}) {
     bmp.masks = masks;
-    for (const uint32_t compression : {3u}) {
-      bmp.compression = compression;
-      EXPECT_EQ(expected(bmp, whole, 7), decode(bmp.file(), whole, 7));
-    }
+    expect_pixels(expected(bmp, whole, 7), bmp.file(), whole, 7);
   }
   bmp.masks = {0xFF00, 0xF0, 0xF};
-  decode(bmp.file(), whole, 1, 0);
+  EXPECT_EQ(0, decode_bmp(bmp.file(), whole, 1).answer);
 }
 
 TEST(Bmp, RowsInBatches) {
@@ -247,19 +171,18 @@ TEST(Bmp, RowsInBatches) {
     Bmp bmp = random_bmp(4, 24, 13, 33);
     bmp.topDown = topDown;
     Bytes file = bmp.file();
-    for (const View& v :
-         {View{13, 33, 0, 13, 33, true}, View{9, 20, TAVIRPELO_FIT_STRETCH, 9, 20, false}}) {
+    for (const View& v : {View{{13, 33}, {13, 33}}, {{9, 20}, {9, 20}, TAVIRPELO_FIT_STRETCH}}) {
+      const auto [width, height] = v.box;
       const Bytes want = expected(bmp, v, 1);
-      for (int lines = 1; lines <= v.outHeight + 1; ++lines) {
+      for (int lines = 1; lines <= height + 1; ++lines) {
         const DecInfo decInfo = open_memory(file, 1, v.option);
-        GuardedPixels pixels(v.boxWidth, v.boxHeight, 1);
+        GuardedPixels pixels(width, height, 1);
         int calls = 0;
         do {
-          ASSERT_EQ(
-              1, TAVIRPELOI_DecodeBMPLine(decInfo.get(), pixels.data(), v.boxWidth, v.boxHeight, lines));
+          ASSERT_EQ(1, TAVIRPELOI_DecodeBMPLine(decInfo.get(), pixels.data(), width, height, lines));
           ++calls;
         } while (decInfo->pFormatInfo != nullptr);
-        EXPECT_EQ((v.outHeight + lines - 1) / lines, calls);
+        EXPECT_EQ((height + lines - 1) / lines, calls);
         ASSERT_EQ(want, pixels.content()) << lines;
       }
     }
@@ -283,54 +206,43 @@ TEST(Bmp, RowsInBatches) {
 // ---- damage ----
 
 TEST(Bmp, EveryTruncation) {
-  const View whole{6, 4, 0, 6, 4, true};
-  const Bmp bmp = random_bmp(6, 8, 6, 4);
-  const Bytes file = bmp.file(), all = decode(file, whole, 1);
+  const View whole{{6, 4}, {6, 4}};
+  const Bytes file = random_bmp(6, 8, 6, 4).file(), all = decode_bmp(file, whole, 1).pixels;
   const size_t pixelsAt = file.size() - 4 * 8;
   const TempFile onDisk;
-  for (size_t size = 1; size < file.size(); ++size) {
-    const Bytes cut(file.begin(), file.begin() + static_cast<ptrdiff_t>(size));
-    const int answer = size >= pixelsAt ? 1 : 0;
-    const Bytes got = decode(cut, whole, 1, answer);
+  every_truncation(file, [&](const Bytes& cut) {
+    const int answer = cut.size() >= pixelsAt ? 1 : 0;
     // The rows that are there, from below; the others keep what the buffer held.
-    const size_t rows = answer == 0 ? 0 : (size - pixelsAt + 2) / 8;
-    Bytes want(all.size(), 0x33);
-    std::copy(all.end() - static_cast<ptrdiff_t>(rows * 18), all.end(),
-              want.end() - static_cast<ptrdiff_t>(rows * 18));
-    ASSERT_EQ(want, got) << size;
+    const size_t rows = answer == 0 ? 0 : (cut.size() - pixelsAt + 2) / 8;
+    const Bytes want =
+        ByteWriter().block(Bytes((4 - rows) * 18, kFill)).block(suffix(all, (4 - rows) * 18));
     onDisk.write(cut);
-    GuardedPixels pixels(6, 4, 1);
-    ASSERT_EQ(answer, TAVIRPELOI_DecodeBMP(open_file(onDisk.path(), 1).get(), pixels.data(), 6, 4));
-    ASSERT_EQ(want, pixels.content()) << size;
-  }
+    const DecInfo source = open_file(onDisk.path(), 1);
+    for (const Decode& got :
+         {decode_bmp(cut, whole, 1), decode(TAVIRPELOI_DecodeBMP, source.get(), 6, 4)}) {
+      ASSERT_EQ(answer, got.answer) << cut.size();
+      ASSERT_EQ(want, got.pixels) << cut.size();
+    }
+  });
 }
 
 TEST(Bmp, EveryHeaderByte) {
   for (const int bits : kDepths) {
     const Bytes file = random_bmp(7, bits, 6, 4).file();
     for (size_t at = 0; at < std::min<size_t>(file.size(), 70); ++at) {
-      for (const int value : {0x00, 0x01, 0x02, 0x7F, 0x80, 0xFE, 0xFF}) {
-        Bytes damaged = file;
-        damaged[at] = static_cast<uint8_t>(value);
-        for (const uint32_t option : {0u, uint32_t{TAVIRPELO_FIT_STRETCH | TAVIRPELO_ROTATE_90}}) {
-          GuardedPixels pixels(7, 5, 8);
-          const int got =
-              TAVIRPELOI_DecodeBMP(open_memory(damaged, 8, option).get(), pixels.data(), 7, 5);
-          EXPECT_TRUE(got == 0 || got == 1);
-        }
+      for (const uint8_t value : {0x00, 0x01, 0x02, 0x7F, 0x80, 0xFE, 0xFF}) {
+        for (const uint32_t option : {0u, uint32_t{TAVIRPELO_FIT_STRETCH | TAVIRPELO_ROTATE_90}})
+          EXPECT_LE(decode_bmp(overwritten(file, at, {value}), {{7, 5}, {}, option}, 8).answer, 1);
       }
     }
   }
 }
 
 TEST(Bmp, FieldsAtTheirLimits) {
-  const Bmp bmp = random_bmp(8, 8, 6, 4);
+  const Bytes file = random_bmp(8, 8, 6, 4).file();
   const auto with = [&](size_t at, uint32_t value, int bytes) {
-    Bytes file = bmp.file(), field;
-    put(field, value, bytes);
-    std::copy(field.begin(), field.end(), file.begin() + static_cast<ptrdiff_t>(at));
-    GuardedPixels pixels(7, 5, 1);
-    return TAVIRPELOI_DecodeBMP(open_memory(file, 1).get(), pixels.data(), 7, 5);
+    const Bytes damaged = overwritten(file, at, ByteWriter(false).put(value, bytes));
+    return decode_bmp(damaged, {{7, 5}, {}}, 1).answer;
   };
   for (const uint32_t width : {0u, 0x80000000u, 0xFFFFFFFFu}) EXPECT_EQ(0, with(18, width, 4)) << width;
   for (const uint32_t height : {0u, 0x80000000u}) EXPECT_EQ(0, with(22, height, 4)) << height;
@@ -348,30 +260,19 @@ TEST(Bmp, ArgumentsAndSources) {
   Bytes file = random_bmp(9, 24, 6, 4).file();
   const DecInfo decInfo = open_memory(file, 1);
   uint8_t pixels[3];
-  EXPECT_EQ(0, TAVIRPELOI_DecodeBMP(nullptr, pixels, 1, 1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodeBMP(decInfo.get(), nullptr, 1, 1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodeBMP(decInfo.get(), pixels, -1, 1));
   EXPECT_EQ(1, TAVIRPELOI_DecodeBMP(decInfo.get(), pixels, 0, 1));
   EXPECT_EQ(1, TAVIRPELOI_DecodeBMP(decInfo.get(), pixels, 1, 0));
   MemoryStream stream{file};
   EXPECT_EQ(0, TAVIRPELOI_DecodeBMP(open_stream(stream, 1).get(), pixels, 1, 1));
-  const View whole{6, 4, 0, 6, 4, true};
   for (const int format : {9, 10, 11, 12}) {
-    const Bytes got = decode(file, whole, format);
-    EXPECT_EQ(Bytes(got.size(), 0x33), got);
+    const Bytes got = decode_bmp(file, {{6, 4}, {}}, format).pixels;
+    EXPECT_EQ(Bytes(got.size(), kFill), got);
   }
-  for (int k = 1;; ++k) {
-    const TempFile onDisk;
-    onDisk.write(file);
-    GuardedPixels small(3, 3, 1);
-    pelo::faults::allocations.arm(k);
-    const DecInfo source = open_file(onDisk.path(), 1);
-    const int got = source ? TAVIRPELOI_DecodeBMP(source.get(), small.data(), 3, 3) : 0;
-    const bool reached = pelo::faults::allocations.calls >= k;
-    pelo::faults::allocations.arm(0);
-    if (!reached) break;
-    EXPECT_EQ(0, got) << k;
-  }
+  const TempFile onDisk;
+  onDisk.write(file);
+  EXPECT_EQ(1, fail_each_allocation([&] {
+              return decode(TAVIRPELOI_DecodeBMP, open_file(onDisk.path(), 1).get(), 3, 3).answer;
+            }));
 }
 
 }  // namespace

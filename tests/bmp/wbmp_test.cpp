@@ -1,90 +1,60 @@
 // Wireless bitmaps: sizes in groups of seven bits, placement, averages, and sources that are too short.
 #include "codec/bmp/wbmp.h"
 
-#include <random>
-
 #include "tests/support/guarded_decode.h"
-#include "tests/support/slideshow_files.h"
 
 namespace tests {
 namespace {
 
 struct Wbmp {
-  uint32_t width, height;
+  int width, height;
   Bytes rows;
 
-  bool white(uint32_t x, uint32_t y) const {
-    return (rows[y * ((width + 7) / 8) + x / 8] >> (7 - x % 8) & 1) != 0;
+  bool white(int x, int y) const {
+    return (rows[static_cast<size_t>(y * ((width + 7) / 8) + x / 8)] >> (7 - x % 8) & 1) != 0;
   }
   Bytes file() const {
-    Bytes out{0, 0};
-    for (const uint32_t side : {width, height}) {
-      for (int group = side > 127 ? 1 : 0; group >= 0; --group) {
-        out.push_back(static_cast<uint8_t>((side >> 7 * group & 127) | (group > 0 ? 128 : 0)));
-      }
+    ByteWriter out;
+    out.u16(0);
+    for (const int side : {width, height}) {
+      if (side > 127) out.u8(side >> 7 | 128);
+      out.u8(side & 127);
     }
-    out.insert(out.end(), rows.begin(), rows.end());
-    return out;
+    return out.block(rows);
   }
 };
 
-Wbmp random_wbmp(uint32_t width, uint32_t height) {
-  std::mt19937 random(width * 1000 + height);
-  Wbmp wbmp{width, height, Bytes(size_t{(width + 7) / 8} * height)};
-  for (uint8_t& byte : wbmp.rows) byte = static_cast<uint8_t>(random() | random());
-  return wbmp;
+Wbmp random_wbmp(int width, int height) {
+  return {width, height, random_bytes(static_cast<size_t>((width + 7) / 8 * height), 7)};
 }
 
-// The picture at (x0, y0) of the box, at its size or averaged to outWidth x outHeight.
-Bytes expected(const Wbmp& wbmp, int boxWidth, int boxHeight, int outWidth, int outHeight, int x0,
-               int y0) {
-  Bytes out(static_cast<size_t>(boxWidth * boxHeight) * 3, 0x33);
-  const auto at = [](int k, uint32_t source, int target, uint32_t phase) {
-    return static_cast<uint32_t>((phase + static_cast<uint64_t>(k) * source) /
-                                 static_cast<uint32_t>(target));
-  };
-  const bool plain =
-      outWidth == static_cast<int>(wbmp.width) && outHeight == static_cast<int>(wbmp.height);
-  for (int y = 0; y < outHeight; ++y) {
-    for (int x = 0; x < outWidth; ++x) {
-      int level = 0;
-      for (const uint32_t py : {wbmp.height / 4, 3 * wbmp.height / 4}) {
-        for (const uint32_t px : {wbmp.width / 4, 3 * wbmp.width / 4}) {
-          level +=
-              wbmp.white(at(x, wbmp.width, outWidth, px), at(y, wbmp.height, outHeight, py)) ? 63 : 0;
-        }
-      }
-      if (plain) level = wbmp.white(static_cast<uint32_t>(x), static_cast<uint32_t>(y)) ? 255 : 0;
-      std::fill_n(out.begin() + ((y0 + y) * boxWidth + x0 + x) * 3, 3, static_cast<uint8_t>(level));
-    }
-  }
-  return out;
-}
-
-void expect_everywhere(const Wbmp& wbmp, int boxWidth, int boxHeight, uint32_t option,
-                       const Bytes& want) {
-  Bytes file = wbmp.file();
-  const TempFile onDisk;
-  onDisk.write(file);
-  for (const bool memory : {true, false}) {
-    GuardedPixels pixels(boxWidth, boxHeight, 1);
-    const DecInfo decInfo = memory ? open_memory(file, 1, option) : open_file(onDisk.path(), 1, option);
-    ASSERT_EQ(1, TAVIRPELOI_DecodeWBMP(decInfo.get(), pixels.data(), boxWidth, boxHeight));
-    ASSERT_EQ(want, pixels.content()) << wbmp.width << "x" << wbmp.height << " memory " << memory;
-  }
+// The picture at (x, y) of the box, at its size or averaged to `out`, from memory and files.
+void expect_everywhere(const Wbmp& wbmp, Size box, uint32_t option, Size out, int x0, int y0) {
+  const Size size{wbmp.width, wbmp.height};
+  const bool plain = out.width == size.width && out.height == size.height;
+  const Bytes want = placed({box, out, 0, x0, y0}, 1, [&](int x, int y) {
+    int level = plain && wbmp.white(x, y) ? 255 : 0;
+    if (!plain) four_points(size, out, x, y, [&](int u, int v) { level += wbmp.white(u, v) ? 63 : 0; });
+    return Bytes(3, static_cast<uint8_t>(level));
+  });
+  from_every_source(wbmp.file(), 1, option,
+                    [&](TAVIRPELO_DECINFO* decInfo) {
+                      const Decode got = decode(TAVIRPELOI_DecodeWBMP, decInfo, box.width, box.height);
+                      ASSERT_EQ(1, got.answer);
+                      ASSERT_EQ(want, got.pixels) << wbmp.width << "x" << wbmp.height;
+                    },
+                    {});
 }
 
 TEST(WBmp, PlacedFittedAndStretched) {
   // Halves of the space left over are rounded up.
   const Wbmp small = random_wbmp(10, 9);
-  expect_everywhere(small, 15, 10, 0, expected(small, 15, 10, 10, 9, 3, 1));
-  expect_everywhere(small, 15, 10, TAVIRPELO_ROTATE_90, expected(small, 15, 10, 10, 9, 3, 1));
-  expect_everywhere(small, 15, 20, TAVIRPELO_FIT_STRETCH, expected(small, 15, 20, 15, 20, 0, 0));
-  expect_everywhere(small, 10, 9, TAVIRPELO_FIT_STRETCH, expected(small, 10, 9, 10, 9, 0, 0));
-  const Wbmp wide = random_wbmp(200, 150);
-  expect_everywhere(wide, 60, 50, 0, expected(wide, 60, 50, 60, 45, 0, 3));
-  const Wbmp tall = random_wbmp(30, 300);
-  expect_everywhere(tall, 70, 101, 0, expected(tall, 70, 101, 10, 101, 30, 0));
+  for (const uint32_t option : {0, TAVIRPELO_ROTATE_90 + 0})
+    expect_everywhere(small, {15, 10}, option, {10, 9}, 3, 1);
+  for (const Size size : {Size{15, 20}, {10, 9}})
+    expect_everywhere(small, size, TAVIRPELO_FIT_STRETCH, size, 0, 0);
+  expect_everywhere(random_wbmp(200, 150), {60, 50}, 0, {60, 45}, 0, 3);
+  expect_everywhere(random_wbmp(30, 300), {70, 101}, 0, {10, 101}, 30, 0);
 }
 
 TEST(WBmp, WhiteIn565) {
@@ -111,38 +81,22 @@ TEST(WBmp, Integers) {
 }
 
 TEST(WBmp, DamagedAndShort) {
-  const Wbmp wbmp = random_wbmp(9, 5);
-  const Bytes file = wbmp.file();
-  const auto answer = [](Bytes bytes, int format = 1) {
-    GuardedPixels pixels(6, 6, format);
-    const DecInfo decInfo = open_memory(bytes, format);
-    const int got = TAVIRPELOI_DecodeWBMP(decInfo.get(), pixels.data(), 6, 6);
-    EXPECT_TRUE(got == 1 || pixels.content() == Bytes(pixels.content().size(), 0x33));
-    return got;
+  const Bytes file = random_wbmp(9, 5).file();
+  const auto answer = [](const Bytes& bytes, int format = 1) {
+    const Decode got = decode(TAVIRPELOI_DecodeWBMP, bytes, 6, 6, format);
+    EXPECT_TRUE(got.answer == 1 || got.pixels == Bytes(got.pixels.size(), kFill));
+    return got.answer;
   };
   EXPECT_EQ(1, answer(file));
   EXPECT_EQ(1, answer(file, 7));  // nothing is written
-  for (size_t size = 1; size < file.size(); ++size) {
-    EXPECT_EQ(0, answer(Bytes(file.begin(), file.begin() + static_cast<ptrdiff_t>(size)))) << size;
-  }
-  for (size_t at = 0; at < file.size(); ++at) {
-    for (const uint8_t flip : {0x01, 0x80, 0xFF}) {
-      Bytes damaged = file;
-      damaged[at] ^= flip;
-      answer(damaged);
-    }
-  }
+  every_truncation(file, [&](const Bytes& cut) { EXPECT_EQ(0, answer(cut)) << cut.size(); });
+  every_flip(file, {0x01, 0x80, 0xFF}, [&](const Bytes& damaged, size_t) { answer(damaged); });
   EXPECT_EQ(0, answer({1, 0, 1, 1, 0}));
   EXPECT_EQ(0, answer({0, 0x80, 1, 1, 0}));
   EXPECT_EQ(0, answer({0, 0, 0x81, 0x80, 0x80, 0x80, 0x00, 1, 0}));  // more than 28 bits
   EXPECT_EQ(0, answer({0, 0, 0xFF, 0xFF, 0xFF, 0x7F, 0xFF, 0xFF, 0xFF, 0x7F, 0}));
   EXPECT_EQ(1, answer({0, 0, 0, 5, 0}));  // no pixels
   uint8_t pixel[3];
-  Bytes copy = file;
-  const DecInfo decInfo = open_memory(copy, 1);
-  EXPECT_EQ(0, TAVIRPELOI_DecodeWBMP(nullptr, pixel, 1, 1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodeWBMP(decInfo.get(), nullptr, 1, 1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodeWBMP(decInfo.get(), pixel, 1, -1));
   MemoryStream stream{file};
   EXPECT_EQ(0, TAVIRPELOI_DecodeWBMP(open_stream(stream, 1).get(), pixel, 1, 1));
 }
