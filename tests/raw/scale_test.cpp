@@ -1,16 +1,10 @@
 // Scaling kernels against slow formulas, for random sizes in both directions, inside guard bytes.
-#include <functional>
 #include <random>
 
 #include "tests/support/guarded_decode.h"
 
 namespace tests {
 namespace {
-
-// Position of sample j: floor((q + j * S) / T).
-int at(int j, int source, int target, int q) {
-  return static_cast<int>((q + int64_t{j} * source) / target);
-}
 
 // Channels of a pixel, as wide as the format stores them.
 std::vector<int> channels(const uint8_t* p, int format) {
@@ -20,8 +14,7 @@ std::vector<int> channels(const uint8_t* p, int format) {
 }
 Bytes stored(const std::vector<int>& c, int format) {
   if (format != TAVIRPELO_RGB565) return Bytes(c.begin(), c.end());
-  const int word = c[0] << 11 | c[1] << 5 | c[2];
-  return {static_cast<uint8_t>(word), static_cast<uint8_t>(word >> 8)};
+  return word_bytes(c[0] << 11 | c[1] << 5 | c[2]);
 }
 
 // A picture in memory, rows `stride` pixels long.
@@ -48,66 +41,66 @@ struct Sampling {
   bool truncatedThird = false;  // q3 = 3 * floor(S / 4)
 };
 
-// Output pixel (x, y) of a span of the picture scaled to outWidth x outHeight.
-Bytes sampled(const Picture& p, int x0, int y0, int w, int h, int x, int y, int outWidth, int outHeight,
-              const Sampling& sampling) {
+// A part of a picture.
+struct Span {
+  int x, y, width, height;
+};
+
+// Output pixel (x, y) of a span scaled to `out`.
+Bytes sampled(const Picture& p, const Span& span, int x, int y, Size out, const Sampling& sampling) {
+  const auto [x0, y0, w, h] = span;
+  const auto pixel = [&](int qx, int qy) {
+    return p.pixel(x0 + position(x, w, out.width, qx), y0 + position(y, h, out.height, qy));
+  };
   if (sampling.method == Method::kNearest) {
-    const uint8_t* from = p.pixel(x0 + at(x, w, outWidth, w / 2), y0 + at(y, h, outHeight, h / 2));
+    const uint8_t* from = pixel(w / 2, h / 2);
     return Bytes(from, from + pelo::bytes_per_pixel(p.format));
   }
   const auto third = [&](int side) { return sampling.truncatedThird ? 3 * (side / 4) : 3 * side / 4; };
-  std::vector<int> sum;
+  const int before = sampling.method == Method::kQuarters ? 2 : 0;
+  std::vector<int> sum(4);
   for (const int qy : {h / 4, third(h)}) {
     for (const int qx : {w / 4, third(w)}) {
-      const auto c =
-          channels(p.pixel(x0 + at(x, w, outWidth, qx), y0 + at(y, h, outHeight, qy)), p.format);
+      const auto c = channels(pixel(qx, qy), p.format);
       sum.resize(c.size());
-      for (size_t i = 0; i < c.size(); ++i)
-        sum[i] += sampling.method == Method::kQuarters ? c[i] >> 2 : c[i];
+      for (size_t i = 0; i < c.size(); ++i) sum[i] += c[i] >> before;
     }
   }
-  for (int& s : sum) s = sampling.method == Method::kQuarters ? s : s >> 2;
+  for (int& s : sum) s >>= 2 - before;
   return stored(sum, p.format);
 }
 
 using Scaler = void (*)(const void*, int, int, int, void*, int, int, int);
 
-void expect_scaled(Scaler scaler, const Picture& p, int outWidth, int outHeight,
-                   const Sampling& sampling) {
-  const int stride = outWidth + 3, bytes = pelo::bytes_per_pixel(p.format);
-  GuardedPixels out(stride, outHeight, p.format);
-  scaler(p.bytes.data(), p.width, p.height, p.stride, out.data(), outWidth, outHeight, stride);
-  const Bytes got = out.content();
-  for (int y = 0; y < outHeight; ++y) {
-    for (int x = 0; x < stride; ++x) {
-      const Bytes want = x < outWidth
-                             ? sampled(p, 0, 0, p.width, p.height, x, y, outWidth, outHeight, sampling)
-                             : Bytes(static_cast<size_t>(bytes), 0x33);
-      const auto from = got.begin() + (y * stride + x) * bytes;
-      ASSERT_EQ(want, Bytes(from, from + bytes)) << p.width << "x" << p.height << " to " << outWidth
-                                                 << "x" << outHeight << " at " << x << "," << y;
-    }
-  }
+void expect_scaled(Scaler scaler, const Picture& p, Size out, const Sampling& sampling) {
+  const int stride = out.width + 3;
+  GuardedPixels pixels(stride, out.height, p.format);
+  scaler(p.bytes.data(), p.width, p.height, p.stride, pixels.data(), out.width, out.height, stride);
+  const Bytes want = placed({{stride, out.height}, out, 0, 0, 0}, p.format, [&](int x, int y) {
+    return sampled(p, {0, 0, p.width, p.height}, x, y, out, sampling);
+  });
+  ASSERT_EQ(want, pixels.content()) << p.width << "x" << p.height << " to " << out.width << "x"
+                                    << out.height;
 }
 
 TEST(Scaling, FamilyAgainstTheFormulas) {
   std::mt19937 random(3);
   const auto side = [&] { return 1 + static_cast<int>(random() % 64); };
   for (int n = 0; n < 400; ++n) {
-    const int width = side(), height = side(), outWidth = n % 7 ? side() : width,
-              outHeight = n % 7 ? side() : height;
-    const bool grows = outWidth > width || outHeight > height;
+    const int width = side(), height = side();
+    const Size out = n % 7 ? Size{side(), side()} : Size{width, height};
+    const bool grows = out.width > width || out.height > height;
     const Picture words = random_picture(random, width, height, TAVIRPELO_RGB565);
     const Picture bytes = random_picture(random, width, height, TAVIRPELO_RGB888);
-    expect_scaled(PELO_Scale_ex, words, outWidth, outHeight, {Method::kAverage, grows});
-    expect_scaled(PELO_FastScale_ex, words, outWidth, outHeight, {Method::kNearest});
-    expect_scaled(PELO_RGB888Scale_ex, bytes, outWidth, outHeight, {Method::kAverage});
-    expect_scaled(PELO_UpScale, words, outWidth, outHeight, {Method::kAverage, true});
-    expect_scaled(PELO_DownScale_1sample, words, outWidth, outHeight, {Method::kNearest});
+    expect_scaled(PELO_Scale_ex, words, out, {Method::kAverage, grows});
+    expect_scaled(PELO_FastScale_ex, words, out, {Method::kNearest});
+    expect_scaled(PELO_RGB888Scale_ex, bytes, out, {Method::kAverage});
+    expect_scaled(PELO_UpScale, words, out, {Method::kAverage, true});
+    expect_scaled(PELO_DownScale_1sample, words, out, {Method::kNearest});
   }
   // More columns than are handled at a time.
-  expect_scaled(PELO_RGB888Scale_ex, random_picture(random, 700, 4, 1), 600, 3, {Method::kAverage});
-  expect_scaled(PELO_FastScale_ex, random_picture(random, 300, 4, 0), 900, 3, {Method::kNearest});
+  expect_scaled(PELO_RGB888Scale_ex, random_picture(random, 700, 4, 1), {600, 3}, {Method::kAverage});
+  expect_scaled(PELO_FastScale_ex, random_picture(random, 300, 4, 0), {900, 3}, {Method::kNearest});
 }
 
 TEST(Scaling, NothingForMissingOrEmptyPictures) {
@@ -145,7 +138,8 @@ TEST(Placement, AgainstTheFormulas) {
     const int width = side(40), height = side(40), stride = width + 2,
               bytes = pelo::bytes_per_pixel(format);
     const int scaledWidth = side(n % 11 ? 90 : 100000), scaledHeight = side(90);
-    GuardedPixels out(stride, height, format, quality == 1 ? 0 : 0x33);
+    const uint8_t fill = quality == 1 ? 0 : kFill;  // quarters are added to what is there
+    GuardedPixels out(stride, height, format, fill);
     ASSERT_EQ(1, TAVIRPELO_CODEC_Scale(p.bytes.data(), out.data(), p.width, p.height, p.stride * bytes,
                                        width, height, stride * bytes, scaledWidth, scaledHeight, format,
                                        anchor, quality));
@@ -154,18 +148,13 @@ TEST(Placement, AgainstTheFormulas) {
     const Method method = quality == 0  ? Method::kNearest
                           : format == 0 ? Method::kAverage
                                         : Method::kQuarters;
-    const Bytes got = out.content();
-    for (int y = 0; y < height; ++y) {
-      for (int x = 0; x < stride; ++x) {
-        const int tx = x - ax.targetStart, ty = y - ay.targetStart;
-        const bool covered = tx >= 0 && ty >= 0 && tx < ax.targetCount && ty < ay.targetCount;
-        const Bytes want = covered ? sampled(p, ax.start, ay.start, ax.count, ay.count, tx, ty,
-                                             ax.targetCount, ay.targetCount, {method})
-                                   : Bytes(static_cast<size_t>(bytes), quality == 1 ? 0 : 0x33);
-        const auto from = got.begin() + (y * stride + x) * bytes;
-        ASSERT_EQ(want, Bytes(from, from + bytes)) << "case " << n << " at " << x << "," << y;
-      }
-    }
+    const Size target{ax.targetCount, ay.targetCount};
+    const auto pixel = [&](int x, int y) {
+      return sampled(p, {ax.start, ay.start, ax.count, ay.count}, x, y, target, {method});
+    };
+    const Placement place{{stride, height}, target, 0, ax.targetStart, ay.targetStart};
+    const Bytes want = placed(place, format, pixel, fill);
+    ASSERT_EQ(want, out.content()) << "case " << n;
   }
 }
 
