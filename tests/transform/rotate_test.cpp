@@ -1,16 +1,11 @@
 // Turning and mirroring: coefficients against libjpeg's reading and jpegtran's moves, in one call and in
 // steps, to memory and files, and what is refused.
-#include <gtest/gtest.h>
-
 #include <cstdio>
 #include <cstdlib>
-#include <map>
 
-#include "codec/jpeg/tables.h"
-#include "platform/fault_injection.h"
-#include "tavirpelo/tavirpelo.h"
-#include "tests/support/jpeg_samples.h"
-#include "tests/support/slideshow_files.h"
+#include "tests/support/failures.h"
+#include "tests/support/guarded_decode.h"
+#include "tests/support/jpeg_segments.h"
 
 namespace tests {
 namespace {
@@ -30,14 +25,15 @@ struct Turned {
   int calls = 1;
 };
 
-Turned turn(Bytes source, int width, int height, int angle, int flip, bool inSteps = false) {
-  ELO_DESTINATION destination{
-      ELO_TO_MEMORY, 700, 0, 0, nullptr, static_cast<uint8_t*>(TAVIRPELO_OsMalloc(700))};
+Turned turn(Bytes source, Size size, int angle, int flip, bool inSteps = false) {
+  auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(700));
+  if (buffer == nullptr) return {0, {}};
+  ELO_DESTINATION destination{ELO_TO_MEMORY, 700, 0, 0, nullptr, buffer};
   ELO_TRANSFORMSTATE state{};
   Turned result{4, {}, 0};
   while (result.answer == 4) {
-    result.answer = elo_rotate_jpeg(source.data(), static_cast<int>(source.size()), width, height,
-                                    &destination, angle, flip, inSteps ? &state : nullptr);
+    result.answer = elo_rotate_jpeg(source.data(), static_cast<int>(source.size()), size.width,
+                                    size.height, &destination, angle, flip, inSteps ? &state : nullptr);
     ++result.calls;
     EXPECT_EQ(result.answer == 4, state.context != nullptr);
   }
@@ -48,79 +44,56 @@ Turned turn(Bytes source, int width, int height, int angle, int flip, bool inSte
   return result;
 }
 
-// Markers of the entropy-coded data, and the segments before it.
-std::vector<uint8_t> restarts(const Bytes& jpeg) {
-  std::vector<uint8_t> found;
-  for (size_t i = 0; i + 1 < jpeg.size(); ++i) {
-    if (jpeg[i] == 0xFF && jpeg[i + 1] >= 0xD0 && jpeg[i + 1] <= 0xD7) found.push_back(jpeg[i + 1]);
-  }
-  return found;
-}
-bool has_marker(const Bytes& jpeg, uint8_t marker) {
-  for (size_t i = 0; i + 1 < jpeg.size(); ++i) {
-    if (jpeg[i] == 0xFF && jpeg[i + 1] == marker) return true;
-  }
-  return false;
-}
-
 TEST(Rotate, StepsGiveTheSameBytes) {
-  const Bytes source = encode_own(83, 61, 90);
+  Bytes source = encode_own(83, 61, 90);
   for (const Turn& t : kTurns) {
-    const Turned whole = turn(source, 83, 61, t.angle, t.flip);
-    const Turned steps = turn(source, 83, 61, t.angle, t.flip, true);
+    Turned whole = turn(source, {83, 61}, t.angle, t.flip);
+    const Turned steps = turn(source, {83, 61}, t.angle, t.flip, true);
     EXPECT_EQ(1, whole.answer);
     EXPECT_EQ(whole.jpeg, steps.jpeg);
     EXPECT_LT(3, steps.calls);
     // To a file.
     const TempFile file;
     ELO_DESTINATION destination{ELO_TO_FILE, 0, 0, 0, std::fopen(file.c_str(), "wb"), nullptr};
-    Bytes copy = source;
-    EXPECT_EQ(1, elo_rotate_jpeg(copy.data(), static_cast<int>(copy.size()), 83, 61, &destination,
+    EXPECT_EQ(1, elo_rotate_jpeg(source.data(), static_cast<int>(source.size()), 83, 61, &destination,
                                  t.angle, t.flip, nullptr));
     std::fclose(destination.file);
     EXPECT_EQ(whole.jpeg, file.read());
     EXPECT_EQ(static_cast<int>(whole.jpeg.size()), destination.total);
     TAVIRPELO_HINFO header{};
-    Bytes parsed = whole.jpeg;
     EXPECT_EQ(TAVIRPELO_FORMAT_JPEG,
-              TAVIRPELO_ParseFromBuffer(parsed.data(), static_cast<int>(parsed.size()), &header));
+              TAVIRPELO_ParseFromBuffer(whole.jpeg.data(), destination.total, &header));
     EXPECT_EQ(t.angle % 180 == 0 ? 83 : 61, header.width);
-    EXPECT_FALSE(has_marker(whole.jpeg, 0xE1));
+    EXPECT_EQ(whole.jpeg.size(), find_marker(whole.jpeg, 0xE1));
   }
 }
 
 TEST(Rotate, RowsOfTurnedPicturesEndInRestartMarkers) {
-  const Turned turned = turn(encode_own(176, 33, 90), 176, 33, 90, 0);
-  const size_t dri = [&] {
-    for (size_t i = 0; i + 5 < turned.jpeg.size(); ++i) {
-      if (turned.jpeg[i] == 0xFF && turned.jpeg[i + 1] == 0xDD) return i;
+  const auto restarts = [](const Bytes& jpeg) {
+    Bytes found;
+    for (size_t i = find_marker(jpeg, 0xDA); i + 1 < jpeg.size(); ++i) {
+      if (jpeg[i] == 0xFF && jpeg[i + 1] >= 0xD0 && jpeg[i + 1] <= 0xD7) found.push_back(jpeg[i + 1]);
     }
-    return size_t{0};
-  }();
-  ASSERT_NE(0u, dri);
-  EXPECT_EQ(3, turned.jpeg[dri + 5]);  // MCUs of an output row
-  const std::vector<uint8_t> markers = restarts(turned.jpeg);
-  ASSERT_EQ(10u, markers.size());
-  for (size_t i = 0; i < markers.size(); ++i) EXPECT_EQ(0xD0 + i % 8, markers[i]);
-  EXPECT_TRUE(restarts(turn(encode_own(16, 16, 90), 16, 16, 90, 0).jpeg).empty());
+    return found;
+  };
+  const Bytes turned = turn(encode_own(176, 33, 90), {176, 33}, 90, 0).jpeg;
+  const size_t dri = find_marker(turned, 0xDD);
+  ASSERT_LT(dri, turned.size());
+  EXPECT_EQ(3, turned[dri + 5]);  // MCUs of an output row
+  EXPECT_EQ((Bytes{0xD0, 0xD1, 0xD2, 0xD3, 0xD4, 0xD5, 0xD6, 0xD7, 0xD0, 0xD1}), restarts(turned));
+  EXPECT_TRUE(restarts(turn(encode_own(16, 16, 90), {16, 16}, 90, 0).jpeg).empty());
 }
 
 TEST(Rotate, WhatIsRefused) {
   const Bytes source = encode_own(40, 24, 90);
-  EXPECT_EQ(0, turn(source, 40, 24, 45, 0).answer);
-  EXPECT_EQ(0, turn(source, 40, 23, 90, 0).answer);
-  EXPECT_EQ(0, turn(source, 24, 40, 90, 0).answer);
+  EXPECT_EQ(0, turn(source, {40, 24}, 45, 0).answer);
+  EXPECT_EQ(0, turn(source, {40, 23}, 90, 0).answer);
+  EXPECT_EQ(0, turn(source, {24, 40}, 90, 0).answer);
   ELO_DESTINATION idle{};
   EXPECT_EQ(1, elo_rotate_jpeg(nullptr, 0, 1, 1, &idle, 0, 0, nullptr));
   EXPECT_EQ(0, elo_rotate_jpeg(nullptr, 0, 1, 1, &idle, 90, 0, nullptr));
-  Bytes zero = source;  // a quantiser of nothing
-  for (size_t i = 0; i + 10 < zero.size(); ++i) {
-    if (zero[i] == 0xFF && zero[i + 1] == 0xDB) {
-      zero[i + 9] = 0;
-      break;
-    }
-  }
-  EXPECT_EQ(0, turn(zero, 40, 24, 90, 0).answer);
+  const Bytes zero = overwritten(source, find_marker(source, 0xDB) + 9, {0});  // a quantiser of nothing
+  EXPECT_EQ(0, turn(zero, {40, 24}, 90, 0).answer);
   EXPECT_EQ(1, elo_abort_rotate_jpeg(nullptr));
 }
 
@@ -145,39 +118,19 @@ TEST(Rotate, AbortedAnywhereEndsTheFile) {
   }
 }
 
-TEST(Rotate, DamagedAndCutSources) {
+TEST(Rotate, DamageAndShortMemory) {
   const Bytes source = encode_own(48, 40, 80);
-  for (size_t size = 2; size < source.size(); size += 7) {
-    const Bytes cut(source.begin(), source.begin() + static_cast<ptrdiff_t>(size));
-    for (const Turn& t : {kTurns[0], kTurns[1], kTurns[3], kTurns[5]})
-      turn(cut, 48, 40, t.angle, t.flip, size % 2 == 0);
-  }
-  for (size_t at = 2; at < source.size(); at += 3) {
-    for (const uint8_t flip : {0x01, 0x80, 0xFF}) {
-      Bytes damaged = source;
-      damaged[at] ^= flip;
-      const Turn& t = kTurns[at % 7];
-      turn(damaged, 48, 40, t.angle, t.flip);
-    }
-  }
-}
-
-TEST(Rotate, ShortMemoryAtEveryStep) {
-  const Bytes source = encode_own(48, 40, 80);
-  for (const Turn& t : {kTurns[1], kTurns[3]}) {
-    for (long k = 1;; ++k) {
-      Bytes copy = source;
-      ELO_DESTINATION destination{ELO_TO_MEMORY, 0, 0, 0, nullptr, nullptr};
-      pelo::faults::allocations.arm(k);
-      const int answer = elo_rotate_jpeg(copy.data(), static_cast<int>(copy.size()), 48, 40,
-                                         &destination, t.angle, t.flip, nullptr);
-      const bool reached = pelo::faults::allocations.calls >= k;
-      pelo::faults::allocations.arm(0);
-      TAVIRPELO_OsFree(destination.buffer);
-      if (!reached) break;
-      EXPECT_EQ(0, answer) << k;
-    }
-  }
+  const auto cut_turn = [](const Bytes& cut) {
+    for (const size_t t : {0, 1, 3, 5})
+      turn(cut, {48, 40}, kTurns[t].angle, kTurns[t].flip, cut.size() % 2 == 0);
+  };
+  every_truncation(source, cut_turn, 2, 7);
+  const auto damaged_turn = [](const Bytes& damaged, size_t at) {
+    turn(damaged, {48, 40}, kTurns[at % 7].angle, kTurns[at % 7].flip);
+  };
+  every_flip(source, {0x01, 0x80, 0xFF}, damaged_turn, 2, 3);
+  for (const size_t t : {1, 3})
+    fail_each_allocation([&] { return turn(source, {48, 40}, kTurns[t].angle, kTurns[t].flip).answer; });
 }
 
 #ifdef TAVIR_HAVE_LIBJPEG
@@ -209,43 +162,29 @@ void expect_same(const std::vector<Plane>& want, const std::vector<Plane>& got, 
 }
 
 TEST(Rotate, MovesWhatJpegtranMoves) {
-  std::vector<JpegStyle> styles;
-  for (const auto& [h, v] : {std::pair{2, 2}, {2, 1}, {1, 2}, {1, 1}}) {
-    JpegStyle style;
-    style.h = h, style.v = v;
-    styles.push_back(style);
-  }
-  JpegStyle grey;
-  grey.components = 1;
-  styles.push_back(grey);
-  JpegStyle restarted;
-  restarted.restartInterval = 5;
-  restarted.quality = 100;
-  styles.push_back(restarted);
-  for (const JpegStyle& style : styles) {
+  for (const JpegStyle& style : {JpegStyle{},
+                                 {.v = 1},
+                                 {.h = 1},
+                                 {.h = 1, .v = 1},
+                                 {.components = 1},
+                                 {.quality = 100, .restartInterval = 5}}) {
     const Bytes source = encode_libjpeg(96, 64, style);
     for (const Turn& t : kTurns) {
-      const Turned turned = turn(source, 96, 64, t.angle, t.flip);
+      const Turned turned = turn(source, {96, 64}, t.angle, t.flip);
       ASSERT_EQ(1, turned.answer);
       expect_same(comparable(run_jpegtran(source, t.jpegtran)), comparable(turned.jpeg), t.jpegtran);
     }
     // There and back.
-    const Turned there = turn(source, 96, 64, 90, 0), back = turn(there.jpeg, 64, 96, 270, 0);
+    const Turned there = turn(source, {96, 64}, 90, 0), back = turn(there.jpeg, {64, 96}, 270, 0);
     expect_same(comparable(source), comparable(back.jpeg), "back");
   }
 }
 
 TEST(Rotate, RefusesWhatItCannotMove) {
-  JpegStyle progressive, rgb, separate;
-  progressive.progressive = true;
-  rgb.rgb = true;
-  separate.separateScans = true;
-  for (const JpegStyle& style : {progressive, rgb, separate}) {
-    EXPECT_EQ(0, turn(encode_libjpeg(64, 64, style), 64, 64, 90, 0).answer);
+  for (const JpegStyle& style :
+       {JpegStyle{.progressive = true}, {.rgb = true}, {.separateScans = true}, {.h = 4, .v = 1}}) {
+    EXPECT_EQ(0, turn(encode_libjpeg(64, 64, style), {64, 64}, 90, 0).answer);
   }
-  JpegStyle wide;
-  wide.h = 4, wide.v = 1;
-  EXPECT_EQ(0, turn(encode_libjpeg(64, 64, wide), 64, 64, 90, 0).answer);
 }
 
 #endif
