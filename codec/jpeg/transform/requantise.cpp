@@ -24,7 +24,7 @@ constexpr GainTable make_gains() {
   uint64_t gain = 1500;
   for (uint64_t r = kGainBase; r < kGainEnd; ++r) {
     while (gain * gain * 729 * r * r * r > kRight) --gain;
-    table[r - kGainBase] = static_cast<uint16_t>(std::min<uint64_t>(gain, 960));
+    table[static_cast<size_t>(r - kGainBase)] = static_cast<uint16_t>(std::min<uint64_t>(gain, 960));
   }
   return table;
 }
