@@ -1,6 +1,7 @@
 #include "tests/support/slideshow_files.h"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <cstdio>
 #include <fstream>
@@ -30,7 +31,8 @@ void put_mark(Bytes& out, size_t musicSize) {
 TempFile::TempFile(const std::string& suffix)
     : path_(testing::TempDir() + "tavir_" +
             testing::UnitTest::GetInstance()->current_test_info()->test_suite_name() + "_" +
-            testing::UnitTest::GetInstance()->current_test_info()->name() + suffix) {}
+            testing::UnitTest::GetInstance()->current_test_info()->name() + "_" +
+            std::to_string(getpid()) + suffix) {}
 
 TempFile::~TempFile() {
   std::remove(path_.c_str());

@@ -13,7 +13,7 @@ namespace tests {
 
 constexpr size_t kHeaderBytes = 628, kSubfileBytes = 540, kMarkBytes = 12;
 
-// A file of the running test alone, removed at the end.
+// A file of the running test and process alone, removed at the end.
 class TempFile {
  public:
   explicit TempFile(const std::string& suffix = "");
