@@ -107,21 +107,15 @@ TEST_F(ExifReader, FileAndSegmentAndBufferAgree) {
 
 TEST_P(ExifOrder, EntriesOfOtherTypesAndCountsAreIgnored) {
   ExifBuilder exif(GetParam());
-  exif.shorts(Ifd::k0, 274, {6, 6})  // two SHORTs are never read
-      .shorts(Ifd::k0, 258, {8, 8})
-      .longs(Ifd::k0, 296, {2})
-      .entry(Ifd::k0, 271, 13, 3, {'a', 'b', 0})  // no type of TIFF
-      .entry(Ifd::k0, 272, 0, 3, {'a', 'b', 0})
-      .entry(Ifd::k0, 282, 5, 1, {0, 0, 0, 0})  // at offset 0: the header's own bytes
-      .rationals(Ifd::k0, 283, {1, 2}, 10)
-      .bytes(Ifd::k0, 305, {'x', 'y'}, 2)  // no terminator: one is added
-      .shorts(Ifd::k0, 65000, {1})
-      .text(Ifd::kExif, 36867, "2021:02:03 04:05")
-      .shorts(Ifd::kExif, 34855, {100, 200})
-      .shorts(Ifd::kExif, 271, {5})  // a tag of another directory
-      .text(Ifd::kGps, 29, "2021:2:3")
-      .rationals(Ifd::kGps, 2, {1, 1, 2, 1})
-      .text(Ifd::kGps, 1, "NN");
+  const Ifd i0 = Ifd::k0, ex = Ifd::kExif, gps = Ifd::kGps;
+  // Two SHORTs are never read; no type of TIFF; a value at offset 0: the header's own bytes.
+  exif.shorts(i0, 274, {6, 6}).shorts(i0, 258, {8, 8}).longs(i0, 296, {2}).shorts(i0, 65000, {1});
+  exif.entry(i0, 271, 13, 3, {'a', 'b', 0}).entry(i0, 272, 0, 3, {'a', 'b', 0});
+  exif.entry(i0, 282, 5, 1, {0, 0, 0, 0}).rationals(i0, 283, {1, 2}, 10);
+  exif.bytes(i0, 305, {'x', 'y'}, 2);  // no terminator: one is added
+  exif.text(ex, 36867, "2021:02:03 04:05").shorts(ex, 34855, {100, 200});
+  exif.shorts(ex, 271, {5});  // a tag of another directory
+  exif.text(gps, 29, "2021:2:3").rationals(gps, 2, {1, 1, 2, 1}).text(gps, 1, "NN");
   const Exif info = read(exif);
   ASSERT_TRUE(info && info->gps);
   EXPECT_EQ(Numbers(8), (Numbers{info->orientation, info->bitsPerSample[0], info->resolutionUnit,

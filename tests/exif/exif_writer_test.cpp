@@ -108,19 +108,6 @@ TEST(ExifWriter, NeverLeavesItsBuffer) {
   EXPECT_EQ(0u, write_tiff(large).size());
 }
 
-TEST(ExifWriter, TheEncoderCarriesTheSegmentBehindItsFirstOne) {
-  const Bytes segment = write_segment(full_content(sample_thumbnail()));
-  const Bytes jpeg = with_app1(segment);
-  ASSERT_GT(jpeg.size(), 20 + segment.size());
-  EXPECT_EQ(segment, prefix(suffix(jpeg, 20), segment.size()));
-  EXPECT_EQ(0xDB, jpeg[20 + segment.size() + 1]);
-  TAVIRPELO_HINFO header;
-  Bytes copy = jpeg;
-  EXPECT_EQ(TAVIRPELO_FORMAT_JPEG,
-            TAVIRPELO_ParseFromBuffer(copy.data(), static_cast<int>(copy.size()), &header));
-  EXPECT_EQ(20, header.thumbnailWidth);
-}
-
 using App1Mark = QuietTest;
 TEST_F(App1Mark, CarriesTheOrientationOfTheSource) {
   uint8_t segment[PELO_APP1_SIZE];

@@ -120,21 +120,5 @@ TEST(GifPlace, EmptySidesAndUnknownFormatsWriteNothing) {
   }
 }
 
-// An image beside, partly beside and larger than the screen, at 1:1 and reduced.
-TEST(GifPlace, ImagesThatDoNotFitTheScreen) {
-  GifFile file = sample_gif(90, 70, 4);
-  file.width = 50, file.height = 40;
-  expect_sampled(file, {50, 40}, {50, 40}, 0);
-  for (const auto& [left, top] : {std::pair(49, 39), {50, 40}, {65535, 0}, {0, 65535}}) {
-    file.images[0].left = left, file.images[0].top = top;
-    EXPECT_EQ(1, decode_gif(file.bytes(), 50, 40).answer);
-    EXPECT_EQ(1, decode_gif(file.bytes(), 49, 39).answer);
-    const GifFrames frames = decode_frames(file.bytes(), 50, 40);
-    EXPECT_EQ(3, frames.answer);
-    const auto painted = std::count(frames.frames[0].begin(), frames.frames[0].end(), 255);
-    EXPECT_EQ(left == 49, painted > 0);
-  }
-}
-
 }  // namespace
 }  // namespace tests

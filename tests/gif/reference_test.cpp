@@ -112,12 +112,15 @@ TEST(GifReference, PlacesPalettesAndTransparency) {
   expect_equal(file);
   file.palette.clear();
   expect_equal(file);
-  for (const auto& [left, top] : {std::pair(10, 5), {0, 39}, {59, 0}, {50, 30}}) {
+  for (const auto& [left, top] : {std::pair(10, 5), {0, 39}, {59, 0}, {50, 30}, {60, 40}, {65535, 0}}) {
     image.left = left, image.top = top;
     expect_equal(file);
   }
   file.loops = true;
   expect_equal(file);
+  GifFile larger = sample_gif(90, 70, 4);
+  larger.width = 50, larger.height = 40;
+  expect_equal(larger);
 }
 
 // Frames of any place, palette, transparency, disposal and row order, composed by the format's rules.

@@ -3,20 +3,12 @@
 #ifdef TAVIR_HAVE_LIBPNG
 #include <png.h>
 
-#include <csetjmp>
 #include <cstring>
-#include <random>
 
 #include "tests/png/png_decode.h"
 
 namespace tests {
 namespace {
-
-struct Kind {
-  int type, depth;
-};
-constexpr Kind kKinds[] = {{0, 1}, {0, 2}, {0, 4}, {0, 8}, {0, 16}, {2, 8}, {2, 16}, {3, 1},
-                           {3, 2}, {3, 4}, {3, 8}, {4, 8}, {4, 16}, {6, 8}, {6, 16}};
 
 // Rows with gradients and noise, so that every filter pays somewhere.
 Bytes sample_rows(std::mt19937& random, size_t rowBytes, size_t height) {
@@ -28,7 +20,7 @@ Bytes sample_rows(std::mt19937& random, size_t rowBytes, size_t height) {
   return rows;
 }
 
-Bytes write_png(const Kind& kind, bool interlaced, uint32_t width, uint32_t height, int level,
+Bytes write_png(const PngKind& kind, bool interlaced, uint32_t width, uint32_t height, int level,
                 std::mt19937& random) {
   Bytes file;
   png_structp png = png_create_write_struct(PNG_LIBPNG_VER_STRING, nullptr, nullptr, nullptr);
@@ -36,8 +28,7 @@ Bytes write_png(const Kind& kind, bool interlaced, uint32_t width, uint32_t heig
   png_set_write_fn(
       png, &file,
       [](png_structp p, png_bytep data, size_t size) {
-        auto* out = static_cast<Bytes*>(png_get_io_ptr(p));
-        out->insert(out->end(), data, data + size);
+        append(*static_cast<Bytes*>(png_get_io_ptr(p)), Bytes(data, data + size));
       },
       nullptr);
   png_set_IHDR(png, info, width, height, kind.depth, kind.type, interlaced ? PNG_INTERLACE_ADAM7 : 0, 0,
@@ -63,7 +54,7 @@ Bytes write_png(const Kind& kind, bool interlaced, uint32_t width, uint32_t heig
 
 // R, G, B, A of each pixel as libpng reads it; few-bit grey is widened by ones, single bits to black or
 // white.
-Bytes read_png(const Bytes& file, const Kind& kind) {
+Bytes read_png(const Bytes& file, const PngKind& kind) {
   png_structp png = png_create_read_struct(PNG_LIBPNG_VER_STRING, nullptr, nullptr, nullptr);
   png_infop info = png_create_info_struct(png);
   std::pair<const Bytes*, size_t> source{&file, 0};
@@ -100,17 +91,17 @@ Bytes read_png(const Bytes& file, const Kind& kind) {
 
 TEST(PngAgainstLibpng, EveryKindInterlacedOrNot) {
   std::mt19937 random(11);
-  for (const Kind& kind : kKinds) {
+  for (const PngKind& kind : kPngKinds) {
     for (const bool interlaced : {false, true}) {
       for (const int level : {0, 1, 6, 9}) {
         const int width = 1 + static_cast<int>(random() % 90),
                   height = 1 + static_cast<int>(random() % 70);
         const Bytes file = write_png(kind, interlaced, static_cast<uint32_t>(width),
                                      static_cast<uint32_t>(height), level, random);
-        const PngResult got = decode_png(file, width, height, TAVIRPELO_RGBA8888);
+        const Decode got = decode_png(file, width, height, TAVIRPELO_RGBA8888);
         ASSERT_EQ(1, got.answer);
         ASSERT_EQ(read_png(file, kind), got.pixels)
-            << "type " << kind.type << " depth " << kind.depth << " interlaced " << interlaced
+            << "type " << int{kind.type} << " depth " << int{kind.depth} << " interlaced " << interlaced
             << " level " << level << " " << width << "x" << height;
       }
     }

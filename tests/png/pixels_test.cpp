@@ -4,12 +4,6 @@
 namespace tests {
 namespace {
 
-struct Kind {
-  uint8_t type, depth;
-};
-constexpr Kind kKinds[] = {{0, 1}, {0, 2}, {0, 4}, {0, 8}, {0, 16}, {2, 8}, {2, 16}, {3, 1},
-                           {3, 2}, {3, 4}, {3, 8}, {4, 8}, {4, 16}, {6, 8}, {6, 16}};
-
 // The bytes of one pixel over a background of fill bytes.
 Bytes over_fill(const Rgba& p, int format) {
   if (format == 0) return word_bytes(blended565(p, kFill << 8 | kFill));
@@ -29,7 +23,7 @@ Bytes expected(const PngImage& image, const Placement& place, int format) {
 
 TEST(PngPixels, EveryKindInEveryFormat) {
   uint32_t seed = 0;
-  for (const Kind kind : kKinds) {
+  for (const PngKind kind : kPngKinds) {
     for (const bool interlaced : {false, true}) {
       for (const bool trns : {false, true}) {
         if (trns && kind.type >= 4) continue;

@@ -7,8 +7,9 @@ namespace {
 
 constexpr uint16_t kShort = 3, kLong = 4;
 
-ByteWriter& numbers(ByteWriter& out, std::initializer_list<uint32_t> values, bool wide) {
-  for (const uint32_t v : values) wide ? out.u32(v) : out.u16(v);
+Bytes numbers(bool big, std::initializer_list<uint32_t> values, int bytes) {
+  ByteWriter out(big);
+  for (const uint32_t v : values) out.put(v, bytes);
   return out;
 }
 
@@ -26,21 +27,17 @@ ExifBuilder& ExifBuilder::entry(Ifd ifd, uint16_t tag, uint16_t type, uint32_t c
   return *this;
 }
 ExifBuilder& ExifBuilder::shorts(Ifd ifd, uint16_t tag, std::initializer_list<uint32_t> values) {
-  ByteWriter value(big_);
-  return entry(ifd, tag, kShort, static_cast<uint32_t>(values.size()), numbers(value, values, false));
+  return entry(ifd, tag, kShort, static_cast<uint32_t>(values.size()), numbers(big_, values, 2));
 }
 ExifBuilder& ExifBuilder::longs(Ifd ifd, uint16_t tag, std::initializer_list<uint32_t> values) {
-  ByteWriter value(big_);
-  return entry(ifd, tag, kLong, static_cast<uint32_t>(values.size()), numbers(value, values, true));
+  return entry(ifd, tag, kLong, static_cast<uint32_t>(values.size()), numbers(big_, values, 4));
 }
 ExifBuilder& ExifBuilder::rationals(Ifd ifd, uint16_t tag, std::initializer_list<uint32_t> parts,
                                     uint16_t type) {
-  ByteWriter value(big_);
-  return entry(ifd, tag, type, static_cast<uint32_t>(parts.size() / 2), numbers(value, parts, true));
+  return entry(ifd, tag, type, static_cast<uint32_t>(parts.size() / 2), numbers(big_, parts, 4));
 }
 ExifBuilder& ExifBuilder::text(Ifd ifd, uint16_t tag, std::string_view text) {
-  const Bytes value = ByteWriter().text(text).u8(0);
-  return bytes(ifd, tag, value, 2);
+  return bytes(ifd, tag, ByteWriter().text(text).u8(0), 2);
 }
 ExifBuilder& ExifBuilder::bytes(Ifd ifd, uint16_t tag, const Bytes& value, uint16_t type) {
   return entry(ifd, tag, type, static_cast<uint32_t>(value.size()), value);
@@ -107,8 +104,7 @@ Bytes ExifBuilder::segment() const {
 }
 
 Bytes ExifBuilder::jpeg(const Bytes& plain) const {
-  Bytes out(plain.begin(), plain.begin() + 2);
-  return ByteWriter().block(out).block(segment()).block(Bytes(plain.begin() + 2, plain.end()));
+  return ByteWriter().block(prefix(plain, 2)).block(segment()).block(suffix(plain, 2));
 }
 
 Bytes sample_thumbnail() {
@@ -116,49 +112,26 @@ Bytes sample_thumbnail() {
 }
 
 Bytes full_exif_jpeg(bool big) {
-  const auto negative = [](int v) { return static_cast<uint32_t>(v); };
-  ExifBuilder exif(big);
-  exif.shorts(Ifd::k0, 258, {8, 7, 6})
-      .shorts(Ifd::k0, 259, {6})
-      .text(Ifd::k0, 271, "Abc")  // four bytes with its NUL: inside the entry
-      .text(Ifd::k0, 272, "Model of five words, outside")
-      .shorts(Ifd::k0, 274, {6})
-      .rationals(Ifd::k0, 282, {300, 1})
-      .rationals(Ifd::k0, 283, {301, 2})
-      .shorts(Ifd::k0, 296, {3})
-      .text(Ifd::k0, 305, "soft 1.0")
-      .shorts(Ifd::k0, 531, {2})
-      .text(Ifd::k0, 33432, "all rights");
-  exif.rationals(Ifd::kExif, 33434, {1, 125})
-      .rationals(Ifd::kExif, 33437, {28, 10})
-      .shorts(Ifd::kExif, 34855, {400})
-      .bytes(Ifd::kExif, 36864, {'0', '2', '3', '1'}, 7)
-      .text(Ifd::kExif, 36867, "2021:02:03 04:05:06")
-      .text(Ifd::kExif, 36868, "2022:03:04 05:06:07")
-      .rationals(Ifd::kExif, 37377, {negative(-7), 2}, 10)
-      .rationals(Ifd::kExif, 37380, {negative(-1), 3}, 10)
-      .shorts(Ifd::kExif, 37385, {16})
-      .rationals(Ifd::kExif, 37386, {50, 1})
-      .shorts(Ifd::kExif, 40961, {1})
-      .longs(Ifd::kExif, 40962, {70000})
-      .shorts(Ifd::kExif, 40963, {48})
-      .shorts(Ifd::kExif, 41986, {1})
-      .shorts(Ifd::kExif, 41987, {1})
-      .rationals(Ifd::kExif, 41988, {3, 2});
-  exif.bytes(Ifd::kGps, 0, {2, 3, 0, 0}, 1)
-      .text(Ifd::kGps, 1, "N")
-      .rationals(Ifd::kGps, 2, {48, 1, 8, 1, 1234, 100})
-      .text(Ifd::kGps, 3, "W")
-      .rationals(Ifd::kGps, 4, {11, 1, 34, 1, 56, 1})
-      .bytes(Ifd::kGps, 5, {1}, 1)
-      .rationals(Ifd::kGps, 6, {5195, 10})
-      .rationals(Ifd::kGps, 7, {9, 1, 8, 1, 7, 1})
-      .text(Ifd::kGps, 18, "WGS-84")
-      .bytes(Ifd::kGps, 27, {'A', 'S', 'C', 'I', 'I', 0, 0, 0, 'G', 'P', 'S'}, 7)
-      .text(Ifd::kGps, 29, "2021:02:03")
-      .shorts(Ifd::kGps, 30, {1});
-  exif.shorts(Ifd::k1, 262, {6}).shorts(Ifd::k1, 284, {1}).shorts(Ifd::k1, 4173, {9});
-  return exif.thumbnail(sample_thumbnail()).jpeg(encode_own(40, 24, 80));
+  ExifBuilder e(big);
+  const Ifd i0 = Ifd::k0, ex = Ifd::kExif, gps = Ifd::kGps, i1 = Ifd::k1;
+  e.shorts(i0, 258, {8, 7, 6}).shorts(i0, 259, {6});
+  e.text(i0, 271, "Abc").text(i0, 272, "Model of five words, outside");  // inside the entry; behind it
+  e.shorts(i0, 274, {6}).rationals(i0, 282, {300, 1}).rationals(i0, 283, {301, 2}).shorts(i0, 296, {3});
+  e.text(i0, 305, "soft 1.0").shorts(i0, 531, {2}).text(i0, 33432, "all rights");
+  e.rationals(ex, 33434, {1, 125}).rationals(ex, 33437, {28, 10}).shorts(ex, 34855, {400});
+  e.bytes(ex, 36864, {'0', '2', '3', '1'}, 7);
+  e.text(ex, 36867, "2021:02:03 04:05:06").text(ex, 36868, "2022:03:04 05:06:07");
+  e.rationals(ex, 37377, {0u - 7, 2}, 10).rationals(ex, 37380, {0u - 1, 3}, 10);
+  e.shorts(ex, 37385, {16}).rationals(ex, 37386, {50, 1}).shorts(ex, 40961, {1});
+  e.longs(ex, 40962, {70000}).shorts(ex, 40963, {48}).shorts(ex, 41986, {1}).shorts(ex, 41987, {1});
+  e.rationals(ex, 41988, {3, 2}).bytes(gps, 0, {2, 3, 0, 0}, 1);
+  e.text(gps, 1, "N").rationals(gps, 2, {48, 1, 8, 1, 1234, 100});
+  e.text(gps, 3, "W").rationals(gps, 4, {11, 1, 34, 1, 56, 1});
+  e.bytes(gps, 5, {1}, 1).rationals(gps, 6, {5195, 10}).rationals(gps, 7, {9, 1, 8, 1, 7, 1});
+  e.text(gps, 18, "WGS-84").bytes(gps, 27, {'A', 'S', 'C', 'I', 'I', 0, 0, 0, 'G', 'P', 'S'}, 7);
+  e.text(gps, 29, "2021:02:03").shorts(gps, 30, {1});
+  e.shorts(i1, 262, {6}).shorts(i1, 284, {1}).shorts(i1, 4173, {9});
+  return e.thumbnail(sample_thumbnail()).jpeg(encode_own(40, 24, 80));
 }
 
 }  // namespace tests
