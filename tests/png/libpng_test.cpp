@@ -35,7 +35,7 @@ Bytes write_png(const PngKind& kind, bool interlaced, uint32_t width, uint32_t h
                0);
   png_set_compression_level(png, level);
   png_set_filter(png, 0, PNG_ALL_FILTERS);
-  std::vector<png_color> palette(1u << std::min(kind.depth, 8));
+  std::vector<png_color> palette(1u << std::min<int>(kind.depth, 8));
   for (png_color& c : palette)
     c = {static_cast<png_byte>(random()), static_cast<png_byte>(random()),
          static_cast<png_byte>(random())};
