@@ -64,22 +64,6 @@ TEST(WBmp, WhiteIn565) {
   EXPECT_EQ(0xFFDF, pixel);
 }
 
-TEST(WBmp, Integers) {
-  const Bytes bytes{0x81, 0x00, 0x7F, 0xFF, 0xFF, 0xFF, 0x7F};
-  int position = 0, groups = 0;
-  uint8_t packed[20];
-  const auto next = [&] {
-    PELOI_WBMPdecodeMultibyte(bytes.data(), static_cast<int>(bytes.size()), &position, &groups, packed);
-    return PELOI_WBMPgetMultibyte2Int(packed, groups, groups);
-  };
-  EXPECT_EQ(128u, next());
-  EXPECT_EQ(127u, next());
-  EXPECT_EQ((1u << 28) - 1, next());
-  EXPECT_EQ(7, position);
-  EXPECT_EQ(0u, next());
-  EXPECT_EQ(0, groups);
-}
-
 TEST(WBmp, DamagedAndShort) {
   const Bytes file = random_wbmp(9, 5).file();
   const auto answer = [](const Bytes& bytes, int format = 1) {

@@ -113,21 +113,13 @@ TEST(StripDecode, BandsOfAnyHeightGiveTheWholePicture) {
   }
 }
 
-TEST(StripDecode, CountsCallsAndIgnoresEmptyOnes) {
+TEST(StripDecode, IgnoresEmptyCallsAndRefusesMissingArguments) {
   Bytes jpeg = encode_own(100, 100, 80);
   const DecInfo source = open_memory(jpeg, 0);
   PELOJ_JDINFO* state = __elo_jpeg_dec_line_init(source.get(), 100, 400, TAVIRPELO_YUV420);
   ASSERT_NE(nullptr, state);
-  const Shape shape{100, 400, TAVIRPELO_YUV420};
-  EXPECT_EQ(1, __elo_jpeg_dec_line_process(state, nullptr, 0));
-  EXPECT_EQ(1, __elo_jpeg_dec_line_process(state, nullptr, -3));
+  for (const int rows : {0, -3}) EXPECT_EQ(1, __elo_jpeg_dec_line_process(state, nullptr, rows));
   EXPECT_EQ(0, state->output.emitted);
-  for (int call = 1; call <= 25; ++call) {
-    EXPECT_EQ(1, Band(shape, 0, 16).process(state, 16));
-    EXPECT_EQ(16 * call, state->output.emitted);
-  }
-  EXPECT_EQ(1, __elo_jpeg_dec_line_process(state, nullptr, 16));
-  EXPECT_EQ(400, state->output.emitted);
   __elo_jpeg_dec_line_finish(state);
   __elo_jpeg_dec_line_finish(nullptr);
   EXPECT_EQ(0, __elo_jpeg_dec_line_process(nullptr, nullptr, 1));
