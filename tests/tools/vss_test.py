@@ -1,44 +1,26 @@
 """vss from the outside: what it prints and writes, what it refuses, and its exit codes."""
 import json
-import os
 import pathlib
 import resource
 import shutil
 import struct
-import subprocess
-import sys
-import tempfile
 import unittest
 
-sys.path.insert(0, str(pathlib.Path(__file__).parents[1] / "support"))
-import pictures  # noqa: E402
+from tool_test import CANNOT_OPEN, REFUSED, USAGE, WRITE_FAILURE, ToolTest, pictures
 
-DONE, USAGE, CANNOT_OPEN, REFUSED, WRITE_FAILURE = 0, 2, 3, 4, 5
 HEADER, RECORD, MARK = 628, 540, 12  # bytes of a container's parts
 
 
-class VssTest(unittest.TestCase):
+class VssTest(ToolTest):
     def setUp(self):
-        self.folder = pathlib.Path(tempfile.mkdtemp())
-        self.addCleanup(shutil.rmtree, self.folder)
+        super().setUp()
         self.show = self.folder / "show.vss"
         self.wide = self.picture("wide", 960, 480, (200, 30, 30))
         self.tall = self.picture("tall", 300, 600, (30, 30, 200))
         self.small = self.picture("small", 64, 48)
 
-    def picture(self, name, *style):
-        path = self.folder / f"{name}.jpg"
-        pictures.write_jpeg(path, *style)
-        return path
-
-    def vss(self, *arguments, expect=DONE, **options):
-        command = [os.environ["VSS"], *map(str, arguments)]
-        done = subprocess.run(command, stdout=options.pop("stdout", subprocess.PIPE),
-                              stderr=subprocess.PIPE, **options)
-        self.assertEqual(done.returncode, expect, f"{arguments}\n{done.stderr.decode()}")
-        # A message exactly when something is wrong.
-        self.assertEqual(bool(done.stderr), expect != DONE, done.stderr.decode())
-        return done.stdout
+    def vss(self, *arguments, **options):
+        return self.run_tool("VSS", *arguments, **options)
 
     def listed(self, show=None):
         return json.loads(self.vss("list", "--json", show or self.show))["pictures"]
@@ -65,23 +47,6 @@ class VssTest(unittest.TestCase):
             self.assertEqual((seen.width, seen.height), (entry["width"], entry["height"]))
             self.assertTrue(all(abs(a - b) < 6 for a, b in zip(seen.pixel(100, 100), colour)))
 
-    def test_the_file_is_laid_out_as_documented(self):
-        self.create(self.wide, self.small)
-        data = self.show.read_bytes()
-        words = struct.unpack_from("<9i20i", data, 512)
-        self.assertEqual(words[:9], (1, 0, 0, 0, 0, 480, 480, 0, 2))
-        sizes = [RECORD + entry["bytes"] for entry in self.listed()]
-        self.assertEqual(words[9:], (HEADER, HEADER + sizes[0]) + (0,) * 18)
-        self.assertEqual(len(data), HEADER + sum(sizes) + MARK)
-        self.assertEqual(data[-MARK:], b"vssf" + struct.pack("<2i", 10000, 0))
-        self.assertEqual(data[:256].rstrip(b"\0"), str(self.show).encode())
-
-    def test_an_empty_show_opens(self):
-        self.create()
-        self.assertEqual(self.show.stat().st_size, HEADER + MARK)
-        self.assertEqual(self.listed(), [])
-        self.vss("sheet", self.show, self.folder / "sheet.jpg", expect=REFUSED)
-
     def test_create_replaces_a_file_only_when_told(self):
         self.create(self.small)
         before = self.show.read_bytes()
@@ -89,6 +54,8 @@ class VssTest(unittest.TestCase):
         self.assertEqual(self.show.read_bytes(), before)
         self.vss("create", "--force", "--size", "320x200", self.show)
         self.assertEqual(self.listed(), [])
+        self.assertEqual(self.show.stat().st_size, HEADER + MARK)
+        self.vss("sheet", self.show, self.folder / "sheet.jpg", expect=REFUSED)
         self.vss("create", "--force", self.folder, expect=REFUSED)
         self.vss("create", self.folder / "missing" / "show.vss", expect=WRITE_FAILURE)
 
@@ -141,7 +108,6 @@ class VssTest(unittest.TestCase):
         self.assertEqual(self.vss("settings", self.show, "--interval", 7, "--effect", -3, "--shuffle", 1,
                                   "--loop", 1).decode().split(), changed)
         self.assertEqual(self.vss("settings", self.show).decode().split(), changed)
-        self.assertEqual(self.names(), ["small"])
 
     def test_pictures_are_removed(self):
         self.create(self.wide, self.tall, self.small, self.wide)
@@ -156,9 +122,6 @@ class VssTest(unittest.TestCase):
         for wrong in ((0, 2), (-1,)):
             self.vss("remove", self.show, *wrong, expect=REFUSED)
         self.assertEqual(self.show.read_bytes(), before)
-        self.vss("remove", self.show, 0, 1)
-        self.assertEqual(self.show.stat().st_size, HEADER + MARK)
-        self.assertEqual(self.listed(), [])
 
     def test_music_goes_in_and_comes_back(self):
         self.create(self.small)
@@ -176,9 +139,6 @@ class VssTest(unittest.TestCase):
         self.assertEqual(json.loads(self.vss("list", "--json", self.show))["musicBytes"], 256 * 600)
         self.assertEqual(self.names(), ["small"])
         self.assertEqual(self.vss("music", "get", self.show, "-"), tune.read_bytes())
-        copied = self.folder / "copied"
-        self.vss("music", "get", self.show, copied)
-        self.assertEqual(copied.read_bytes(), tune.read_bytes())
         self.vss("music", "get", self.show, self.show, expect=REFUSED)
         self.vss("music", "remove", self.show)
         # The old end mark stays in front of the new one.
@@ -204,9 +164,8 @@ class VssTest(unittest.TestCase):
         for name, indices in zip(names, ((0, 1, 2, 3, 2, 1), (0, 1, 2, 3, 0, 0))):
             pixels = b"".join(bytes(colours[i]) for i in indices)
             self.assertEqual(pathlib.Path(name).read_bytes(), b"P6\n3 2\n255\n" + pixels)
-        for cut, code in ((-1, REFUSED), (-6, REFUSED)):
-            gif.write_bytes(gif.read_bytes()[:cut])
-            self.vss("frames", gif, shown, expect=code)
+        gif.write_bytes(gif.read_bytes()[:-6])
+        self.vss("frames", gif, shown, expect=REFUSED)
         self.vss("frames", self.small, shown, expect=REFUSED)
         self.vss("frames", self.folder / "absent.gif", shown, expect=CANNOT_OPEN)
         self.vss("frames", self.folder, shown, expect=CANNOT_OPEN)
@@ -227,13 +186,9 @@ class VssTest(unittest.TestCase):
         self.vss("get", self.show, 0, self.show, expect=REFUSED)
         self.assertEqual(self.show.read_bytes(), before)
 
-    def test_a_refused_picture_does_not_keep_out_the_next(self):
-        self.create()
+    def test_a_refused_picture_does_not_keep_out_the_next_ones(self):
+        self.create(*[self.small] * 18)
         self.vss("add", self.show, self.folder / "absent.jpg", self.small, expect=CANNOT_OPEN)
-        self.assertEqual(self.names(), ["small"])
-
-    def test_the_twenty_first_picture_is_refused(self):
-        self.create(*[self.small] * 19)
         self.vss("add", self.show, self.wide, self.tall, expect=REFUSED)
         self.assertEqual(self.names(), ["small"] * 19 + ["wide"])
         self.vss("insert", self.show, 0, self.tall, expect=REFUSED)
@@ -265,9 +220,6 @@ class VssTest(unittest.TestCase):
     def test_help_version_and_usage(self):
         self.assertIn(b"Exit codes", self.vss("--help"))
         self.assertRegex(self.vss("--version"), rb"^vss \d+\.\d+\.\d+\n$")
-        for command in ("create", "add", "insert", "remove", "list", "get", "thumb", "sheet", "music add",
-                        "music remove", "music get", "settings", "compact"):
-            self.assertIn(b"show", self.vss(*command.split(), "--help"))
         for wrong in ((), ("paint",), ("add", self.show), ("create", self.show, "--size", "480"),
                       ("create", self.show, "--size", "0x480"), ("create", "x" * 256),
                       ("get", self.show, "one", "-"), ("settings", self.show, "--loop", "2"), ("music", self.show), ("remove", self.show)):
