@@ -95,7 +95,6 @@ class Tasks : public testing::Test {
 TEST_F(Tasks, RefreshesUntilThePictureIsThere) {
   ASSERT_EQ(1, start(-1));
   const Bytes sharp = display_.content();
-  EXPECT_EQ(TAVIRPELO_ZOOM_DECODED, info_->pZoomInfo->decodeState);
   EXPECT_EQ(1, TAVIRPELO_StopZoom(info_.get()));
   EXPECT_EQ(0, tasks.created);
 
@@ -106,8 +105,6 @@ TEST_F(Tasks, RefreshesUntilThePictureIsThere) {
   EXPECT_EQ(1, refresh());  // notices that the decode runs
   EXPECT_EQ(1, refresh());  // draws, still decoding
   EXPECT_NE(sharp, display_.content());
-  EXPECT_EQ(1, TAVIRPELO_ControlZoom(info_.get(), display_.data(), 50, 50, TAVIRPELO_ZOOM_IN));
-  EXPECT_EQ(2, TAVIRPELO_ControlZoom(info_.get(), display_.data(), 50, 50, TAVIRPELO_ZOOM_OUT));
   gateOpen = true;
   int calls = 0;
   while (refresh() != 0) ASSERT_LT(++calls, 100000);
