@@ -4,8 +4,8 @@
 
 #include <algorithm>
 #include <numeric>
+#include <optional>
 
-#include "platform/fault_injection.h"
 #include "tests/slideshow/file_limit.h"
 #include "tests/slideshow/show_state.h"
 #include "tests/support/slideshow_files.h"
@@ -27,11 +27,6 @@ class MusicEntry : public testing::Test {
     }
     open();
   }
-  void TearDown() override {
-    allocations.arm(0);
-    containerCalls.arm(0);
-  }
-
   void open() {
     file.write(image.bytes());
     ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
@@ -88,28 +83,22 @@ TEST_F(MusicEntry, GoesInAndOutByteForByte) {
        {size_t{1}, size_t{5}, size_t{12}, size_t{13}, size_t{100}, size_t{628}, size_t{1000}, whole - 12,
         whole, whole + 1, size_t{131071}, size_t{131072}, size_t{131073}, size_t{300000}}) {
     open();
-    const Contents pictures = contents(show);
-    const Bytes music = tune(size);
+    const Bytes expected = with(tune(size));
     ASSERT_EQ(1, show.AddMusic(source.c_str())) << size;
-    const Bytes expected = with(music);
     ASSERT_EQ(expected, file.read()) << size;
     EXPECT_EQ(static_cast<int>(size), show.GetMusicSize());
-    EXPECT_EQ(pictures, contents(show));
-    EXPECT_EQ(pictures, reopened(file));
+    EXPECT_EQ(contents(show), reopened(file));
     char text[256];
     EXPECT_EQ(static_cast<int>(source.path().size()), show.GetMusic(text));
     EXPECT_EQ(source.path(), text);
-    // No second one.
-    ASSERT_EQ(0, show.AddMusic(source.c_str()));
+    ASSERT_EQ(0, show.AddMusic(source.c_str()));  // no second one
     ASSERT_EQ(expected, file.read());
 
     ASSERT_EQ(1, show.RemoveMusic()) << size;
     ASSERT_EQ(without(expected, size), file.read()) << size;
     EXPECT_EQ(0, show.GetMusicSize());
     EXPECT_EQ(0, show.GetMusic(text));
-    EXPECT_EQ(pictures, contents(show));
-    EXPECT_EQ(pictures, reopened(file));
-    ASSERT_EQ(0, show.RemoveMusic());
+    EXPECT_EQ(contents(show), reopened(file));
   }
 }
 
@@ -125,17 +114,12 @@ TEST_F(MusicEntry, RefusalsLeaveShowAndFileAlone) {
   EXPECT_EQ(0, show.RemoveMusic());
   EXPECT_TRUE(state == State(show));
   EXPECT_EQ(image.bytes(), file.read());
-  SlideShow other;
-  tune(9);
-  EXPECT_EQ(0, other.AddMusic(source.c_str()));
-  EXPECT_EQ(0, other.RemoveMusic());
 }
 
 TEST_F(MusicEntry, OfAShowThatHoldsNothingElse) {
   const Bytes music = tune(5);
   ASSERT_EQ(1, show.CreateShow(file.c_str(), 480, 480));
   ASSERT_EQ(1, show.AddMusic(source.c_str()));
-  EXPECT_EQ(5 + kHeaderBytes + kMarkBytes, file.read().size());
   ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
   EXPECT_EQ(5, show.GetMusicSize());
   // The container itself, whole, as its own music.
@@ -155,7 +139,6 @@ TEST_F(MusicEntry, IsOnlyNotedInMemory) {
   ASSERT_EQ(1, show.AddMusic(source.c_str()));
   EXPECT_EQ(1000, show.GetMusicSize());
   EXPECT_EQ(0, show.AddMusic(source.c_str()));
-  EXPECT_EQ(1, add_sample(show, 8, 8, "A"));
   ASSERT_EQ(1, show.RemoveMusic());
   EXPECT_EQ(0, show.GetMusicSize());
   EXPECT_STREQ("", show.musicName);
@@ -177,61 +160,40 @@ TEST_F(MusicEntry, IsOnlyNotedInMemory) {
   EXPECT_EQ(image.bytes(), file.read());
 }
 
-// The k-th file call fails: the old file or the new one, and an object that agrees.
-TEST_F(MusicEntry, GoesInDespiteAFailingCall) {
-  for (const long count : {1, 2}) {
-    for (const size_t size : {size_t{5}, size_t{1000}, size_t{140000}}) {
-      const Bytes after = with(tune(size));
-      bool hit = true;
-      for (long k = 1; hit; ++k) {
-        ASSERT_LT(k, 2000);
-        open();
-        const State state(show);
-        containerCalls.arm(k, count);
-        const int result = show.AddMusic(source.c_str());
-        hit = containerCalls.calls >= k;
-        containerCalls.arm(0);
-        ASSERT_EQ(result == 1 ? after : image.bytes(), file.read()) << size << " " << k;
-        ASSERT_TRUE(result == 1 || state == State(show)) << size << " " << k;
-        ASSERT_EQ(contents(show), reopened(file)) << size << " " << k;
-      }
-      EXPECT_EQ(after, file.read());
-    }
-  }
-}
-
-// Going out, a call that fails twice may cost the music but no picture.
-TEST_F(MusicEntry, GoesOutDespiteAFailingCall) {
+// The k-th file call fails: the old file or the new one, and an object that agrees. Going out, a call
+// that fails twice may cost the music but no picture.
+TEST_F(MusicEntry, GoesInAndOutDespiteAFailingCall) {
   for (const long count : {1, 2, 3}) {
     for (const size_t size : {size_t{5}, size_t{1000}, size_t{140000}}) {
-      tune(size);
-      open();
-      ASSERT_EQ(1, show.AddMusic(source.c_str()));
-      const Bytes before = file.read(), after = without(before, size);
-      bool hit = true;
-      for (long k = 1; hit; ++k) {
-        ASSERT_LT(k, 2000);
-        file.write(before);
+      const Bytes bare = image.bytes(), full = with(tune(size)), after = without(full, size);
+      std::optional<State> state;
+      const auto prepare = [&](const Bytes& bytes) {
+        file.write(bytes);
         ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
         ASSERT_EQ(1, show.RemoveImage(1));
-        const State state(show);
-        containerCalls.arm(k, count);
-        const int result = show.RemoveMusic();
-        hit = containerCalls.calls >= k;
-        containerCalls.arm(0);
-        Bytes left = file.read();
-        if (result == 1) {
-          ASSERT_EQ(after, left) << size << " " << k;
-        } else {
-          ASSERT_TRUE(state == State(show)) << size << " " << k;
-          const size_t same = count == 1 ? 0 : size;
-          ASSERT_TRUE(left.size() == before.size() &&
-                      std::equal(left.begin() + static_cast<ptrdiff_t>(same), left.end(),
-                                 before.begin() + static_cast<ptrdiff_t>(same)))
-              << size << " " << k;
-        }
-        ASSERT_EQ(contents(show), reopened(file)) << size << " " << k;
-      }
+        state.emplace(show);
+      };
+      fail_at_each(
+          containerCalls, std::min(count, 2L), [&] { prepare(bare); },
+          [&] { return show.AddMusic(source.c_str()); },
+          [&](int result) {
+            ASSERT_EQ(result == 1 ? full : bare, file.read()) << size;
+            ASSERT_TRUE(result == 1 || *state == State(show)) << size;
+            ASSERT_EQ(contents(show), reopened(file)) << size;
+          });
+      EXPECT_EQ(full, file.read());
+      fail_at_each(
+          containerCalls, count, [&] { prepare(full); }, [&] { return show.RemoveMusic(); },
+          [&](int result) {
+            Bytes expected = result == 1 ? after : full, left = file.read();
+            if (result != 1 && count > 1 && left.size() == full.size()) {
+              std::copy_n(left.begin(), size, expected.begin());
+            }
+            ASSERT_EQ(expected, left) << size;
+            ASSERT_TRUE(result == 1 || *state == State(show)) << size;
+            ASSERT_EQ(contents(show), reopened(file)) << size;
+          });
+      EXPECT_EQ(after, file.read());
     }
   }
 }
@@ -250,21 +212,18 @@ TEST_F(MusicEntry, GoesInOnlyWithRoomOnTheDisk) {
 }
 
 TEST_F(MusicEntry, NeedsItsMemory) {
-  const Bytes after = with(tune(1000));
-  const State state(show);
-  for (long k = 1;; ++k) {
-    allocations.arm(k);
-    if (show.AddMusic(source.c_str()) == 1) break;
-    ASSERT_TRUE(state == State(show)) << k;
-    ASSERT_EQ(image.bytes(), file.read()) << k;
-  }
-  EXPECT_EQ(after, file.read());
-  const State full(show);
-  for (long k = 1;; ++k) {
-    allocations.arm(k);
-    if (show.RemoveMusic() == 1) break;
-    ASSERT_TRUE(full == State(show)) << k;
-    ASSERT_EQ(after, file.read()) << k;
+  const Bytes bare = image.bytes(), full = with(tune(1000));
+  for (const bool goesIn : {true, false}) {
+    const State state(show);
+    const auto edit = [&] { return goesIn ? show.AddMusic(source.c_str()) : show.RemoveMusic(); };
+    fail_at_each(
+        allocations, 1, [] {}, edit,
+        [&](int result) {
+          if (result == 1) return;
+          ASSERT_TRUE(state == State(show));
+          ASSERT_EQ(goesIn ? bare : full, file.read());
+        });
+    EXPECT_EQ(goesIn ? full : without(full, 1000), file.read());
   }
 }
 

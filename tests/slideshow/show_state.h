@@ -1,12 +1,16 @@
-// A copy of everything that a failed edit must leave alone.
+// What a failed edit must leave alone, and edits that fail at each of their calls.
 #pragma once
+
+#include <gtest/gtest.h>
 
 #include <algorithm>
 #include <array>
+#include <functional>
 #include <iterator>
 #include <tuple>
 #include <vector>
 
+#include "platform/fault_injection.h"
 #include "slideshow/SlideShow.h"
 
 namespace tests {
@@ -36,5 +40,23 @@ struct State {
                       [](const subfileInfo& x, const subfileInfo& y) { return facts(x) == facts(y); });
   }
 };
+
+// Runs `edit` with its k-th call failing and `count` - 1 after it, for each k until none is reached, and
+// hands its results to `check`.
+inline void fail_at_each(pelo::faults::Counter& counter, long count,
+                         const std::function<void()>& prepare, const std::function<int()>& edit,
+                         const std::function<void(int)>& check) {
+  bool hit = true;
+  for (long k = 1; hit; ++k) {
+    ASSERT_LT(k, 2000);
+    prepare();
+    counter.arm(k, count);
+    const int result = edit();
+    hit = counter.calls >= k;
+    counter.arm(0);
+    check(result);
+    ASSERT_FALSE(testing::Test::HasFailure()) << k;
+  }
+}
 
 }  // namespace tests
