@@ -3,8 +3,6 @@ package com.tavir.slideshow;
 import java.awt.image.BufferedImage;
 import java.io.ByteArrayOutputStream;
 import java.io.IOException;
-import java.nio.ByteBuffer;
-import java.nio.ByteOrder;
 import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
 import java.nio.file.Path;
@@ -40,11 +38,6 @@ final class Samples {
             near &= Math.abs((pixel >> shift & 0xFF) - (colour >> shift & 0xFF)) < 8;
         }
         return near;
-    }
-
-    /** The number at an offset of a file. */
-    static int number(Path file, int offset) throws IOException {
-        return ByteBuffer.wrap(Files.readAllBytes(file)).order(ByteOrder.LITTLE_ENDIAN).getInt(offset);
     }
 
     /** The text of the 256-byte field at an offset of a file, a char for each byte. */
