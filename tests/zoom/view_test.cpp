@@ -143,9 +143,8 @@ void expect_sound(const Zoom& z, Size display) {
   const Size most = largest_zoomed(z);
   ASSERT_TRUE(z.minWidth >= 1 && z.minWidth <= z.zoomedWidth && z.zoomedWidth <= most.width);
   ASSERT_TRUE(z.minHeight >= 1 && z.minHeight <= z.zoomedHeight && z.zoomedHeight <= most.height);
-  ASSERT_TRUE(z.viewWidth >= 1 && z.viewHeight >= 1);
-  ASSERT_TRUE(z.viewX >= 0 && z.viewX <= z.zoomedWidth - z.viewWidth);
-  ASSERT_TRUE(z.viewY >= 0 && z.viewY <= z.zoomedHeight - z.viewHeight);
+  ASSERT_TRUE(z.viewWidth >= 1 && z.viewX >= 0 && z.viewX <= z.zoomedWidth - z.viewWidth);
+  ASSERT_TRUE(z.viewHeight >= 1 && z.viewY >= 0 && z.viewY <= z.zoomedHeight - z.viewHeight);
   ASSERT_GE(z.zoomRatio, 100);
   for (const Size shown : {Size{z.viewWidth, z.viewHeight}, Size{1, 1}}) {
     const Area r = visible_region(z, shown);
