@@ -1,9 +1,11 @@
 // Every file call and every allocation failing in turn, and a disk that is full: nothing is lost.
 #include <gtest/gtest.h>
+#include <sys/resource.h>
+
+#include <csignal>
 
 #include "platform/android_log.h"
 #include "platform/fault_injection.h"
-#include "tests/slideshow/file_limit.h"
 #include "tests/slideshow/show_state.h"
 #include "tests/support/slideshow_files.h"
 
@@ -90,6 +92,26 @@ TEST_F(Failure, UndoingNeedsNoMemory) {
     EXPECT_LE(allocations.calls, needed) << k;
   }
 }
+
+// A disk that is full: while one of these lives, no write gets past that length of a file.
+class FileLimit {
+ public:
+  explicit FileLimit(size_t length) : signal_(std::signal(SIGXFSZ, SIG_IGN)) {
+    getrlimit(RLIMIT_FSIZE, &before_);
+    const rlimit limit{length, before_.rlim_max};
+    setrlimit(RLIMIT_FSIZE, &limit);
+  }
+  ~FileLimit() {
+    setrlimit(RLIMIT_FSIZE, &before_);
+    std::signal(SIGXFSZ, signal_);
+  }
+  FileLimit(const FileLimit&) = delete;
+  FileLimit& operator=(const FileLimit&) = delete;
+
+ private:
+  void (*signal_)(int);
+  rlimit before_;
+};
 
 // A limit on the file's length fails every write beyond it, the flush at closing included.
 TEST_F(Failure, OfAFullDisk) {

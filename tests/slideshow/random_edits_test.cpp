@@ -21,19 +21,15 @@ class Model {
     const int count = static_cast<int>(states_.size());
     switch (pick(8)) {
       case 0:
-      case 1:
-        return insert(count);
-      case 2:
-        return insert(pick(count + 1));
-      case 3:
-      case 4:
-        return mark(pick(count + 1) - 1);
-      case 5:
         return compact();
-      case 6:
-        return image_.music.empty() ? add_music() : remove_music();
-      default:
+      case 1:
         return reopen();
+      case 2:
+        return image_.music.empty() ? add_music() : remove_music();
+      case 3:
+        return insert(pick(count + 1));
+      default:
+        return pick(2) ? insert(count) : mark(pick(count + 1) - 1);
     }
   }
 

@@ -71,18 +71,14 @@ TEST_F(Removal, MarksStayInMemoryAndDrawable) {
 
 TEST_F(Removal, OtherShowsRefuse) {
   SlideShow other;
-  EXPECT_EQ(0, other.RemoveSubfile());
-  EXPECT_EQ(0, other.RemoveImage(0));
   ASSERT_EQ(1, other.CreateShow(nullptr, 480, 480));
   ASSERT_EQ(1, add_sample(other, 8, 8, "memory"));
   EXPECT_EQ(0, other.RemoveImage(0));
   EXPECT_EQ(0, other.RemoveSubfile());
-  EXPECT_EQ(1, other.subfileCount);
   // A container without a picture gets its end mark.
   ASSERT_EQ(1, show.CreateShow(file.c_str(), 480, 480));
   EXPECT_EQ(1, show.RemoveSubfile());
   EXPECT_EQ(kHeaderBytes + kMarkBytes, file.read().size());
-  EXPECT_EQ(0u, reopened(file).size());
 }
 
 // A file that someone else changed behind the open show is left alone.
@@ -91,10 +87,6 @@ TEST_F(Removal, RefusesAFileThatChangedMeanwhile) {
   const State state(show);
   Bytes other = image.bytes();
   set_number(other, static_cast<size_t>(show.subfiles[3].offset) + 532, 541);
-  file.write(other);
-  EXPECT_EQ(0, show.RemoveSubfile());
-  EXPECT_EQ(other, file.read());
-  other.resize(static_cast<size_t>(show.subfiles[4].offset) + 600);
   file.write(other);
   EXPECT_EQ(0, show.RemoveSubfile());
   EXPECT_EQ(other, file.read());
