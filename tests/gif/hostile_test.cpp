@@ -164,6 +164,7 @@ TEST(GifHostile, MemoryRunsOutAtEveryAllocation) {
                 EXPECT_EQ(0, answer);
                 if (decInfo) EXPECT_EQ(nullptr, decInfo->pFormatInfo);
               }));
+    TAVIRPELOI_AborAGIF(decInfo.get());
   }
 }
 
