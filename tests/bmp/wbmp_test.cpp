@@ -78,6 +78,7 @@ TEST(WBmp, DamagedAndShort) {
   EXPECT_EQ(0, answer({1, 0, 1, 1, 0}));
   EXPECT_EQ(0, answer({0, 0x80, 1, 1, 0}));
   EXPECT_EQ(0, answer({0, 0, 0x81, 0x80, 0x80, 0x80, 0x00, 1, 0}));  // more than 28 bits
+  EXPECT_EQ(0, answer({0, 0, 0x80, 0x80, 0x80, 0x80, 0x01, 1, 0}));
   EXPECT_EQ(0, answer({0, 0, 0xFF, 0xFF, 0xFF, 0x7F, 0xFF, 0xFF, 0xFF, 0x7F, 0}));
   EXPECT_EQ(1, answer({0, 0, 0, 5, 0}));  // no pixels
   uint8_t pixel[3];

@@ -131,14 +131,15 @@ TEST(GifReference, AnimationsComposed) {
     return static_cast<int>((seed >> 8) % static_cast<uint32_t>(below));
   };
   const auto put = [](Bytes& canvas, int x, int y, const Rgba& c) {
+    if (x >= 50 || y >= 31) return;  // beyond the screen
     canvas = overwritten(std::move(canvas), static_cast<size_t>(4 * (y * 50 + x)), pixel_bytes(c, 7));
   };
   for (int round = 0; round < 30; ++round) {
     GifFile file{50, 31, sample_palette(16), {}, 5, "89a", true};
     for (int i = 0; i < 6; ++i) {
-      GifImage image{.left = random(45), .top = random(28)};
-      image.width = 1 + random(50 - image.left);
-      image.height = 1 + random(31 - image.top);
+      GifImage image{.left = random(52), .top = random(33)};
+      image.width = 1 + random(60 - image.left);
+      image.height = 1 + random(40 - image.top);
       image.indices = sample_indices(image.width, image.height, 16, seed);
       image.interlaced = random(2) == 1;
       image.lzw.minimumCodeSize = 4;
