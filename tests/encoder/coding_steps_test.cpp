@@ -94,38 +94,6 @@ TEST(Blocks, CostliestMcusNeverOverrunTheBuffer) {
   EXPECT_GT(encoder.finish().size(), 200u * 10 * 190);
 }
 
-// Streams are coded in turn by exchanging destination and entropy state.
-TEST(Blocks, StreamsInTurnEqualStreamsOneAfterAnother) {
-  struct Stream {
-    ELO_DESTINATION destination{ELO_TO_MEMORY, 0, 0, 0, nullptr, nullptr};
-    EntropyCoderState state{};
-  } inTurn[2], alone[2];
-  BlockEncoder encoder(8, 8, TAVIRPELO_GREY8, nullptr);
-  ELO_ENCODER& e = *encoder.get();
-  ELO_DESTINATION* const own = e.destination;
-  const auto code = [&](Stream& stream, int s, int i) {
-    CoefficientBlock block{};
-    for (int k = 0; k < 64; k += 1 + s) block[k] = (k * 37 + i * 11 + s) % 63 - 31;
-    e.destination = &stream.destination;
-    e.entropy = stream.state;
-    EXPECT_EQ(
-        1, i < 40 ? __elo_jpeg_enc_encode_1mcu_blk(&e, &block) : __elo_jpeg_enc_finish_compression(&e));
-    stream.state = e.entropy;
-  };
-  for (int i = 0; i <= 40; ++i) {
-    for (int s = 0; s < 2; ++s) code(inTurn[s], s, i);
-  }
-  for (int s = 0; s < 2; ++s) {
-    for (int i = 0; i <= 40; ++i) code(alone[s], s, i);
-    ELO_DESTINATION &a = inTurn[s].destination, &b = alone[s].destination;
-    EXPECT_LT(0, a.used);
-    EXPECT_EQ(Bytes(a.buffer, a.buffer + a.used), Bytes(b.buffer, b.buffer + b.used));
-    discard(a);
-    discard(b);
-  }
-  e.destination = own;
-}
-
 // Partly covered blocks code as those of a picture whose last column and row are drawn on.
 TEST(Edges, RepeatTheLastColumnAndRow) {
   for (const auto& [format, bytes, scan] : {std::tuple(TAVIRPELO_RGB565, 2, 623u),
@@ -144,24 +112,6 @@ TEST(Edges, RepeatTheLastColumnAndRow) {
     const Bytes covered = encode_pixels(small, width, height, format, {95, nullptr, 0});
     EXPECT_EQ(suffix(whole, scan), suffix(covered, scan)) << format;
   }
-}
-
-TEST(Parameters, OfAnotherPictureReachTheHeaders) {
-  CodingParameters parameters{3, {{{2, 2, 1}, {3, 1, 1}, {2, 1, 1}}}, {}, true};
-  for (size_t t = 0; t < kQuantTables; ++t) parameters.quant[t].fill(static_cast<uint8_t>(t + 1));
-  BlockEncoder encoder(33, 9, TAVIRPELO_YUV420, &parameters);
-  const Bytes jpeg = encoder.finish();
-  const size_t first = find_marker(jpeg, 0xDB), second = find_marker(jpeg, 0xDB, first + 69);
-  ASSERT_LT(second, jpeg.size());
-  EXPECT_EQ(2, jpeg[first + 4]);
-  EXPECT_EQ(3, jpeg[first + 5]);
-  EXPECT_EQ(3, jpeg[second + 4]);
-  EXPECT_EQ(jpeg.size(), find_marker(jpeg, 0xDB, second + 69));
-  const size_t frame = find_marker(jpeg, 0xC0);
-  EXPECT_EQ((Bytes{1, 0x21, 2, 2, 0x11, 3, 3, 0x11, 2}), Bytes(&jpeg[frame + 10], &jpeg[frame + 19]));
-  const size_t restart = find_marker(jpeg, 0xDD);
-  ASSERT_LT(restart, jpeg.size());
-  EXPECT_EQ(3, pelo::load_be16(&jpeg[restart + 4]));  // MCUs of 16 pixels in 33
 }
 
 TEST(Parameters, BeyondBaselineAreRefused) {

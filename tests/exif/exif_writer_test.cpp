@@ -52,28 +52,6 @@ TEST(ExifWriter, WithoutStringsItIsThisSegment) {
   EXPECT_EQ(expected, write_segment(content));
 }
 
-TEST(ExifWriter, StringsAndThumbnailComeBack) {
-  const Bytes thumbnail = sample_thumbnail();
-  const Bytes tiff = write_tiff(full_content(thumbnail));
-  // Values in the order of their entries, without padding; the thumbnail directory follows them.
-  const size_t values = 110 + 6 + 12 + 16 + 20;
-  ASSERT_EQ(values + 106 + thumbnail.size(), tiff.size());
-  EXPECT_EQ(Bytes(ByteWriter().text({"Maker\0some models", 18})), prefix(suffix(tiff, 110), 18));
-  EXPECT_EQ(thumbnail, suffix(tiff, values + 106));
-
-  const Bytes segment = write_segment(full_content(thumbnail));
-  TAVIRPELO_EXIFINFO* info =
-      PELOJ_CreatExifInfoUseExifBuffer(segment.data(), static_cast<int>(segment.size()));
-  ASSERT_NE(nullptr, info);
-  EXPECT_STREQ("Maker", info->make);
-  EXPECT_STREQ("some models", info->model);
-  const TAVIRPELO_EXIFTHUMBNAIL& t = info->thumbnail;
-  EXPECT_EQ((std::vector<size_t>{6, 72, 2, 6, 20, thumbnail.size(), segment.size() - thumbnail.size()}),
-            (std::vector<size_t>{info->orientation, info->xResolution.numerator, info->ycbcrPositioning,
-                                 t.compression, t.width, t.length, t.offset}));
-  TAVIRPELO_DestroyJpegExifInfo(info);
-}
-
 // Texts stand in the value area whatever their length; none leaves an empty entry.
 TEST(ExifWriter, ShortAndAbsentTexts) {
   ELO_EXIFCONTENT content{};

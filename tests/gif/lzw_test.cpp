@@ -80,28 +80,6 @@ TEST(GifLzw, LargeMinimumCodeSizes) {
   }
 }
 
-// Rows that no output row is made of are counted, not written; what follows them is the same.
-TEST(GifLzw, SkippedRowsLeaveNoTrace) {
-  for (int round = 0; round < 40; ++round) {
-    const int width = 1 + round * round % 113, height = 200;
-    GifFile file = sample_gif(width, height, 2 + round % 7, round % 3 == 1);
-    if (round % 5 == 0) file.images[0].indices.assign(static_cast<size_t>(width * height), 1);
-    for (size_t y = 0; y < height; y += 25) file.images[0].indices[y * static_cast<size_t>(width)] = 2;
-    file.images[0].lzw.deferClear = round % 2 == 1;
-    for (const int rows : {1, 3, 7, 64}) {
-      const Bytes bytes = file.bytes();
-      const Decode some = decode_gif(bytes, width, rows, 7, 0x700);
-      const Decode all = decode_gif(bytes, width, height);
-      Bytes want;
-      for (int y = 0; y < rows; ++y) {
-        const auto first = static_cast<size_t>(position(y, height, rows, height / 2) * width * 4);
-        append(want, prefix(suffix(all.pixels, first), static_cast<size_t>(width) * 4));
-      }
-      ASSERT_EQ(want, some.pixels) << round << " " << rows;
-    }
-  }
-}
-
 TEST(GifLzw, StepsThatOtherCallersUse) {
   static pelo::gif::TranslationTable table;
   EXPECT_EQ(0, PELOI_InitializeTransTBL(12, &table));

@@ -128,25 +128,6 @@ TEST(ReEncode, GainsAndScales) {
   }
 }
 
-TEST(ReEncode, TablesGrowWithTheGain) {
-  pelo::jpeg::TransformParameters parameters{};
-  parameters.tableCount = 2;
-  parameters.numbers = {0, 1};
-  for (auto& ratios : parameters.ratio) ratios.fill(1024);
-  for (int n = 0; n < 2; ++n) parameters.coding.quant[static_cast<size_t>(n)].fill(1);
-  EXPECT_EQ(pelo::jpeg::Coarsening::kDone, __elo_set_qunat_table(&parameters, 512));
-  // At a scale of 16 the tables of Annex K are divided by 8.
-  EXPECT_EQ(2, parameters.coding.quant[0][0]);
-  EXPECT_EQ(12, parameters.coding.quant[1][63]);  // 99 at an eighth of 17 / 17 and a half
-  EXPECT_EQ(512, parameters.ratio[0][0]);
-  int steps = 0;
-  while (__elo_set_qunat_table(&parameters, 300) == pelo::jpeg::Coarsening::kDone)
-    ASSERT_LT(++steps, 20);
-  EXPECT_LT(0, steps);
-  parameters.tableCount = 3;
-  EXPECT_EQ(pelo::jpeg::Coarsening::kFailed, __elo_set_qunat_table(&parameters, 1024));
-}
-
 #ifdef TAVIR_HAVE_LIBJPEG
 
 TEST(ReEncode, ProgressiveSources) {
