@@ -7,7 +7,6 @@
 #include <optional>
 
 #include "tests/slideshow/show_state.h"
-#include "tests/support/slideshow_files.h"
 
 namespace tests {
 namespace {
@@ -16,20 +15,11 @@ using pelo::faults::allocations;
 using pelo::faults::containerCalls;
 
 // Three pictures without music, the second marked for removal in memory.
-class MusicEntry : public testing::Test {
+class MusicEntry : public StoredShow {
  protected:
-  void SetUp() override {
-    image.path = file.path();
+  MusicEntry() : StoredShow({40, 8, 64}) {
     image.loop = 1;
-    for (const auto& [name, side] : {std::pair{"P", 40}, {"Q", 8}, {"R", 64}}) {
-      image.pictures.push_back({name, "", side, side, 0, encode_own(side, side, 80)});
-    }
-    open();
-  }
-  void open() {
-    file.write(image.bytes());
-    ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
-    ASSERT_EQ(1, show.RemoveImage(1));
+    open({1});
   }
   Bytes tune(size_t size) {
     Bytes bytes(size);
@@ -69,9 +59,7 @@ class MusicEntry : public testing::Test {
     return bytes;
   }
 
-  TempFile file, source{".tune"};
-  ContainerImage image;
-  SlideShow show;
+  TempFile source{".tune"};
 };
 
 TEST_F(MusicEntry, GoesInAndOutByteForByte) {
@@ -79,7 +67,7 @@ TEST_F(MusicEntry, GoesInAndOutByteForByte) {
   for (const size_t size :
        {size_t{1}, size_t{5}, size_t{12}, size_t{13}, size_t{100}, size_t{628}, size_t{1000}, whole - 12,
         whole, whole + 1, size_t{131071}, size_t{131072}, size_t{131073}, size_t{300000}}) {
-    open();
+    open({1});
     const Bytes expected = with(tune(size));
     ASSERT_EQ(1, show.AddMusic(source.c_str())) << size;
     ASSERT_EQ(expected, file.read()) << size;
@@ -151,7 +139,7 @@ TEST_F(MusicEntry, IsOnlyNotedInMemory) {
       ASSERT_EQ(1, show.RemoveMusic());
     }
   }
-  open();
+  open({1});
   ASSERT_EQ(0, truncate(source.c_str(), 0x7FFFFFFF));
   EXPECT_EQ(0, show.AddMusic(source.c_str()));  // no room for the pictures behind it
   EXPECT_EQ(image.bytes(), file.read());

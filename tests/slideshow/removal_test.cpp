@@ -4,7 +4,6 @@
 #include <optional>
 
 #include "tests/slideshow/show_state.h"
-#include "tests/support/slideshow_files.h"
 
 namespace tests {
 namespace {
@@ -13,24 +12,14 @@ using pelo::faults::allocations;
 using pelo::faults::containerCalls;
 
 // Five pictures of different lengths behind some music, as an earlier session left them.
-class Removal : public testing::Test {
+class Removal : public StoredShow {
  protected:
-  void SetUp() override {
-    image.path = file.path();
+  Removal() : StoredShow({40, 8, 64, 16, 24}) {
     image.musicPath = "tune";
     image.music = Bytes(50, 'm');
     image.interval = 3;
-    for (const auto& [name, side] : {std::pair{"P", 40}, {"Q", 8}, {"R", 64}, {"S", 16}, {"T", 24}}) {
-      image.pictures.push_back(
-          {name, std::string(name) + ".jpg", side, side, 0, encode_own(side, side, 80)});
-    }
     image.staleMarks = 1;
-    open();
-  }
-  void open(const std::vector<int>& marks = {}) {
-    file.write(image.bytes());
-    ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
-    for (const int index : marks) ASSERT_EQ(1, show.RemoveImage(index));
+    open({});
   }
   // The file after compaction: without the marked pictures and without stale end marks.
   ContainerImage without(const std::vector<int>& marks) const {
@@ -40,9 +29,6 @@ class Removal : public testing::Test {
     for (auto& picture : rest.pictures) picture.state &= ~1;
     return rest;
   }
-  TempFile file;
-  ContainerImage image;
-  SlideShow show;
 };
 
 const std::vector<int> kMarkings[] = {{},     {0},       {1},       {4},       {0, 1},

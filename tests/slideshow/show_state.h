@@ -11,7 +11,7 @@
 #include <vector>
 
 #include "platform/fault_injection.h"
-#include "slideshow/SlideShow.h"
+#include "tests/support/slideshow_files.h"
 
 namespace tests {
 
@@ -39,6 +39,27 @@ struct State {
            std::equal(entries.begin(), entries.end(), other.entries.begin(), other.entries.end(),
                       [](const subfileInfo& x, const subfileInfo& y) { return facts(x) == facts(y); });
   }
+};
+
+// A show that an earlier session left in a file: square pictures of these sides, and what a test adds.
+class StoredShow : public testing::Test {
+ protected:
+  explicit StoredShow(const std::vector<int>& sides) {
+    image.path = file.path();
+    for (const int side : sides) {
+      image.pictures.push_back({"picture " + std::to_string(side), std::to_string(side) + ".jpg", side,
+                                side, 0, encode_own(side, side, 80)});
+    }
+  }
+  void open(const std::vector<int>& marks) {
+    file.write(image.bytes());
+    ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
+    for (const int index : marks) ASSERT_EQ(1, show.RemoveImage(index));
+  }
+
+  TempFile file;
+  ContainerImage image;
+  SlideShow show;
 };
 
 // Runs `edit` with its k-th call failing and `count` - 1 after it, for each k until none is reached, and
