@@ -126,6 +126,18 @@ class PeloTest(ToolTest):
         self.pelo("decode", self.photo, file)
         self.assertEqual(Pixmap(file.read_bytes()).pixels, picture.pixels)
 
+    def test_bitmaps_and_gifs_of_djpeg(self):
+        """An independent program's files, of 24 bits and with palettes, pixel for pixel."""
+        file = self.folder / "picture"
+        for options in (("-bmp",), ("-bmp", "-colors", "16"), ("-bmp", "-grayscale"),
+                        ("-gif", "-colors", "64")):
+            expected = [o for o in options if o[1:] not in ("bmp", "gif")]
+            pnm = subprocess.run(["djpeg", "-pnm", "-rgb", *expected, self.photo], capture_output=True, check=True)
+            file.write_bytes(subprocess.run(["djpeg", *options, self.photo], capture_output=True, check=True).stdout)
+            want, got = Pixmap(pnm.stdout), self.decode(file, "-")
+            pixels = want.pixels if want.channels == 3 else bytes(v for v in want.pixels for _ in range(3))
+            self.assertEqual(got.pixels, pixels, options)
+
     def test_sizes_and_fits(self):
         for options, expected in ((("80x80",), (80, 60)), (("1000x1000",), (160, 120)),
                                   (("50x70", "--rotate", 90), (50, 66)), (("90x50", "--fit", "pad"), (90, 50))):

@@ -63,18 +63,23 @@ Size fit_inside(Size picture, Size box) {
   return size;
 }
 
-// Size of the result, as it is seen after the rotation.
-Size result_size(const Options& options, const TAVIRPELO_HINFO& header) {
-  Size picture{header.width, header.height};
-  if (sideways(options)) picture = turned(picture);
-  if (options.size.width == 0) return picture;
-  return options.fit == Fit::kInside ? fit_inside(picture, options.size) : options.size;
+// The picture's own size as it is seen after the rotation.
+Size own_size(const Options& options, const TAVIRPELO_HINFO& header) {
+  const Size picture{header.width, header.height};
+  return sideways(options) ? turned(picture) : picture;
 }
 
-uint32_t option_word(const Options& options) {
-  uint32_t fit = options.fit == Fit::kFill  ? TAVIRPELO_FIT_FILL
-                 : options.fit == Fit::kPad ? TAVIRPELO_FIT_INSIDE
-                                            : TAVIRPELO_FIT_STRETCH;
+// Size of the result, after the rotation as well.
+Size result_size(const Options& options, Size own) {
+  if (options.size.width == 0) return own;
+  return options.fit == Fit::kInside ? fit_inside(own, options.size) : options.size;
+}
+
+// A picture of its own size is not stretched: some decoders average even then.
+uint32_t option_word(const Options& options, bool ownSize) {
+  uint32_t fit = options.fit == Fit::kFill             ? TAVIRPELO_FIT_FILL
+                 : options.fit == Fit::kPad || ownSize ? TAVIRPELO_FIT_INSIDE
+                                                       : TAVIRPELO_FIT_STRETCH;
   return fit | options.thumbnail | static_cast<uint32_t>(options.rotation / 90) << 2;
 }
 
@@ -115,7 +120,8 @@ Exit run(const Options& options) {
   if (jpegOnly && input.format() != TAVIRPELO_FORMAT_JPEG) {
     return fail(Exit::kRefused, "{}: only a JPEG decodes to this format", options.picture);
   }
-  Size size = result_size(options, input.header());
+  const Size own = own_size(options, input.header());
+  Size size = result_size(options, own);
   if (size.width < 1 || size.height < 1 || std::max(size.width, size.height) > kMaxSide) {
     return fail(Exit::kRefused, "{}: a result of {}x{}, sides go up to {}", options.picture, size.width,
                 size.height, kMaxSide);
@@ -123,7 +129,8 @@ Exit run(const Options& options) {
   std::vector<uint8_t> pixels(byte_count(size, format));
   TAVIRPELO_RAWINFO raw{static_cast<uint32_t>(size.width), static_cast<uint32_t>(size.height),
                         pixels.data(), static_cast<uint32_t>(format)};
-  if (!input.decode(raw, option_word(options), options.mode)) {
+  if (!input.decode(raw, option_word(options, size.width == own.width && size.height == own.height),
+                    options.mode)) {
     return fail(Exit::kRefused, "{}: this picture cannot be decoded", options.picture);
   }
   return write_result(options, size, std::move(pixels));
