@@ -129,10 +129,7 @@ bool read_headers(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
 // ---- output ----
 
 void choose_size(PELOI_BMPRECORD& record) {
-  const uint32_t rotation = record.option & TAVIRPELO_ROTATE_MASK;
-  const bool sideways = rotation == TAVIRPELO_ROTATE_90 || rotation == TAVIRPELO_ROTATE_270;
-  Size box{record.requestWidth, record.requestHeight};
-  if (sideways) std::swap(box.width, box.height);
+  const Size box = turned({record.requestWidth, record.requestHeight}, record.option);
   const Size picture{record.width, record.height};
   Size out = box;
   if ((record.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_STRETCH) {

@@ -17,10 +17,7 @@ int64_t first_row(const Sampling& s, int64_t screenRow) {
 }  // namespace
 
 Size box_of(const Record& record) {
-  const uint32_t rotation = record.option & TAVIRPELO_ROTATE_MASK;
-  const bool sideways = rotation == TAVIRPELO_ROTATE_90 || rotation == TAVIRPELO_ROTATE_270;
-  const Size buffer = record.request.buffer;
-  return sideways ? Size{buffer.height, buffer.width} : buffer;
+  return turned(record.request.buffer, record.option);
 }
 
 Size fit_screen(Size screen, Size box, uint32_t option) {
@@ -92,8 +89,8 @@ OutputGrid grid_of(const Record& record, void* output) {
 
 OutputGrid line_grid_of(const Record& record, void* output) {
   const Placement placed = place(record.request.buffer, record.picture, record.option);
-  const Size buffer{static_cast<int>(placed.pitch), record.lines};
-  return OutputGrid(output, buffer, placed.x, 0, bytes_per_pixel(record.request.format));
+  return OutputGrid(output, {placed.buffer.width, record.lines}, placed.left, 0,
+                    bytes_per_pixel(record.request.format));
 }
 
 }  // namespace pelo::gif

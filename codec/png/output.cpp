@@ -137,15 +137,10 @@ void write_interlaced(PELOI_PNGCONTEXT& context, const uint8_t* row) {
 
 // ---- set-up ----
 
-bool sideways(const PELOI_PNGCONTEXT& context) {
-  return context.rotation == 90 || context.rotation == 270;
-}
-
 void choose_size(PELOI_PNGCONTEXT& context) {
   const Request& request = context.request;
   const int64_t width = context.info.width, height = context.info.height;
-  Size box{request.width, request.height};
-  if (sideways(context)) std::swap(box.width, box.height);
+  const Size box = turned({request.width, request.height}, request.option);
   const bool stretch = (request.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_STRETCH;
   const Size size = stretch ? box : fit_by_ratio(width, height, box);
   context.output.width = static_cast<uint32_t>(size.width);
@@ -209,10 +204,10 @@ void aim_output(PELOI_PNGCONTEXT& context, void* bytes, int lines) {
   const Request& request = context.request;
   const auto width = static_cast<int>(output.width), height = static_cast<int>(output.height);
   const bool tight = (request.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT;
-  const Size turned = sideways(context) ? Size{height, width} : Size{width, height};
+  const Size shown = turned({width, height}, request.option);
   Size box = tight ? Size{width, height} : Size{request.width, request.height};
-  const int64_t x = tight ? 0 : (int64_t{request.width} - turned.width) / 2;
-  int64_t y = tight ? 0 : (int64_t{request.height} - turned.height) / 2;
+  const int64_t x = tight ? 0 : (int64_t{request.width} - shown.width) / 2;
+  int64_t y = tight ? 0 : (int64_t{request.height} - shown.height) / 2;
   output.base = 0;
   output.stop = 0;
   if (lines > 0) {  // the buffer receives these rows alone

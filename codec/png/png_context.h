@@ -67,7 +67,6 @@ typedef struct PELOI_PNGCONTEXT : pelo::FormatState {
   PELOI_PNGINFO info;
   pelo::png::Request request;
   uint32_t iterFlag;
-  int rotation;  // degrees
   PELOI_PNGREADBUFFER reader;
   bool inputReady;     // memory: chunks merged
   uint32_t idatEntry;  // other sources: the entry being read

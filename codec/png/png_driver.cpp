@@ -5,7 +5,6 @@ namespace {
 
 // The state of a first call: reader, header, output.
 Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
-  context.rotation = static_cast<int>((context.request.option & TAVIRPELO_ROTATE_MASK) >> 2) * 90;
   if (!open_read_buffer(context.reader, decInfo.pIO)) return kNoMemory;
   if (__PELOI_PngParserMain(&context.info, &context.reader) != kDone) return kNoMemory;
   const PELOI_PNGINFO& info = context.info;

@@ -13,13 +13,6 @@ constexpr int64_t ceil_div(int64_t n, int64_t d) {
   return n / d + (n % d != 0);
 }
 
-constexpr bool sideways(uint32_t rotation) {
-  return rotation == TAVIRPELO_ROTATE_90 || rotation == TAVIRPELO_ROTATE_270;
-}
-constexpr Size turned(Size size, uint32_t rotation) {
-  return sideways(rotation) ? Size{size.height, size.width} : size;
-}
-
 // The rotation (TAVIRPELO_ROTATE_...) that an option word asks of a zoom.
 uint32_t zoom_rotation(uint32_t option, Size picture, Size display);
 

@@ -69,9 +69,7 @@ struct Preview {
 // The picture's size as a decode with the caller's own options shows it.
 Size size_for_caller(const TAVIRPELO_DECINFO& decInfo) {
   const TAVIRPELO_ZOOMINFO& zoom = *decInfo.pZoomInfo;
-  const Size picture =
-      turned({zoom.sourceWidth, zoom.sourceHeight}, decInfo.option & TAVIRPELO_ROTATE_MASK);
-  return turned(picture, decInfo.userOption & TAVIRPELO_ROTATE_MASK);
+  return turned(turned({zoom.sourceWidth, zoom.sourceHeight}, decInfo.option), decInfo.userOption);
 }
 
 // Until the decode is done the preview stands in for the zoom image.

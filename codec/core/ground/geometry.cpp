@@ -2,45 +2,25 @@
 
 #include <algorithm>
 
-#include "tavirpelo/decinfo.h"
-
 namespace pelo {
 
 Placement place(Size buffer, Size target, uint32_t option) {
-  const uint32_t rotation = option & TAVIRPELO_ROTATE_MASK;
-  const bool sideways = rotation == TAVIRPELO_ROTATE_90 || rotation == TAVIRPELO_ROTATE_270;
-  const Size turned = sideways ? Size{target.height, target.width} : target;
-  if ((option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT) buffer = turned;
-
-  Placement p{};
-  p.pitch = buffer.width;
-  p.x = (int64_t{buffer.width} - turned.width) >> 1;
-  p.y = (int64_t{buffer.height} - turned.height) >> 1;
-  const int64_t right = p.x + turned.width - 1;
-  const int64_t bottom = p.y + turned.height - 1;
-  switch (rotation) {
+  const Size shown = turned(target, option);
+  if ((option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT) buffer = shown;
+  const int64_t left = (int64_t{buffer.width} - shown.width) >> 1;
+  const int64_t top = (int64_t{buffer.height} - shown.height) >> 1;
+  const int64_t right = left + shown.width - 1;
+  const int64_t bottom = top + shown.height - 1;
+  switch (option & TAVIRPELO_ROTATE_MASK) {
     case TAVIRPELO_ROTATE_90:  // the first row runs down the right edge
-      p.first = right + p.pitch * p.y;
-      p.pixelStep = p.pitch;
-      p.rowStep = -1;
-      break;
+      return {buffer, {right, 0, -1}, {top, 1, 0}, left, top};
     case TAVIRPELO_ROTATE_180:
-      p.first = right + p.pitch * bottom;
-      p.pixelStep = -1;
-      p.rowStep = -p.pitch;
-      break;
+      return {buffer, {right, -1, 0}, {bottom, 0, -1}, left, top};
     case TAVIRPELO_ROTATE_270:  // the first row runs up the left edge
-      p.first = p.x + p.pitch * bottom;
-      p.pixelStep = -p.pitch;
-      p.rowStep = 1;
-      break;
+      return {buffer, {left, 0, 1}, {bottom, -1, 0}, left, top};
     default:
-      p.first = p.x + p.pitch * p.y;
-      p.pixelStep = 1;
-      p.rowStep = p.pitch;
-      break;
+      return {buffer, {left, 1, 0}, {top, 0, 1}, left, top};
   }
-  return p;
 }
 
 namespace {

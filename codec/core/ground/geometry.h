@@ -4,6 +4,8 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "tavirpelo/decinfo.h"
+
 namespace pelo {
 
 struct Size {
@@ -12,13 +14,31 @@ struct Size {
   constexpr bool operator==(const Size&) const = default;
 };
 
-// The picture's first pixel and the way from it, in pixels of a buffer whose rows are `pitch` long.
+// Whether the rotation of an option word lays a picture on its side.
+constexpr bool sideways(uint32_t option) {
+  const uint32_t rotation = option & TAVIRPELO_ROTATE_MASK;
+  return rotation == TAVIRPELO_ROTATE_90 || rotation == TAVIRPELO_ROTATE_270;
+}
+constexpr Size turned(Size size, uint32_t option) {
+  return sideways(option) ? Size{size.height, size.width} : size;
+}
+
+// A coordinate in the buffer of a picture's pixel: start + column * byColumn + row * byRow.
+struct Axis {
+  int64_t start, byColumn, byRow;
+};
+
+// Where a picture lies in a buffer.
 struct Placement {
-  int64_t first;
-  int64_t pixelStep;
-  int64_t rowStep;
-  int64_t pitch;
-  int64_t x, y;  // upper left corner in the buffer
+  Size buffer;
+  Axis x, y;
+  int64_t left, top;  // its upper left corner
+
+  // The first pixel and the way from it, in pixels.
+  int64_t pitch() const { return buffer.width; }
+  int64_t first() const { return y.start * pitch() + x.start; }
+  int64_t pixel_step() const { return y.byColumn * pitch() + x.byColumn; }
+  int64_t row_step() const { return y.byRow * pitch() + x.byRow; }
 };
 
 // Places a `target` picture (its size before rotation) in a buffer, centred and turned clockwise by the

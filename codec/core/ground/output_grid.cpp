@@ -2,67 +2,43 @@
 
 #include <algorithm>
 
-#include "tavirpelo/decinfo.h"
-
 namespace pelo {
+namespace {
 
-OutputGrid::OutputGrid(void* bytes, Size buffer, Size picture, int bytesPerPixel, uint32_t option)
-    : bytes_(static_cast<uint8_t*>(bytes)), bytesPerPixel_(bytesPerPixel) {
-  const Placement p = place(buffer, picture, option);
-  const int64_t right = picture.width - int64_t{1};
-  const int64_t bottom = picture.height - int64_t{1};
-  const uint32_t rotation = option & TAVIRPELO_ROTATE_MASK;
-  const bool sideways = rotation == TAVIRPELO_ROTATE_90 || rotation == TAVIRPELO_ROTATE_270;
-  const bool tight = (option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT;
-  if (tight) buffer = sideways ? Size{picture.height, picture.width} : picture;
-  pitch_ = p.pitch;
-  switch (rotation) {
-    case TAVIRPELO_ROTATE_90:
-      x_ = {p.x + bottom, 0, -1, buffer.width};
-      y_ = {p.y, 1, 0, buffer.height};
-      break;
-    case TAVIRPELO_ROTATE_180:
-      x_ = {p.x + right, -1, 0, buffer.width};
-      y_ = {p.y + bottom, 0, -1, buffer.height};
-      break;
-    case TAVIRPELO_ROTATE_270:
-      x_ = {p.x, 0, 1, buffer.width};
-      y_ = {p.y + right, -1, 0, buffer.height};
-      break;
-    default:
-      x_ = {p.x, 1, 0, buffer.width};
-      y_ = {p.y, 0, 1, buffer.height};
-      break;
+// Narrows [first, end) to the columns of a row that lie inside the buffer along one axis.
+void clip(const Axis& axis, int64_t limit, int64_t row, int64_t& first, int64_t& end) {
+  const int64_t start = axis.start + row * axis.byRow;
+  if (axis.byColumn > 0) {  // 0 <= start + column < limit
+    first = std::max(first, -start);
+    end = std::min(end, limit - start);
+  } else if (axis.byColumn < 0) {  // 0 <= start - column < limit
+    first = std::max(first, start - limit + 1);
+    end = std::min(end, start + 1);
+  } else if (start < 0 || start >= limit) {
+    end = first;
   }
 }
+
+}  // namespace
+
+OutputGrid::OutputGrid(void* bytes, Size buffer, Size picture, int bytesPerPixel, uint32_t option)
+    : bytes_(static_cast<uint8_t*>(bytes)),
+      bytesPerPixel_(bytesPerPixel),
+      place_(place(buffer, picture, option)) {}
 
 OutputGrid::OutputGrid(void* bytes, Size buffer, int64_t x, int64_t y, int bytesPerPixel)
     : bytes_(static_cast<uint8_t*>(bytes)),
       bytesPerPixel_(bytesPerPixel),
-      pitch_(buffer.width),
-      x_{x, 1, 0, buffer.width},
-      y_{y, 0, 1, buffer.height} {}
+      place_{buffer, {x, 1, 0}, {y, 0, 1}, x, y} {}
 
 RowSpan OutputGrid::span(int64_t row, int64_t begin, int64_t count) const {
   int64_t first = begin;
   int64_t end = begin + count;
-  for (const Axis& axis : {x_, y_}) {
-    const int64_t start = axis.start + row * axis.byRow;
-    if (axis.byColumn > 0) {  // 0 <= start + column < limit
-      first = std::max(first, -start);
-      end = std::min(end, axis.limit - start);
-    } else if (axis.byColumn < 0) {  // 0 <= start - column < limit
-      first = std::max(first, start - axis.limit + 1);
-      end = std::min(end, start + 1);
-    } else if (start < 0 || start >= axis.limit) {
-      return {};
-    }
-  }
+  clip(place_.x, place_.buffer.width, row, first, end);
+  clip(place_.y, place_.buffer.height, row, first, end);
   if (first >= end) return {};
-  const int64_t x = x_.start + row * x_.byRow + first * x_.byColumn;
-  const int64_t y = y_.start + row * y_.byRow + first * y_.byColumn;
-  return {bytes_ + (y * pitch_ + x) * bytesPerPixel_,
-          static_cast<ptrdiff_t>((x_.byColumn + y_.byColumn * pitch_) * bytesPerPixel_),
+  const int64_t pixel = place_.first() + row * place_.row_step() + first * place_.pixel_step();
+  return {bytes_ + pixel * bytesPerPixel_, static_cast<ptrdiff_t>(place_.pixel_step() * bytesPerPixel_),
           static_cast<int>(first - begin), static_cast<int>(end - first)};
 }
 

@@ -29,13 +29,9 @@ class OutputGrid {
   RowSpan span(int64_t row, int64_t begin, int64_t count) const;
 
  private:
-  struct Axis {  // a coordinate of pixel (column, row): start + column * byColumn + row * byRow
-    int64_t start, byColumn, byRow, limit;
-  };
   uint8_t* bytes_ = nullptr;
   int bytesPerPixel_ = 0;
-  int64_t pitch_ = 0;
-  Axis x_{}, y_{};
+  Placement place_{};
 };
 
 }  // namespace pelo

@@ -5,7 +5,9 @@
 namespace pelo::jpeg {
 namespace {
 
-int to_int(int64_t value) { return static_cast<int>(std::min<int64_t>(value, INT32_MAX)); }
+int to_int(int64_t value) {
+  return static_cast<int>(std::min<int64_t>(value, INT32_MAX));
+}
 
 }  // namespace
 
@@ -48,18 +50,20 @@ Scale mode_scale(Scale scale, int decMode) {
   constexpr Scale kSteps[] = {kFull, kHalf, kThreeEighths, kQuarter, kEighth};
   const auto step = std::find(std::begin(kSteps), std::end(kSteps), scale) - std::begin(kSteps);
   switch (decMode) {
-    case 2: return kSteps[std::min<ptrdiff_t>(step + 1, 4)];
-    case 3: return step == 0 ? kThreeEighths : step == 1 ? kQuarter : kEighth;
-    case 4: return kEighth;
-    default: return scale;
+    case 2:
+      return kSteps[std::min<ptrdiff_t>(step + 1, 4)];
+    case 3:
+      return step == 0 ? kThreeEighths : step == 1 ? kQuarter : kEighth;
+    case 4:
+      return kEighth;
+    default:
+      return scale;
   }
 }
 
 void choose_sizes(PELOJ_JDINFO& jd, uint32_t option) {
   const Size image{jd.imageWidth, jd.imageHeight};
-  const bool sideways = jd.rotation == TAVIRPELO_ROTATE_90 || jd.rotation == TAVIRPELO_ROTATE_270;
-  const Size request = sideways ? Size{jd.bufferHeight, jd.bufferWidth}
-                                : Size{jd.bufferWidth, jd.bufferHeight};
+  const Size request = turned({jd.bufferWidth, jd.bufferHeight}, jd.rotation);
   const Size output = fit_output(image, request, option);
   jd.outWidth = output.width;
   jd.outHeight = output.height;

@@ -126,8 +126,8 @@ void emit_row(PELOJ_JDINFO& jd, const Source& source, int count) {
       continue;
     }
     const Run rgb = Model::rgb(in, length, output, colours);
-    uint8_t* out = output.plane[0] + (output.emitted - output.firstRow) * output.rowStep +
-                   begin * output.pixelStep;
+    uint8_t* out =
+        output.plane[0] + (output.emitted - output.firstRow) * output.rowStep + begin * output.pixelStep;
     output.pack(rgb.channel[0], rgb.channel[1], rgb.channel[2], length, out, output.pixelStep);
   }
   ++output.emitted;
@@ -135,17 +135,17 @@ void emit_row(PELOJ_JDINFO& jd, const Source& source, int count) {
 
 // Planes of a 4:2:0 buffer. Rotation does not apply to it.
 void set_planes(PELOJ_JDINFO& jd, uint8_t* buffer, const Placement& p, int64_t height) {
-  const int64_t chromaPitch = (p.pitch + 1) >> 1;
-  const int64_t chroma = chromaPitch * (p.y >> 1) + (p.x >> 1);
+  const int64_t chromaPitch = (p.pitch() + 1) >> 1;
+  const int64_t chroma = chromaPitch * (p.top >> 1) + (p.left >> 1);
   jd.output.planar = 1;
-  jd.output.rowStep = static_cast<ptrdiff_t>(p.pitch);
-  jd.output.plane[0] = buffer + p.first;
-  jd.output.plane[1] = buffer + p.pitch * height + chroma;
-  jd.output.plane[2] = buffer + p.pitch * height + chromaPitch * ((height + 1) >> 1) + chroma;
+  jd.output.rowStep = static_cast<ptrdiff_t>(p.pitch());
+  jd.output.plane[0] = buffer + p.first();
+  jd.output.plane[1] = buffer + p.pitch() * height + chroma;
+  jd.output.plane[2] = buffer + p.pitch() * height + chromaPitch * ((height + 1) >> 1) + chroma;
 }
 
-// Chooses the packer of the state's format; its bytes a pixel, 0 for an unknown code: rows are then counted
-// only.
+// Chooses the packer of the state's format; its bytes a pixel, 0 for an unknown code: rows are then
+// counted only.
 int choose_packer(PELOJ_JDINFO& jd) {
   jd.output.dither =
       jd.outFormat == TAVIRPELO_RGB565_DITHER && jd.colourSpace == ColourSpace::kYcc ? 1 : 0;
@@ -172,9 +172,9 @@ void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option) {
   }
   const int size = choose_packer(jd);
   if (size == 0) return;
-  jd.output.plane[0] = bytes + p.first * size;
-  jd.output.pixelStep = static_cast<ptrdiff_t>(p.pixelStep * size);
-  jd.output.rowStep = static_cast<ptrdiff_t>(p.rowStep * size);
+  jd.output.plane[0] = bytes + p.first() * size;
+  jd.output.pixelStep = static_cast<ptrdiff_t>(p.pixel_step() * size);
+  jd.output.rowStep = static_cast<ptrdiff_t>(p.row_step() * size);
 }
 
 void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows) {
