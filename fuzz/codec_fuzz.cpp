@@ -33,9 +33,8 @@ void repair_checksums(Bytes& file) {
   for (size_t at = 8; at + 12 <= file.size();) {
     const uint64_t length = pelo::load_be32(&file[at]);
     if (length == 0 || at + 12 + length > file.size()) return;
-    const uint32_t crc = __PELOI_PngCrc32(&file[at + 4], static_cast<uint32_t>(length) + 4);
-    pelo::store_be16(&file[at + 8 + length], crc >> 16);
-    pelo::store_be16(&file[at + 10 + length], crc);
+    pelo::store_be32(&file[at + 8 + length],
+                     __PELOI_PngCrc32(&file[at + 4], static_cast<uint32_t>(length) + 4));
     at += 12 + length;
   }
 }

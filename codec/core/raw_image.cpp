@@ -4,6 +4,7 @@
 
 #include "codec/core/ground/byte_order.h"
 #include "codec/core/ground/os_memory.h"
+#include "codec/pixel/fill.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_layout.h"
 #include "tavirpelo/raw.h"
@@ -26,13 +27,6 @@ size_t block_size(size_t width, size_t height, int format) {
   return width * height + ((height + 1) >> 1) * ((width + 1) & ~size_t{1});
 }
 
-// Copies one pixel's bytes over the whole block.
-void fill_pixels(TAVIRPELO_RAWINFO& raw, const uint8_t* pixel, size_t size) {
-  auto* out = static_cast<uint8_t*>(raw.pData);
-  const size_t count = size_t{raw.width} * raw.height;
-  for (size_t i = 0; i < count; ++i) std::memcpy(out + i * size, pixel, size);
-}
-
 // Whatever the colour, a planar image turns black.
 void fill_planes(TAVIRPELO_RAWINFO& raw) {
   const size_t luma = size_t{raw.width} * raw.height;
@@ -47,12 +41,15 @@ int fill(TAVIRPELO_RAWINFO* raw, uint16_t word, uint8_t r, uint8_t g, uint8_t b)
     return 0;
   }
   uint8_t pixel[4] = {};
+  const auto cover = [&](size_t size) {
+    pelo::fill_pixels(raw->pData, size_t{raw->width} * raw->height, pixel, size);
+  };
   switch (raw->format) {
     case TAVIRPELO_RGB888:
       pixel[0] = r;
       pixel[1] = g;
       pixel[2] = b;
-      fill_pixels(*raw, pixel, 3);
+      cover(3);
       break;
     case TAVIRPELO_YUV420:
       fill_planes(*raw);
@@ -62,12 +59,12 @@ int fill(TAVIRPELO_RAWINFO* raw, uint16_t word, uint8_t r, uint8_t g, uint8_t b)
       pixel[1] = r;
       pixel[2] = g;
       pixel[3] = b;
-      fill_pixels(*raw, pixel, 4);
+      cover(4);
       break;
     default:
       pelo::store_le16(pixel, word);
       pixel[2] = 255;
-      fill_pixels(*raw, pixel, raw->format == TAVIRPELO_RGB565A8 ? 3 : 2);
+      cover(raw->format == TAVIRPELO_RGB565A8 ? 3 : 2);
       break;
   }
   return 1;

@@ -20,20 +20,10 @@ void pack_row(const uint8_t* __restrict r, const uint8_t* __restrict g, const ui
 }  // namespace
 
 PackRow opaque_packer(int format) {
-  switch (format) {
-    case TAVIRPELO_RGB565:
-      return pack_row<layout::Rgb565>;
-    case TAVIRPELO_RGB888:
-      return pack_row<layout::Rgb888>;
-    case TAVIRPELO_ARGB8888:
-      return pack_row<layout::Argb8888>;
-    case TAVIRPELO_RGBA8888:
-      return pack_row<layout::Rgba8888>;
-    case TAVIRPELO_BGRA8888:
-      return pack_row<layout::Bgra8888>;
-    default:
-      return nullptr;
-  }
+  PackRow packer = nullptr;
+  if (format == TAVIRPELO_RGB565A8) return packer;
+  visit_layout(format, [&](auto layout) { packer = pack_row<decltype(layout)>; });
+  return packer;
 }
 
 PackRow dithered_packer() {

@@ -65,26 +65,11 @@ StoreRgba blender(int format) {
 
 StoreRgba rgba_storer(int format, Alpha alpha) {
   if (alpha == Alpha::kBlended && blender(format) != nullptr) return blender(format);
-  switch (format) {
-    case TAVIRPELO_RGB565:
-      return store_row<layout::Rgb565>;
-    case TAVIRPELO_RGB888:
-      return store_row<layout::Rgb888>;
-    case TAVIRPELO_ARGB8888:
-      return store_row<layout::Argb8888>;
-    case TAVIRPELO_RGB565A8:
-      return store_row<layout::Rgb565Alpha>;
-    case TAVIRPELO_RGBA8888:
-      return store_row<layout::Rgba8888>;
-    case TAVIRPELO_BGRA8888:
-      return store_row<layout::Bgra8888>;
-    case TAVIRPELO_BGR565:
-      return store_row<layout::Bgr565>;
-    case TAVIRPELO_BGR888:
-      return store_row<layout::Bgr888>;
-    default:
-      return nullptr;
-  }
+  if (format == TAVIRPELO_BGR565) return store_row<layout::Bgr565>;
+  if (format == TAVIRPELO_BGR888) return store_row<layout::Bgr888>;
+  StoreRgba storer = nullptr;
+  visit_layout(format, [&](auto layout) { storer = store_row<decltype(layout)>; });
+  return storer;
 }
 
 }  // namespace pelo

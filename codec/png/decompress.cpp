@@ -13,11 +13,6 @@ namespace {
 
 constexpr uint8_t kEmptyIend[12] = {0, 0, 0, 0, 'I', 'E', 'N', 'D', 0xAE, 0x42, 0x60, 0x82};
 
-void store_be32(uint8_t* p, uint32_t value) {
-  store_be16(p, value >> 16);
-  store_be16(p + 2, value);
-}
-
 // Makes one IDAT chunk, followed by IEND, of all IDAT chunks inside the caller's buffer, so that their
 // data can be read in one run. The room is always there: every chunk given up had twelve bytes around
 // its data.

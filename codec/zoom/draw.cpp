@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "codec/core/ground/byte_order.h"
+#include "codec/pixel/fill.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/view.h"
 #include "tavirpelo/raw.h"
@@ -29,24 +30,9 @@ int draw_view(const TAVIRPELO_ZOOMINFO* zoom, const Display& display, int format
   return 1;
 }
 
-// Fills with pixels of `bytes` bytes, lowest byte last; a colour of equal bytes is a plain fill.
-void fill_pixels(void* display, int width, int height, uint32_t colour, uint32_t full, size_t bytes) {
+void fill_display(void* display, int width, int height, const uint8_t* pixel, size_t bytes) {
   if (display == nullptr || width < 1 || height < 1) return;
-  const size_t count = static_cast<size_t>(width) * static_cast<size_t>(height);
-  auto* out = static_cast<uint8_t*>(display);
-  if (colour == 0 || colour == full) {
-    TAVIRPELO_OsMemset(out, colour == 0 ? 0 : 0xFF, count * bytes);
-    return;
-  }
-  for (size_t i = 0; i < count; ++i, out += bytes) {
-    if (bytes == 2) {
-      store_le16(out, colour);
-    } else {
-      out[0] = static_cast<uint8_t>(colour >> 16);
-      out[1] = static_cast<uint8_t>(colour >> 8);
-      out[2] = static_cast<uint8_t>(colour);
-    }
-  }
+  fill_pixels(display, static_cast<size_t>(width) * static_cast<size_t>(height), pixel, bytes);
 }
 
 }  // namespace
@@ -97,9 +83,13 @@ int PELO_MakeRGB888Display(const TAVIRPELO_ZOOMINFO* zoom, void* display, int wi
 }
 
 void PELO_SetOutBuff(void* display, int width, int height, uint32_t colour) {
-  fill_pixels(display, width, height, colour & 0xFFFF, 0xFFFF, 2);
+  uint8_t pixel[2];
+  pelo::store_le16(pixel, colour);
+  fill_display(display, width, height, pixel, sizeof pixel);
 }
 
 void PELO_SetRGB888OutBuff(void* display, int width, int height, uint32_t colour) {
-  fill_pixels(display, width, height, colour & 0xFFFFFF, 0xFFFFFF, 3);
+  const uint8_t pixel[3] = {static_cast<uint8_t>(colour >> 16), static_cast<uint8_t>(colour >> 8),
+                            static_cast<uint8_t>(colour)};
+  fill_display(display, width, height, pixel, sizeof pixel);
 }

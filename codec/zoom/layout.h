@@ -1,17 +1,13 @@
 // The sizes of a zoom, fixed when it starts: arithmetic on the state alone, without pixels.
 #pragma once
 
+#include "codec/core/ground/checked.h"
 #include "codec/core/ground/geometry.h"
 #include "tavirpelo/zoom.h"
 
 namespace pelo::zoom {
 
 constexpr int64_t kDecoderBytes = 0x30000;  // of a memory budget, left to the decoder
-
-// n / d rounded up, for n >= 0.
-constexpr int64_t ceil_div(int64_t n, int64_t d) {
-  return n / d + (n % d != 0);
-}
 
 // The rotation (TAVIRPELO_ROTATE_...) that an option word asks of a zoom.
 uint32_t zoom_rotation(uint32_t option, Size picture, Size display);

@@ -1,7 +1,6 @@
 // The whole picture rendered at the current zoom, and views copied from it.
 #include "codec/pixel/packers.h"
 #include "codec/zoom/draw.h"
-#include "codec/zoom/layout.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/view.h"
 

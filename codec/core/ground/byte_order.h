@@ -7,14 +7,18 @@
 
 namespace pelo {
 
-constexpr uint16_t load_be16(const uint8_t* p) { return static_cast<uint16_t>(p[0] << 8 | p[1]); }
+constexpr uint16_t load_be16(const uint8_t* p) {
+  return static_cast<uint16_t>(p[0] << 8 | p[1]);
+}
 constexpr uint32_t load_be32(const uint8_t* p) {
   return uint32_t{p[0]} << 24 | uint32_t{p[1]} << 16 | uint32_t{p[2]} << 8 | p[3];
 }
 constexpr uint64_t load_be64(const uint8_t* p) {
   return uint64_t{load_be32(p)} << 32 | load_be32(p + 4);
 }
-constexpr uint16_t load_le16(const uint8_t* p) { return static_cast<uint16_t>(p[1] << 8 | p[0]); }
+constexpr uint16_t load_le16(const uint8_t* p) {
+  return static_cast<uint16_t>(p[1] << 8 | p[0]);
+}
 constexpr uint32_t load_le32(const uint8_t* p) {
   return uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 | uint32_t{p[1]} << 8 | p[0];
 }
@@ -31,6 +35,10 @@ inline uint64_t load_le64(const uint8_t* p) {
 constexpr void store_be16(uint8_t* p, uint32_t v) {
   p[0] = static_cast<uint8_t>(v >> 8);
   p[1] = static_cast<uint8_t>(v);
+}
+constexpr void store_be32(uint8_t* p, uint32_t v) {
+  store_be16(p, v >> 16);
+  store_be16(p + 2, v);
 }
 
 // One store where the host's order allows it, so that pixel loops vectorise.

@@ -13,6 +13,12 @@ namespace pelo {
 // as if memory were short.
 constexpr int64_t kMaxPictureBlock = int64_t{256} << 20;
 
+// n / d rounded up, for n >= 0 and d >= 1.
+template <class N, class D>
+constexpr auto ceil_div(N n, D d) {
+  return n / d + (n % d != 0);
+}
+
 // a * b, or nothing when it exceeds size_t.
 [[nodiscard]] constexpr std::optional<size_t> checked_mul(size_t a, size_t b) {
   if (b != 0 && a > std::numeric_limits<size_t>::max() / b) return std::nullopt;

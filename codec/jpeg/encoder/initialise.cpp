@@ -1,12 +1,14 @@
 // Start and end of an encoder state: component layout, tables, sample buffers.
 #include <algorithm>
 
+#include "codec/core/ground/checked.h"
 #include "codec/jpeg/encoder/encoder.h"
 
 using namespace pelo::jpeg;
 
 namespace {
 
+using pelo::ceil_div;
 using pelo::OsPtr;
 
 // 4:2:0: luma 2 x 2 with table 0, chroma 1 x 1 with table 1.
@@ -48,10 +50,6 @@ bool accepted_sampling(const CodingParameters& parameters) {
     if (component.quantTable >= kQuantTables) return false;
   }
   return blocks_of(parameters) <= kEncoderMcuBlocks;
-}
-
-constexpr int ceil_div(int a, int b) {
-  return (a + b - 1) / b;
 }
 
 void lay_out(ELO_ENCODER& encoder, size_t index) {
