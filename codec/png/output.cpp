@@ -4,6 +4,7 @@
 // a quarter of a pixel's span. Pictures are written unrotated, clipped to the requested box; only one
 // that is gathered whole is rotated.
 #include <algorithm>
+#include <bit>
 #include <cstring>
 
 #include "codec/core/ground/byte_order.h"
@@ -101,10 +102,12 @@ void write_pass_columns(const PELOI_PNGCONTEXT& context, const uint8_t* row, int
 
 void gather_pass_columns(PELOI_PNGCONTEXT& context, const uint8_t* row, size_t target) {
   OutputState& output = context.output;
-  uint32_t* words = output.wholeImage.data() + target * output.width;
+  uint8_t* pixels = output.wholeImage.data() + target * output.width * 4;
   for_runs(output, output.expand.mapped, row, output.passColumns.data(), 0,
            static_cast<int>(context.pass.columnCount), [&](const uint8_t* rgba, int i, int length) {
-             for (int k = 0; k < length; ++k) words[output.passTargets[i + k]] = load_be32(rgba + 4 * k);
+             for (int k = 0; k < length; ++k) {
+               std::memcpy(pixels + size_t{output.passTargets[i + k]} * 4, rgba + 4 * k, 4);
+             }
            });
 }
 
@@ -112,7 +115,7 @@ void gather_pass_columns(PELOI_PNGCONTEXT& context, const uint8_t* row, size_t t
 int64_t first_output_row(const PELOI_PNGCONTEXT& context, int64_t y) {
   const int64_t height = context.fullHeight, outHeight = context.output.height;
   const int64_t numerator = y * outHeight - height / 4;
-  return numerator <= 0 ? 0 : std::min(outHeight, (numerator + height - 1) / height);
+  return numerator <= 0 ? 0 : std::min(outHeight, ceil_div(numerator, height));
 }
 
 // Every output row of a pass's scanline; passes revisit the picture, so rows are found by division.
@@ -166,7 +169,7 @@ bool map_columns(PELOI_PNGCONTEXT& context) {
 bool reserve_whole_image(PELOI_PNGCONTEXT& context) {
   OutputState& output = context.output;
   const uint64_t pixels = uint64_t{output.width} * output.height;
-  return pixels <= kMaxPictureBlock / 4 && output.wholeImage.allocate(static_cast<size_t>(pixels));
+  return pixels <= kMaxPictureBlock / 4 && output.wholeImage.allocate(static_cast<size_t>(pixels * 4));
 }
 
 bool gathers(const PELOI_PNGCONTEXT& context) {
@@ -229,11 +232,12 @@ void begin_pass_output(PELOI_PNGCONTEXT& context) {
   OutputState& output = context.output;
   if (!output.passColumns) return;
   PassState& pass = context.pass;
+  const int shift = std::countr_zero(pass.columnStep);  // steps are powers of two
   uint32_t count = 0;
   for (uint32_t k = 0; k < output.width; ++k) {
-    const uint32_t column = output.columns[k];
-    if (column < pass.firstColumn || (column - pass.firstColumn) % pass.columnStep != 0) continue;
-    output.passColumns[count] = (column - pass.firstColumn) / pass.columnStep;
+    const uint32_t column = output.columns[k] - pass.firstColumn;
+    if (output.columns[k] < pass.firstColumn || (column & (pass.columnStep - 1)) != 0) continue;
+    output.passColumns[count] = column >> shift;
     output.passTargets[count++] = k;
   }
   pass.columnCount = count;
@@ -251,22 +255,17 @@ uint16_t blend_gathered(const uint8_t* rgba, uint32_t background) {
                 channel(rgba[1], (background & 0x7E0) >> 3), channel(rgba[2], (background & 31) << 3));
 }
 
-void write_gathered_row(const PELOI_PNGCONTEXT& context, const uint32_t* words, const RowSpan& span) {
+void blend_gathered_row(const uint8_t* rgba, int count, uint8_t* out, ptrdiff_t step) {
+  for (int i = 0; i < count; ++i, rgba += 4, out += step) {
+    store_le16(out, blend_gathered(rgba, load_le16(out)));
+  }
+}
+
+// Of the formats without alpha only RGB565 is blended here, and only with the alpha that tRNS gives.
+StoreRgba gathered_storer(const PELOI_PNGCONTEXT& context) {
   const int format = context.request.outFormat;
   const bool blends = format == TAVIRPELO_RGB565 && (context.info.ancillaryFlags & kTrnsRead) != 0;
-  const StoreRgba store = rgba_storer(format, Alpha::kIgnored);
-  for (int i = 0; i < span.count; ++i) {
-    uint8_t rgba[4];
-    const uint32_t word = words[span.skip + i];
-    store_be16(rgba, word >> 16);
-    store_be16(rgba + 2, word);
-    uint8_t* out = span.first + i * span.step;
-    if (blends) {
-      store_le16(out, blend_gathered(rgba, load_le16(out)));
-    } else {
-      store(rgba, 1, out, span.step);
-    }
-  }
+  return blends ? blend_gathered_row : rgba_storer(format, Alpha::kIgnored);
 }
 
 }  // namespace
@@ -294,8 +293,10 @@ void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context) {
 void __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context) {
   const OutputState& output = context->output;
   if (output.store == nullptr) return;
-  for (uint32_t y = 0; y < output.height; ++y) {
-    const pelo::RowSpan span = output.grid.span(y, 0, output.width);
-    write_gathered_row(*context, output.wholeImage.data() + size_t{y} * output.width, span);
+  const pelo::StoreRgba store = gathered_storer(*context);
+  for (size_t y = 0; y < output.height; ++y) {
+    const pelo::RowSpan span = output.grid.span(static_cast<int64_t>(y), 0, output.width);
+    const uint8_t* row = output.wholeImage.data() + y * output.width * 4;
+    store(row + size_t{4} * static_cast<size_t>(span.skip), span.count, span.first, span.step);
   }
 }

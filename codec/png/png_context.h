@@ -57,7 +57,7 @@ struct OutputState {
   uint32_t base;                   // of these, by earlier line-mode calls
   uint32_t stop;                   // line mode: rows after which to stop; 0 never
   OutputGrid grid;
-  OsBuffer<uint32_t> wholeImage;  // 0xRRGGBBAA words, when the picture is gathered before it is written
+  OsBuffer<uint8_t> wholeImage;  // R, G, B, A bytes, when the picture is gathered before it is written
 };
 
 }  // namespace pelo::png

@@ -98,6 +98,25 @@ TEST(PngPixels, GatheredPicturesAreRotated) {
   }
 }
 
+// Their tRNS is blended into RGB565 alone, by weights that alpha 255 does not fill.
+TEST(PngPixels, GatheredTransparency) {
+  const PngImage image = random_png_image(9, 3, 8, 24, 16, true, true);
+  const auto mix = [](int front, int alpha, int behind) {
+    return (behind * (255 - alpha) >> 8) + (front * alpha >> 8);
+  };
+  for (const int format : {0, 1, 6}) {
+    const Decode got = decode_png(build_png(image), 12, 8, format, 0x1000);
+    const Bytes want = placed(centred({12, 8}, {12, 8}), format, [&](int x, int y) {
+      const Rgba p = image.rgba(position(x, 24, 12, 6), position(y, 16, 8, 4));
+      if (format != 0) return pixel_bytes(p, format);
+      constexpr int kWord = kFill << 8 | kFill;
+      return word_bytes(word565(mix(p.r, p.a, kWord >> 11 << 3), mix(p.g, p.a, (kWord >> 5 & 63) << 2),
+                                mix(p.b, p.a, (kWord & 31) << 3)));
+    });
+    EXPECT_EQ(want, got.pixels) << format;
+  }
+}
+
 // Sizes of nothing and formats without a writer are no failure, and write nothing.
 TEST(PngPixels, NothingToWrite) {
   const Bytes wide = build_png(random_png_image(8, 2, 8, 1000, 1, false, false));
