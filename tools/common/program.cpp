@@ -22,7 +22,10 @@ std::string footer() {
       kProgram);
 }
 
-int run(CLI::App& app, int argc, char** argv, Exit& result) {
+int run(CLI::App& app, std::span<const Register> commands, int argc, char** argv) {
+  Exit result = Exit::kDone;
+  app.require_subcommand(1);
+  for (Register add : commands) add(app, result);
   try {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {

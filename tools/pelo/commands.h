@@ -10,9 +10,6 @@ namespace pelo_tool {
 using tool::Exit;
 using tool::fail;
 
-// Adds one subcommand; its outcome is stored in `result` when the command line has been read.
-using Register = void (*)(CLI::App& app, Exit& result);
-
 void register_info(CLI::App& app, Exit& result);
 void register_exif(CLI::App& app, Exit& result);
 void register_decode(CLI::App& app, Exit& result);

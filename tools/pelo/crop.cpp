@@ -3,10 +3,10 @@
 
 #include "tools/common/arguments.h"
 #include "tools/common/output.h"
+#include "tools/common/pnm.h"
 #include "tools/pelo/commands.h"
 #include "tools/pelo/input.h"
 #include "tools/pelo/numbers.h"
-#include "tools/pelo/pnm.h"
 #include "tools/pelo/words.h"
 
 namespace pelo_tool {
@@ -41,8 +41,7 @@ Exit run(const Options& options) {
                 : gTAVIRPELO_Error == TAVIRPELO_ERROR_CROP ? "cannot be decoded"
                                                            : "the part is not inside the picture");
   }
-  const auto pnm = format_pnm({size.width, size.height, false, rgb_of_words(words)});
-  return tool::write_bytes(options.output, pnm.data(), pnm.size());
+  return tool::write_pnm(options.output, {size.width, size.height, false, rgb_of_words(words)});
 }
 
 }  // namespace

@@ -6,9 +6,9 @@
 
 #include "tools/common/arguments.h"
 #include "tools/common/output.h"
+#include "tools/common/pnm.h"
 #include "tools/pelo/commands.h"
 #include "tools/pelo/input.h"
-#include "tools/pelo/pnm.h"
 
 namespace pelo_tool {
 namespace {
@@ -100,12 +100,12 @@ size_t byte_count(Size size, int format) {
 }
 
 Exit write_result(const Options& options, Size size, std::vector<uint8_t> pixels) {
-  if (options.kind != Kind::kRaw) {
-    Pnm picture{size.width, size.height, options.kind == Kind::kPgm, {}};
-    picture.pixels = picture.grey ? luma_of(pixels) : std::move(pixels);
-    pixels = format_pnm(picture);
+  if (options.kind == Kind::kRaw) {
+    return tool::write_bytes(options.output, pixels.data(), pixels.size());
   }
-  return tool::write_bytes(options.output, pixels.data(), pixels.size());
+  const bool grey = options.kind == Kind::kPgm;
+  if (grey) pixels = tool::luma_of(pixels);
+  return tool::write_pnm(options.output, {size.width, size.height, grey, std::move(pixels)});
 }
 
 Exit run(const Options& options) {

@@ -15,7 +15,8 @@ Exit run(const Options& options) {
   Input input;
   Exit opened = input.open(options.picture);
   if (opened != Exit::kDone) return opened;
-  ExifInfo exif(input.format() == TAVIRPELO_FORMAT_JPEG ? PELOJ_CreatExifInfo(input.info()) : nullptr);
+  tool::ExifInfo exif(input.format() == TAVIRPELO_FORMAT_JPEG ? PELOJ_CreatExifInfo(input.info())
+                                                              : nullptr);
   if (!exif) return fail(Exit::kRefused, "{}: no EXIF", options.picture);
   if (options.json) {
     fmt::print("{}\n", exif_json(*exif));

@@ -6,7 +6,7 @@
 #include <string_view>
 #include <vector>
 
-#include "tools/common/json_text.h"
+#include "tools/common/text.h"
 
 namespace pelo_tool {
 namespace {
@@ -29,12 +29,7 @@ class Rows {
     if (value != 0) add(name, std::to_string(value), std::to_string(value));
   }
   void text(const char* name, std::string_view value) {
-    std::string printable(value);
-    for (char& c : printable) {
-      auto byte = static_cast<unsigned char>(c);
-      if (byte < 0x20 || byte == 0x7F) c = '?';
-    }
-    add(name, printable, tool::json_text(value));
+    add(name, tool::printable(value), tool::json_text(value));
   }
   void string(const char* name, const char* value) {
     if (value != nullptr) text(name, value);
@@ -60,7 +55,8 @@ class Rows {
                            whole ? 0 : 3));
   }
   void object(const char* name, Rows rows) {
-    add(name, "", rows.json()), rows_.back().children = rows.rows_;
+    add(name, "", rows.json());
+    rows_.back().children = std::move(rows.rows_);
   }
 
   std::string lines(const std::string& indent) const { return lines(rows_, indent); }

@@ -1,17 +1,11 @@
 // EXIF fields as text and as JSON.
 #pragma once
 
-#include <memory>
 #include <string>
 
 #include "tavirpelo/tavirpelo.h"
 
 namespace pelo_tool {
-
-struct DestroyExif {
-  void operator()(TAVIRPELO_EXIFINFO* info) const { TAVIRPELO_DestroyJpegExifInfo(info); }
-};
-using ExifInfo = std::unique_ptr<TAVIRPELO_EXIFINFO, DestroyExif>;
 
 // A line for every field that the picture has, each after `indent`.
 std::string exif_lines(const TAVIRPELO_EXIFINFO& info, const std::string& indent);

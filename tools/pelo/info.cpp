@@ -1,5 +1,5 @@
 // pelo info: format, size and what else the header tells.
-#include "tools/common/json_text.h"
+#include "tools/common/text.h"
 #include "tools/pelo/commands.h"
 #include "tools/pelo/exif_text.h"
 #include "tools/pelo/input.h"
@@ -63,7 +63,8 @@ Exit run(const Options& options) {
   Input input;
   Exit opened = input.open(options.picture);
   if (opened != Exit::kDone) return opened;
-  ExifInfo exif(input.format() == TAVIRPELO_FORMAT_JPEG ? PELOJ_CreatExifInfo(input.info()) : nullptr);
+  tool::ExifInfo exif(input.format() == TAVIRPELO_FORMAT_JPEG ? PELOJ_CreatExifInfo(input.info())
+                                                              : nullptr);
   auto print = options.json ? print_json : print_text;
   print(options, input.format(), input.header(), exif.get());
   return Exit::kDone;

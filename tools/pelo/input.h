@@ -3,19 +3,13 @@
 
 #include <CLI/CLI.hpp>
 #include <cstdint>
-#include <memory>
 #include <string>
 #include <vector>
 
-#include "tavirpelo/tavirpelo.h"
+#include "tools/common/codec_objects.h"
 #include "tools/common/exit_code.h"
 
 namespace pelo_tool {
-
-struct DestroyDecInfo {
-  void operator()(TAVIRPELO_DECINFO* info) const { TAVIRPELO_DestroyDecInfo(info); }
-};
-using DecInfo = std::unique_ptr<TAVIRPELO_DECINFO, DestroyDecInfo>;
 
 // The whole of a file or of standard input; complains when it cannot be read.
 tool::Exit read_all(const std::string& path, std::vector<uint8_t>& bytes);
@@ -36,7 +30,7 @@ class Input {
  private:
   std::string path_;
   std::vector<uint8_t> bytes_;  // of standard input
-  DecInfo info_;
+  tool::DecInfo info_;
   TAVIRPELO_HINFO header_{};
 };
 

@@ -7,16 +7,10 @@ const char tool::kProgram[] = "pelo";
 
 namespace {
 
-constexpr pelo_tool::Register kCommands[] = {
-    pelo_tool::register_info,
-    pelo_tool::register_exif,
-    pelo_tool::register_decode,
-    pelo_tool::register_encode,
-    pelo_tool::register_rotate,
-    pelo_tool::register_shrink,
-    pelo_tool::register_crop,
-    pelo_tool::register_scale,
-    pelo_tool::register_yuv2rgb,
+constexpr tool::Register kCommands[] = {
+    pelo_tool::register_info,   pelo_tool::register_exif,   pelo_tool::register_decode,
+    pelo_tool::register_encode, pelo_tool::register_rotate, pelo_tool::register_shrink,
+    pelo_tool::register_crop,   pelo_tool::register_scale,  pelo_tool::register_yuv2rgb,
     pelo_tool::register_zoom,
 };
 
@@ -37,10 +31,7 @@ int main(int argc, char** argv) {
   app.set_version_flag("--version", "pelo " PELO_VERSION);
   app.add_flag_function(
       "--log", [](int64_t) { set_log(true); }, "Let the codec's log through, to standard error");
-  app.require_subcommand(1);
   app.footer(tool::footer() + "\nA picture or file named - is standard input or output.");
   set_log(false);
-  pelo_tool::Exit result = pelo_tool::Exit::kDone;
-  for (pelo_tool::Register add : kCommands) add(app, result);
-  return tool::run(app, argc, argv, result);
+  return tool::run(app, kCommands, argc, argv);
 }

@@ -2,9 +2,10 @@
 #include <memory>
 
 #include "tavirpelo/tavirpelo.h"
+#include "tools/common/codec_objects.h"
 #include "tools/common/output.h"
 #include "tools/pelo/input.h"
-#include "tools/pelo/jpeg_output.h"
+#include "tools/pelo/jpeg_input.h"
 
 namespace pelo_tool {
 namespace {
@@ -44,12 +45,10 @@ Turn upright(uint32_t orientation) {
 }
 
 uint32_t orientation_of(std::vector<uint8_t>& bytes) {
-  const DecInfo info(TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, bytes.data(),
-                                             static_cast<int>(bytes.size()), TAVIRPELO_RGB888, 0));
-  TAVIRPELO_EXIFINFO* exif = info ? PELOJ_CreatExifInfo(info.get()) : nullptr;
-  const uint32_t orientation = exif != nullptr ? exif->orientation : 0u;
-  PELOJ_DestroyExifInfo(exif);
-  return orientation;
+  const tool::DecInfo info(TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, bytes.data(),
+                                                   static_cast<int>(bytes.size()), TAVIRPELO_RGB888, 0));
+  const tool::ExifInfo exif(info ? PELOJ_CreatExifInfo(info.get()) : nullptr);
+  return exif ? exif->orientation : 0;
 }
 
 Exit run(const Options& options) {
@@ -63,7 +62,7 @@ Exit run(const Options& options) {
   if (turn.angle == 0 && !turn.flip)
     return tool::write_bytes(options.output, bytes.data(), bytes.size());
 
-  CodecBuffer buffer;
+  tool::CodecBuffer buffer;
   ELO_DESTINATION destination{ELO_TO_MEMORY, buffer.size, 0, 0, nullptr, buffer.bytes};
   const int done = elo_rotate_jpeg(bytes.data(), static_cast<int>(bytes.size()), header.width,
                                    header.height, &destination, turn.angle, turn.flip, nullptr);

@@ -4,9 +4,9 @@
 #include "tavirpelo/raw.h"
 #include "tools/common/arguments.h"
 #include "tools/common/output.h"
+#include "tools/common/pnm.h"
 #include "tools/pelo/commands.h"
 #include "tools/pelo/input.h"
-#include "tools/pelo/pnm.h"
 
 namespace pelo_tool {
 namespace {
@@ -22,13 +22,13 @@ Exit run(const Options& options) {
   std::vector<uint8_t> bytes;
   const Exit result = read_all(options.picture, bytes);
   if (result != Exit::kDone) return result;
-  const std::optional<Pnm> in = parse_pnm(bytes);
+  const std::optional<tool::Pnm> in = tool::parse_pnm(bytes);
   if (!in || in->grey) {
     return fail(Exit::kRefused, "{}: not a binary PPM file of 8-bit samples", options.picture);
   }
   const auto [width, height] = options.size;
-  Pnm out{width, height, false,
-          std::vector<uint8_t>(static_cast<size_t>(width) * static_cast<size_t>(height) * 3)};
+  tool::Pnm out{width, height, false,
+                std::vector<uint8_t>(static_cast<size_t>(width) * static_cast<size_t>(height) * 3)};
   if (options.nearest) {
     TAVIRPELO_CODEC_Scale(in->pixels.data(), out.pixels.data(), in->width, in->height, 3 * in->width,
                           width, height, 3 * width, width, height, TAVIRPELO_RGB888, 0, 0);
@@ -36,8 +36,7 @@ Exit run(const Options& options) {
     PELO_RGB888Scale_ex(in->pixels.data(), in->width, in->height, in->width, out.pixels.data(), width,
                         height, width);
   }
-  const auto pnm = format_pnm(out);
-  return tool::write_bytes(options.output, pnm.data(), pnm.size());
+  return tool::write_pnm(options.output, out);
 }
 
 }  // namespace

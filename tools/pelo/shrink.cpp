@@ -2,9 +2,10 @@
 #include <memory>
 
 #include "tavirpelo/tavirpelo.h"
+#include "tools/common/codec_objects.h"
 #include "tools/common/output.h"
 #include "tools/pelo/input.h"
-#include "tools/pelo/jpeg_output.h"
+#include "tools/pelo/jpeg_input.h"
 
 namespace pelo_tool {
 namespace {
@@ -20,7 +21,7 @@ Exit run(const Options& options) {
   TAVIRPELO_HINFO header{};
   const Exit result = read_jpeg(options.picture, bytes, header);
   if (result != Exit::kDone) return result;
-  CodecBuffer buffer;
+  tool::CodecBuffer buffer;
   if (buffer.bytes == nullptr ||
       TAVIRPELO_ReEncodeJpegToBuffer(bytes.data(), static_cast<int>(bytes.size()), TAVIRPELO_IO_MEMORY,
                                      &buffer.bytes, &buffer.size, options.maxBytes) != 1) {

@@ -4,9 +4,9 @@
 #include "tavirpelo/yuv.h"
 #include "tools/common/arguments.h"
 #include "tools/common/output.h"
+#include "tools/common/pnm.h"
 #include "tools/pelo/commands.h"
 #include "tools/pelo/input.h"
-#include "tools/pelo/pnm.h"
 #include "tools/pelo/words.h"
 
 namespace pelo_tool {
@@ -33,8 +33,8 @@ Exit run(const Options& options) {
   std::vector<uint8_t> words(width * height * 2);
   const auto convert = options.pairs ? elo_OrbPYV0420toRGB565 : elo_OrbYUV420toRGB565;
   convert(frame.data(), options.size.width, options.size.height, words.data());
-  const auto pnm = format_pnm({options.size.width, options.size.height, false, rgb_of_words(words)});
-  return tool::write_bytes(options.output, pnm.data(), pnm.size());
+  return tool::write_pnm(options.output,
+                         {options.size.width, options.size.height, false, rgb_of_words(words)});
 }
 
 }  // namespace

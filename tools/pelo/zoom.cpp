@@ -6,10 +6,10 @@
 
 #include "tools/common/arguments.h"
 #include "tools/common/output.h"
+#include "tools/common/pnm.h"
 #include "tools/pelo/commands.h"
 #include "tools/pelo/input.h"
 #include "tools/pelo/numbers.h"
-#include "tools/pelo/pnm.h"
 
 namespace pelo_tool {
 namespace {
@@ -98,8 +98,7 @@ class Viewer {
     const std::string path = fmt::format("{}{:03}.ppm", options_.prefix, count_++);
     fmt::print("{}: {}, {} percent at {},{}{}\n", path, action, ratio, x, y,
                result == 2 ? ", limit" : "");
-    const auto pnm = format_pnm({width(), height(), false, pixels_});
-    return tool::write_bytes(path, pnm.data(), pnm.size());
+    return tool::write_pnm(path, {width(), height(), false, pixels_});
   }
 
  private:

@@ -7,9 +7,6 @@
 
 namespace vss {
 
-// Adds one subcommand; its outcome is stored in `result` when the command line has been read.
-using Register = void (*)(CLI::App& app, Exit& result);
-
 void register_create(CLI::App& app, Exit& result);
 void register_add(CLI::App& app, Exit& result);
 void register_insert(CLI::App& app, Exit& result);

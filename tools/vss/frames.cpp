@@ -1,10 +1,9 @@
 // vss frames: every frame of a GIF as it is shown, a PPM file each.
 #include <filesystem>
 #include <memory>
-#include <vector>
 
-#include "tavirpelo/tavirpelo.h"
-#include "tools/common/output.h"
+#include "tools/common/codec_objects.h"
+#include "tools/common/pnm.h"
 #include "tools/vss/commands.h"
 
 namespace vss {
@@ -18,15 +17,7 @@ struct Options {
   std::string folder;
 };
 
-struct DecInfoDeleter {
-  void operator()(TAVIRPELO_DECINFO* info) const {
-    TAVIRPELOI_AborAGIF(info);
-    TAVIRPELO_DestroyDecInfo(info);
-  }
-};
-using DecInfo = std::unique_ptr<TAVIRPELO_DECINFO, DecInfoDeleter>;
-
-Exit open_gif(const std::string& path, DecInfo& info) {
+Exit open_gif(const std::string& path, tool::DecInfo& info) {
   info.reset(TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_FILE, const_cast<char*>(path.c_str()), 0,
                                      TAVIRPELO_RGB888, TAVIRPELO_FIT_INSIDE));
   if (!info) return fail(Exit::kCannotOpen, "{}: cannot be opened", path);
@@ -49,23 +40,22 @@ Exit make_folder(const std::string& folder) {
 }
 
 Exit run(const Options& options) {
-  DecInfo info;
+  tool::DecInfo info;
   Exit result = open_gif(options.gif, info);
   if (result == Exit::kDone) result = make_folder(options.folder);
   if (result != Exit::kDone) return result;
-  const int width = info->imageWidth, height = info->imageHeight;
-  const std::string head = fmt::format("P6\n{} {}\n255\n", width, height);
-  std::vector<uint8_t> file(head.begin(), head.end());
-  file.resize(head.size() + size_t{3} * static_cast<size_t>(width) * static_cast<size_t>(height));
+  tool::Pnm picture{info->imageWidth, info->imageHeight, false, {}};
+  picture.pixels.resize(size_t{3} * static_cast<size_t>(picture.width) *
+                        static_cast<size_t>(picture.height));
   int answer = kAnother;
   for (int frame = 0; answer == kAnother; ++frame) {
-    answer = TAVIRPELOI_DecodeAGIF(info.get(), file.data() + head.size(), width, height);
+    answer = TAVIRPELOI_DecodeAGIF(info.get(), picture.pixels.data(), picture.width, picture.height);
     if (answer != kAnother && answer != kLast) {
       return fail(Exit::kRefused, "{}: frame {} cannot be decoded", options.gif, frame);
     }
     const std::string name = fmt::format("frame-{:03}.ppm", frame);
     const std::string path = (std::filesystem::path(options.folder) / name).string();
-    result = tool::write_bytes(path, file.data(), file.size());
+    result = tool::write_pnm(path, picture);
     if (result != Exit::kDone) return result;
     fmt::print("{}\n", path);
   }

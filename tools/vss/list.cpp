@@ -1,7 +1,7 @@
 // vss list: the pictures of a show, as a table or as JSON.
 #include <memory>
 
-#include "tools/common/json_text.h"
+#include "tools/common/text.h"
 #include "tools/vss/arguments.h"
 #include "tools/vss/commands.h"
 #include "tools/vss/show_file.h"
@@ -18,9 +18,9 @@ void print_table(const SlideShow& show) {
   fmt::print("{:>5}  {:<36}  {:>9}  {:>8}  {}\n", "index", "name", "size", "bytes", "source");
   for (int i = 0; i < show.subfileCount; ++i) {
     const subfileInfo& entry = show.subfiles[i];
-    fmt::print("{:>5}  {:<36}  {:>9}  {:>8}  {}\n", i, printable(entry.name),
+    fmt::print("{:>5}  {:<36}  {:>9}  {:>8}  {}\n", i, tool::printable(entry.name),
                fmt::format("{}x{}", entry.width, entry.height), show.GetSizeOfSubfile(i),
-               printable(entry.path));
+               tool::printable(entry.path));
   }
 }
 

@@ -6,7 +6,7 @@ const char tool::kProgram[] = "vss";
 
 namespace {
 
-constexpr vss::Register kCommands[] = {
+constexpr tool::Register kCommands[] = {
     vss::register_create, vss::register_add,      vss::register_insert,  vss::register_remove,
     vss::register_list,   vss::register_get,      vss::register_thumb,   vss::register_sheet,
     vss::register_music,  vss::register_settings, vss::register_compact, vss::register_frames,
@@ -17,9 +17,6 @@ constexpr vss::Register kCommands[] = {
 int main(int argc, char** argv) {
   CLI::App app{"Slide shows in one file: up to 20 pictures with settings and music.", tool::kProgram};
   app.set_version_flag("--version", "vss " VSS_VERSION);
-  app.require_subcommand(1);
   app.footer(tool::footer());
-  vss::Exit result = vss::Exit::kDone;
-  for (vss::Register add : kCommands) add(app, result);
-  return tool::run(app, argc, argv, result);
+  return tool::run(app, kCommands, argc, argv);
 }

@@ -9,12 +9,6 @@
 namespace vss {
 namespace {
 
-constexpr int kFirstBuffer = 64 * 1024;  // bytes; the encoder enlarges it as needed
-
-struct OsDeleter {
-  void operator()(uint8_t* block) const { TAVIRPELO_OsFree(block); }
-};
-
 // Copies the opaque pixels of a row (B G R A) onto a row of the canvas (R G B).
 void copy_opaque(const uint8_t* source, uint8_t* target, int width) {
   for (int i = 0; i < width; ++i, source += 4, target += 3) {
@@ -52,13 +46,11 @@ bool draw_slide(SlideShow& show, int index, TAVIRPELO_RAWINFO& canvas, int x, in
 
 Exit write_jpeg(const SlideShow& show, const std::string& path, const TAVIRPELO_RAWINFO& canvas,
                 int quality) {
-  int size = kFirstBuffer;
-  auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(kFirstBuffer));
-  if (!buffer || TAVIRPELO_EncodeJpegToBuffer(&canvas, &buffer, &size, quality) != 1) {
+  tool::CodecBuffer buffer;
+  if (!buffer.encode(canvas, quality)) {
     return fail(Exit::kRefused, "{}: cannot encode {}x{} pixels", path, canvas.width, canvas.height);
   }
-  std::unique_ptr<uint8_t, OsDeleter> owner(buffer);
-  return write_output(show, path, buffer, static_cast<size_t>(size));
+  return write_output(show, path, buffer.bytes, static_cast<size_t>(buffer.size));
 }
 
 Exit write_output(const SlideShow& show, const std::string& path, const uint8_t* bytes, size_t size) {

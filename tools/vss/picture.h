@@ -2,21 +2,17 @@
 #pragma once
 
 #include <cstdint>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include "slideshow/SlideShow.h"
-#include "tavirpelo/tavirpelo.h"
+#include "tools/common/codec_objects.h"
 #include "tools/vss/arguments.h"
 #include "tools/vss/exit_code.h"
 
 namespace vss {
 
-struct RawDeleter {
-  void operator()(TAVIRPELO_RAWINFO* raw) const { TAVIRPELO_DestroyRawInfo(raw); }
-};
-using RawImage = std::unique_ptr<TAVIRPELO_RAWINFO, RawDeleter>;
+using tool::RawImage;
 
 // A picture of one colour, R G B bytes; null when memory is short.
 RawImage create_canvas(Size size, uint8_t grey);

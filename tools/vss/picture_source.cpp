@@ -8,14 +8,15 @@
 #include <cstring>
 #include <filesystem>
 
+#include "tools/common/text.h"
 #include "tools/vss/picture.h"
 #include "tools/vss/show_file.h"
 
 namespace vss {
 namespace {
 
-constexpr size_t kMaxPathBytes = 255;  // what a picture's record holds
-constexpr int kMaxSourceSide = 5000;   // what the decoders take
+constexpr size_t kMaxPathBytes = sizeof(subfileInfo::path) - 1;
+constexpr int kMaxSourceSide = 5000;  // what the decoders take
 
 // The part of an addition that depends on the picture alone; true when it works.
 bool decodes(const SlideShow& show, const std::string& path, const TAVIRPELO_HINFO& header) {
@@ -71,7 +72,7 @@ Exit add_picture(SlideShow& show, const std::string& path, int index, const std:
     return fail(Exit::kWriteFailure, "{}: cannot be written", show.pathName);
   }
   const subfileInfo& entry = show.subfiles[index];
-  fmt::print("{:>5}  {:<36}  {:>11}  {:>9}  {:>8}  {:>6.1f} ms\n", index, printable(entry.name),
+  fmt::print("{:>5}  {:<36}  {:>11}  {:>9}  {:>8}  {:>6.1f} ms\n", index, tool::printable(entry.name),
              fmt::format("{}x{}", header.width, header.height),
              fmt::format("{}x{}", entry.width, entry.height), show.GetSizeOfSubfile(index),
              time.count());

@@ -44,13 +44,4 @@ Exit check_index(const SlideShow& show, int index) {
               show.subfileCount);
 }
 
-std::string printable(const char* text) {
-  std::string result(text);
-  for (char& c : result) {
-    auto byte = static_cast<unsigned char>(c);
-    if (byte < 0x20 || byte == 0x7F) c = '?';
-  }
-  return result;
-}
-
 }  // namespace vss

@@ -20,7 +20,4 @@ Exit open_show(SlideShow& show, const std::string& path, Access access);
 // Complains unless the show has a picture of that index.
 Exit check_index(const SlideShow& show, int index);
 
-// Text from a container made harmless for a terminal: control characters become '?'.
-std::string printable(const char* text);
-
 }  // namespace vss

@@ -1,11 +1,13 @@
-#include "tools/pelo/pnm.h"
+#include "tools/common/pnm.h"
 
 #include <fmt/format.h>
 
 #include <algorithm>
 #include <cctype>
 
-namespace pelo_tool {
+#include "tools/common/output.h"
+
+namespace tool {
 namespace {
 
 // The header's words: decimal numbers between white space and comments, which run to the line's end.
@@ -65,12 +67,12 @@ std::optional<Pnm> parse_pnm(const std::vector<uint8_t>& bytes) {
   return picture;
 }
 
-std::vector<uint8_t> format_pnm(const Pnm& picture) {
+Exit write_pnm(const std::string& path, const Pnm& picture) {
   std::string header =
       fmt::format("P{}\n{} {}\n255\n", picture.grey ? 5 : 6, picture.width, picture.height);
   std::vector<uint8_t> bytes(header.begin(), header.end());
   bytes.insert(bytes.end(), picture.pixels.begin(), picture.pixels.end());
-  return bytes;
+  return write_bytes(path, bytes.data(), bytes.size());
 }
 
 std::vector<uint8_t> luma_of(const std::vector<uint8_t>& rgb) {
@@ -82,4 +84,4 @@ std::vector<uint8_t> luma_of(const std::vector<uint8_t>& rgb) {
   return grey;
 }
 
-}  // namespace pelo_tool
+}  // namespace tool

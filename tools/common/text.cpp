@@ -1,5 +1,4 @@
-// Text as a JSON string (RFC 8259, section 7).
-#include "tools/common/json_text.h"
+#include "tools/common/text.h"
 
 #include <fmt/format.h>
 
@@ -30,6 +29,15 @@ size_t sequence_length(std::string_view text) {
 }
 
 }  // namespace
+
+std::string printable(std::string_view text) {
+  std::string result(text);
+  for (char& c : result) {
+    auto byte = static_cast<unsigned char>(c);
+    if (byte < 0x20 || byte == 0x7F) c = '?';
+  }
+  return result;
+}
 
 std::string json_text(std::string_view text) {
   std::string result = "\"";

@@ -1,4 +1,4 @@
-// Portable pixmaps and greymaps (binary, P6 and P5), the plain picture format of the tool.
+// Portable pixmaps and greymaps (binary, P6 and P5), the plain picture format of the tools.
 #pragma once
 
 #include <cstdint>
@@ -6,7 +6,9 @@
 #include <string>
 #include <vector>
 
-namespace pelo_tool {
+#include "tools/common/exit_code.h"
+
+namespace tool {
 
 struct Pnm {
   int width = 0;
@@ -19,9 +21,10 @@ struct Pnm {
 // follows the picture is ignored.
 std::optional<Pnm> parse_pnm(const std::vector<uint8_t>& bytes);
 
-std::vector<uint8_t> format_pnm(const Pnm& picture);
+// Writes a file, or standard output for "-".
+Exit write_pnm(const std::string& path, const Pnm& picture);
 
 // The luma of R G B pixels (ITU-R BT.601).
 std::vector<uint8_t> luma_of(const std::vector<uint8_t>& rgb);
 
-}  // namespace pelo_tool
+}  // namespace tool

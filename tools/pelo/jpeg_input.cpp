@@ -1,21 +1,10 @@
-#include "tools/pelo/jpeg_output.h"
+#include "tools/pelo/jpeg_input.h"
 
 #include <climits>
 
 #include "tools/pelo/input.h"
 
 namespace pelo_tool {
-
-namespace {
-constexpr int kFirstBuffer = 64 * 1024;
-}
-
-CodecBuffer::CodecBuffer()
-    : bytes(static_cast<uint8_t*>(TAVIRPELO_OsMalloc(kFirstBuffer))),
-      size(bytes != nullptr ? kFirstBuffer : 0) {}
-CodecBuffer::~CodecBuffer() {
-  TAVIRPELO_OsFree(bytes);
-}
 
 Exit read_jpeg(const std::string& path, std::vector<uint8_t>& bytes, TAVIRPELO_HINFO& header) {
   const Exit result = read_all(path, bytes);
