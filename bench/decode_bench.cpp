@@ -1,58 +1,45 @@
-// Decoding a large photograph from memory at each scale, without its thumbnail.
-#include <memory>
-
+// Decoding a large photograph from memory at each scale, without its thumbnail: baseline, and stored
+// progressively.
 #include "bench/job.h"
-#include "bench/peer.h"
-#include "tavirpelo/tavirpelo.h"
+#include "bench/ours.h"
 
 namespace bench {
 namespace {
 
-struct Scale {
-  const char* name;
-  int eighths;
-};
+constexpr uint32_t kOption = TAVIRPELO_THUMBNAIL_NEVER;
 
-constexpr Scale kScales[] = {{"1/1", 8}, {"1/2", 4}, {"3/8", 3}, {"1/4", 2}, {"1/8", 1}};
-
-bool decode_rgb(const Bytes& jpeg, TAVIRPELO_RAWINFO* raw) {
-  return TAVIRPELO_DecodeJpegFromBuffer(const_cast<uint8_t*>(jpeg.data()), static_cast<int>(jpeg.size()),
-                                        raw, TAVIRPELO_THUMBNAIL_NEVER) == 1;
+void register_scale(const std::string& name, const Shared& jpeg, peer::Size size, int format,
+                    TJPF peerFormat) {
+  auto out = std::make_shared<Bytes>(size.pixels() * 4);
+  register_job({name,
+                [=] { return decode(TAVIRPELO_DecodeJPEG, *jpeg, format, kOption, size, out->data()); },
+                [=](int flags) { return peer::decode(*jpeg, size, peerFormat, flags, out->data()); }});
 }
 
-bool decode_bgra(const Bytes& jpeg, uint8_t* pixels, peer::Size size) {
-  TAVIRPELO_DECINFO* info = TAVIRPELO_CreateDecInfo(
-      TAVIRPELO_IO_MEMORY, const_cast<uint8_t*>(jpeg.data()), static_cast<int>(jpeg.size()),
-      TAVIRPELO_BGRA8888, TAVIRPELO_THUMBNAIL_NEVER);
-  if (!info) return false;
-  int done = TAVIRPELO_DecodeJPEG(info, pixels, size.width, size.height);
-  TAVIRPELO_DestroyDecInfo(info);
-  return done == 1;
+// Progressive data has no scale of three eighths.
+void register_scales(const std::string& kind, const Shared& jpeg, bool threeEighths) {
+  struct Scale {
+    const char* name;
+    int eighths;
+  };
+  const peer::Size full = peer::size_of(*jpeg);
+  for (const Scale& scale :
+       {Scale{"1/1", 8}, Scale{"1/2", 4}, Scale{"3/8", 3}, Scale{"1/4", 2}, Scale{"1/8", 1}}) {
+    if (scale.eighths == 3 && !threeEighths) continue;
+    register_scale(kind + " " + scale.name + " RGB", jpeg, full.scaled(scale.eighths), TAVIRPELO_RGB888,
+                   TJPF_RGB);
+  }
 }
 
 }  // namespace
 
 void register_decode_jobs(const Bytes& photograph) {
-  peer::Size full = peer::size_of(photograph);
-  for (const Scale& scale : kScales) {
-    peer::Size size{(full.width * scale.eighths + 7) / 8, (full.height * scale.eighths + 7) / 8};
-    std::shared_ptr<TAVIRPELO_RAWINFO> raw(
-        TAVIRPELO_CreateRawInfo(size.width, size.height, TAVIRPELO_RGB888), TAVIRPELO_DestroyRawInfo);
-    if (!raw) continue;
-    register_job({std::string("decode ") + scale.name + " RGB",
-                  [&photograph, raw] { return decode_rgb(photograph, raw.get()); },
-                  [&photograph, raw, size](int flags) {
-                    auto* pixels = static_cast<uint8_t*>(raw->pData);
-                    return peer::decode(photograph, size, TJPF_RGB, flags, pixels);
-                  }});
-  }
-  auto pixels =
-      std::make_shared<Bytes>(static_cast<size_t>(full.width) * static_cast<size_t>(full.height) * 4);
-  register_job({"decode 1/1 BGRA",
-                [&photograph, pixels, full] { return decode_bgra(photograph, pixels->data(), full); },
-                [&photograph, pixels, full](int flags) {
-                  return peer::decode(photograph, full, TJPF_BGRA, flags, pixels->data());
-                }});
+  const auto baseline = std::make_shared<Bytes>(photograph);
+  register_scales("decode", baseline, true);
+  register_scale("decode 1/1 BGRA", baseline, peer::size_of(photograph), TAVIRPELO_BGRA8888, TJPF_BGRA);
+  const auto progressive = std::make_shared<Bytes>();
+  if (!peer::transform(photograph, TJXOP_NONE, TJXOPT_PROGRESSIVE, progressive.get())) return;
+  register_scales("progressive", progressive, false);
 }
 
 }  // namespace bench

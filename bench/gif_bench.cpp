@@ -6,8 +6,7 @@
 #include <memory>
 
 #include "bench/job.h"
-#include "bench/peer.h"
-#include "tavirpelo/tavirpelo.h"
+#include "bench/ours.h"
 
 namespace bench {
 namespace {
@@ -16,21 +15,11 @@ constexpr peer::Size kStill{1632, 1224};
 constexpr peer::Size kScreen{480, 360};
 constexpr int kFrames = 12;
 
-using Shared = std::shared_ptr<Bytes>;
-
-size_t pixels_of(peer::Size size) {
-  return static_cast<size_t>(size.width) * static_cast<size_t>(size.height);
-}
-
 // The photograph at a size, as indices of the 3-3-2 palette with an ordered dither.
 Bytes indices_of(const Bytes& photograph, peer::Size size) {
-  Bytes rgb(pixels_of(size) * 3);
-  TAVIRPELO_RAWINFO raw{static_cast<uint32_t>(size.width), static_cast<uint32_t>(size.height),
-                        rgb.data(), TAVIRPELO_RGB888};
-  TAVIRPELO_DecodeJpegFromBuffer(const_cast<uint8_t*>(photograph.data()),
-                                 static_cast<int>(photograph.size()), &raw, TAVIRPELO_FIT_STRETCH);
+  const Bytes rgb = pixels_of(photograph, size, TAVIRPELO_RGB888);
   constexpr int kDither[4][4] = {{0, 8, 2, 10}, {12, 4, 14, 6}, {3, 11, 1, 9}, {15, 7, 13, 5}};
-  Bytes indices(pixels_of(size));
+  Bytes indices(size.pixels());
   for (size_t i = 0; i < indices.size(); ++i) {
     const size_t row = i / static_cast<size_t>(size.width), column = i % static_cast<size_t>(size.width);
     const int lift = kDither[row & 3][column & 3];
@@ -180,20 +169,7 @@ bool frames_by_giflib(const Bytes& file, Bytes& out) {
   });
 }
 
-TAVIRPELO_DECINFO* open(Bytes& file, int format) {
-  return TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, file.data(), static_cast<int>(file.size()), format,
-                                 0);
-}
-
-bool still(Bytes& file, Bytes& out, peer::Size size) {
-  TAVIRPELO_DECINFO* info = open(file, TAVIRPELO_RGB888);
-  if (info == nullptr) return false;
-  const int done = TAVIRPELOI_DecodeGIF(info, out.data(), size.width, size.height);
-  TAVIRPELO_DestroyDecInfo(info);
-  return done == 1;
-}
-
-bool frames(Bytes& file, Bytes& out) {
+bool frames(const Bytes& file, Bytes& out) {
   TAVIRPELO_DECINFO* info = open(file, TAVIRPELO_RGBA8888);
   if (info == nullptr) return false;
   int answer;
@@ -209,14 +185,19 @@ bool frames(Bytes& file, Bytes& out) {
 void register_gif_jobs(const Bytes& photograph) {
   for (const bool interlaced : {false, true}) {
     auto file = std::make_shared<Bytes>(encode_still(photograph, interlaced));
-    auto out = std::make_shared<Bytes>(pixels_of(kStill) * 3);
-    register_job({interlaced ? "GIF interlaced RGB" : "GIF 2 MP RGB",
-                  [file, out] { return still(*file, *out, kStill); },
-                  [file, out](int) { return still_by_giflib(*file, *out); }});
+    auto out = std::make_shared<Bytes>(kStill.pixels() * 3);
+    register_job(
+        {interlaced ? "GIF interlaced RGB" : "GIF 2 MP RGB",
+         [=] { return decode(TAVIRPELOI_DecodeGIF, *file, TAVIRPELO_RGB888, 0, kStill, out->data()); },
+         [file, out](int) { return still_by_giflib(*file, *out); }});
     if (interlaced) continue;
     // The peer has no reduction of its own: it decodes whole, and then picks pixels.
-    auto small = std::make_shared<Bytes>(pixels_of(kScreen) * 3);
-    register_job({"GIF 2 MP to a slide", [file, small] { return still(*file, *small, kScreen); },
+    auto small = std::make_shared<Bytes>(kScreen.pixels() * 3);
+    register_job({"GIF 2 MP to a slide",
+                  [=] {
+                    return decode(TAVIRPELOI_DecodeGIF, *file, TAVIRPELO_RGB888, 0, kScreen,
+                                  small->data());
+                  },
                   [file, out, small](int) {
                     if (!still_by_giflib(*file, *out)) return false;
                     peer::reduce(out->data(), kStill, small->data(), kScreen);
@@ -224,7 +205,7 @@ void register_gif_jobs(const Bytes& photograph) {
                   }});
   }
   auto file = std::make_shared<Bytes>(encode_animation(photograph));
-  auto out = std::make_shared<Bytes>(pixels_of(kScreen) * 4);
+  auto out = std::make_shared<Bytes>(kScreen.pixels() * 4);
   register_job({"GIF of 12 frames RGBA", [file, out] { return frames(*file, *out); },
                 [file, out](int) { return frames_by_giflib(*file, *out); }});
 }

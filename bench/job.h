@@ -3,12 +3,14 @@
 
 #include <cstdint>
 #include <functional>
+#include <memory>
 #include <string>
 #include <vector>
 
 namespace bench {
 
 using Bytes = std::vector<uint8_t>;
+using Shared = std::shared_ptr<Bytes>;  // what a job keeps until it runs
 
 struct Job {
   std::string name;

@@ -62,9 +62,22 @@ unsigned long encode(const uint8_t* rgb, Size size, int quality, int flags) {
   return result == 0 ? bytes : 0;
 }
 
+bool transform(const Bytes& jpeg, int operation, int options, Bytes* result) {
+  const Handle handle(tjInitTransform());
+  tjtransform wanted{};
+  wanted.op = operation;
+  wanted.options = options;
+  unsigned char* out = nullptr;
+  unsigned long size = 0;
+  const bool done = tjTransform(handle.get(), jpeg.data(), jpeg.size(), 1, &out, &size, &wanted, 0) == 0;
+  if (done && result != nullptr) result->assign(out, out + size);
+  tjFree(out);
+  return done;
+}
+
 Size scale_at_least(Size size, int width) {
   for (int eighths = 1; eighths < 8; ++eighths) {
-    Size scaled{(size.width * eighths + 7) / 8, (size.height * eighths + 7) / 8};
+    const Size scaled = size.scaled(eighths);
     if (scaled.width >= width) return scaled;
   }
   return size;

@@ -47,15 +47,4 @@ void prepare_libyuv() {
   libyuv::MaskCpuFlags(without_simd() ? 1 : -1);
 }
 
-Bytes pixels_of(const Bytes& photograph, Size size, int format) {
-  Bytes pixels(static_cast<size_t>(size.width) * static_cast<size_t>(size.height) *
-               static_cast<size_t>(format == TAVIRPELO_YUV420 ? 2 : pelo::bytes_per_pixel(format)));
-  TAVIRPELO_DECINFO* info =
-      TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, const_cast<uint8_t*>(photograph.data()),
-                              static_cast<int>(photograph.size()), format, TAVIRPELO_FIT_STRETCH);
-  TAVIRPELO_DecodeJPEG(info, pixels.data(), size.width, size.height);
-  TAVIRPELO_DestroyDecInfo(info);
-  return pixels;
-}
-
 }  // namespace bench::peer

@@ -25,7 +25,4 @@ class Scaler {
 // To be called before libyuv is used.
 void prepare_libyuv();
 
-// The photograph at a size, as packed pixels of a format.
-Bytes pixels_of(const Bytes& photograph, Size size, int format);
-
 }  // namespace bench::peer

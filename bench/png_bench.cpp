@@ -6,26 +6,14 @@
 #include <memory>
 
 #include "bench/job.h"
-#include "bench/peer.h"
-#include "tavirpelo/tavirpelo.h"
+#include "bench/ours.h"
+#include "codec/core/ground/byte_order.h"
 
 namespace bench {
 namespace {
 
 constexpr int kWidth = 1632, kHeight = 1224;
-
-Bytes two_megapixels(const Bytes& photograph) {
-  Bytes rgb(size_t{kWidth} * kHeight * 3);
-  TAVIRPELO_RAWINFO raw{};
-  raw.width = kWidth;
-  raw.height = kHeight;
-  raw.pData = rgb.data();
-  raw.format = TAVIRPELO_RGB888;
-  const int done =
-      TAVIRPELO_DecodeJpegFromBuffer(const_cast<uint8_t*>(photograph.data()),
-                                     static_cast<int>(photograph.size()), &raw, TAVIRPELO_FIT_STRETCH);
-  return done == 1 ? rgb : Bytes();
-}
+constexpr peer::Size kSize{kWidth, kHeight};
 
 void append(png_structp png, png_bytep data, size_t size) {
   auto* out = static_cast<Bytes*>(png_get_io_ptr(png));
@@ -64,18 +52,6 @@ Bytes quantised(const Bytes& rgb) {
   return indices;
 }
 
-using Shared = std::shared_ptr<Bytes>;
-
-bool decode_ours(int (*decode)(TAVIRPELO_DECINFO*, void*, int, int), Bytes& file, int format,
-                 Bytes& out) {
-  TAVIRPELO_DECINFO* info = TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, file.data(),
-                                                    static_cast<int>(file.size()), format, 0);
-  if (info == nullptr) return false;
-  const int done = decode(info, out.data(), kWidth, kHeight);
-  TAVIRPELO_DestroyDecInfo(info);
-  return done == 1;
-}
-
 bool decode_libpng(const Bytes& file, uint32_t format, Bytes& out) {
   png_image image{};
   image.version = PNG_IMAGE_VERSION;
@@ -87,47 +63,43 @@ bool decode_libpng(const Bytes& file, uint32_t format, Bytes& out) {
 void register_png(const char* name, Bytes file, int format, uint32_t peerFormat) {
   auto png = std::make_shared<Bytes>(std::move(file));
   auto out = std::make_shared<Bytes>(size_t{kWidth} * kHeight * 4);
-  register_job({name, [=] { return decode_ours(TAVIRPELOI_DecodePNG, *png, format, *out); },
+  register_job({name, [=] { return decode(TAVIRPELOI_DecodePNG, *png, format, 0, kSize, out->data()); },
                 [=](int) { return decode_libpng(*png, peerFormat, *out); }});
-}
-
-void put_le(Bytes& out, size_t at, uint32_t value) {
-  for (size_t i = 0; i < 4; ++i) out[at + i] = static_cast<uint8_t>(value >> 8 * i);
 }
 
 // Rows from below, as BMP stores them; 4896 bytes need no padding.
 void register_bmp(const Bytes& rgb) {
   constexpr size_t kHead = 54, kRow = size_t{kWidth} * 3;
   auto bmp = std::make_shared<Bytes>(kHead + rgb.size());
-  put_le(*bmp, 0, 'B' | 'M' << 8);
-  put_le(*bmp, 10, kHead);
-  put_le(*bmp, 14, 40);
-  put_le(*bmp, 18, kWidth);
-  put_le(*bmp, 22, kHeight);
-  put_le(*bmp, 26, 1 | 24 << 16);
+  pelo::store_le32(bmp->data() + 0, 'B' | 'M' << 8);
+  pelo::store_le32(bmp->data() + 10, kHead);
+  pelo::store_le32(bmp->data() + 14, 40);
+  pelo::store_le32(bmp->data() + 18, kWidth);
+  pelo::store_le32(bmp->data() + 22, kHeight);
+  pelo::store_le32(bmp->data() + 26, 1 | 24 << 16);
   std::copy(rgb.begin(), rgb.end(), bmp->begin() + kHead);
   auto out = std::make_shared<Bytes>(size_t{kWidth} * kHeight * 4);
-  register_job({"BMP 24 bits to RGB",
-                [=] { return decode_ours(TAVIRPELOI_DecodeBMP, *bmp, TAVIRPELO_RGB888, *out); },
-                [=](int) {
-                  for (size_t y = 0; y < kHeight; ++y) {
-                    const uint8_t* in = bmp->data() + kHead + (kHeight - 1 - y) * kRow;
-                    uint8_t* pixel = out->data() + y * kRow;
-                    for (size_t x = 0; x < kRow; x += 3) {
-                      pixel[x] = in[x + 2];
-                      pixel[x + 1] = in[x + 1];
-                      pixel[x + 2] = in[x];
-                    }
-                  }
-                  return true;
-                }});
+  register_job(
+      {"BMP 24 bits to RGB",
+       [=] { return decode(TAVIRPELOI_DecodeBMP, *bmp, TAVIRPELO_RGB888, 0, kSize, out->data()); },
+       [=](int) {
+         for (size_t y = 0; y < kHeight; ++y) {
+           const uint8_t* in = bmp->data() + kHead + (kHeight - 1 - y) * kRow;
+           uint8_t* pixel = out->data() + y * kRow;
+           for (size_t x = 0; x < kRow; x += 3) {
+             pixel[x] = in[x + 2];
+             pixel[x + 1] = in[x + 1];
+             pixel[x + 2] = in[x];
+           }
+         }
+         return true;
+       }});
 }
 
 }  // namespace
 
 void register_png_jobs(const Bytes& photograph) {
-  Bytes rgb = two_megapixels(photograph);
-  if (rgb.empty()) return;
+  Bytes rgb = pixels_of(photograph, kSize, TAVIRPELO_RGB888);
   Bytes indices = quantised(rgb);
   const Bytes truecolour = encode_png(rgb, PNG_COLOR_TYPE_RGB, PNG_INTERLACE_NONE);
   register_png("PNG truecolour to RGB", truecolour, TAVIRPELO_RGB888, PNG_FORMAT_RGB);

@@ -3,8 +3,8 @@
 
 #include <memory>
 
+#include "bench/ours.h"
 #include "bench/picture_peer.h"
-#include "tavirpelo/tavirpelo.h"
 
 namespace bench {
 namespace {
@@ -12,17 +12,15 @@ namespace {
 constexpr peer::Size kLarge{1632, 1224}, kSmall{480, 360}, kSquare{1428, 1428};
 constexpr int kBytes[] = {2, 3};  // a pixel of format 0 and 1
 
-using Shared = std::shared_ptr<Bytes>;
-
 Shared share(Bytes bytes) {
   return std::make_shared<Bytes>(std::move(bytes));
 }
 Shared room_for(peer::Size size) {
-  return share(Bytes(static_cast<size_t>(size.width) * static_cast<size_t>(size.height) * 4));
+  return share(Bytes(size.pixels() * 4));
 }
 
 void register_scaling(const char* name, const Bytes& photograph, int format, int quality) {
-  const Shared in = share(peer::pixels_of(photograph, kLarge, format)), out = room_for(kSmall);
+  const Shared in = share(pixels_of(photograph, kLarge, format)), out = room_for(kSmall);
   const auto sws = std::make_shared<peer::Scaler>(kLarge, kSmall, format);
   const int stride = kLarge.width * kBytes[format];
   register_job({name,
@@ -42,7 +40,7 @@ void register_scaling(const char* name, const Bytes& photograph, int format, int
 }
 
 void register_enlarging(const char* name, const Bytes& photograph, int format) {
-  const Shared in = share(peer::pixels_of(photograph, kSmall, format)), out = room_for(kLarge);
+  const Shared in = share(pixels_of(photograph, kSmall, format)), out = room_for(kLarge);
   const auto sws = std::make_shared<peer::Scaler>(kSmall, kLarge, format);
   register_job({name,
                 [=] {
@@ -58,7 +56,7 @@ void register_enlarging(const char* name, const Bytes& photograph, int format) {
 
 // The peer blends four bytes over four, ours four over three.
 void register_blend(const Bytes& photograph) {
-  const Shared in = share(peer::pixels_of(photograph, kLarge, TAVIRPELO_RGBA8888));
+  const Shared in = share(pixels_of(photograph, kLarge, TAVIRPELO_RGBA8888));
   for (size_t i = 3; i < in->size(); i += 4) (*in)[i] = static_cast<uint8_t>(i / 4);
   const Shared out = room_for(kLarge);
   constexpr int kStride = kLarge.width * 4;
@@ -76,7 +74,7 @@ void register_blend(const Bytes& photograph) {
 
 // Ours turns by any angle; the peer by quarters.
 void register_rotation(const Bytes& photograph) {
-  const Shared in = share(peer::pixels_of(photograph, kSquare, TAVIRPELO_RGBA8888));
+  const Shared in = share(pixels_of(photograph, kSquare, TAVIRPELO_RGBA8888));
   const Shared out = room_for(kSquare);
   constexpr int kStride = kSquare.width * 4;
   register_job(
@@ -93,7 +91,7 @@ void register_rotation(const Bytes& photograph) {
 
 // Planes, or the same bytes as a plane of pairs.
 void register_frames(const Bytes& photograph) {
-  const Shared in = share(peer::pixels_of(photograph, kLarge, TAVIRPELO_YUV420));
+  const Shared in = share(pixels_of(photograph, kLarge, TAVIRPELO_YUV420));
   const Shared out = room_for(kLarge);
   constexpr int kWidth = kLarge.width, kHeight = kLarge.height, kPixels = kWidth * kHeight;
   const uint8_t* chroma = in->data() + kPixels;

@@ -57,9 +57,8 @@ void register_road(const Bytes& photograph) {
                   peer::Size full = peer::size_of(photograph);
                   peer::Size scaled = peer::scale_at_least(full, kShowSide);
                   peer::Size size = slide_size(full);
-                  Bytes large(static_cast<size_t>(scaled.width) * static_cast<size_t>(scaled.height) *
-                              3);
-                  Bytes small(static_cast<size_t>(size.width) * static_cast<size_t>(size.height) * 3);
+                  Bytes large(scaled.pixels() * 3);
+                  Bytes small(size.pixels() * 3);
                   if (!peer::decode(photograph, scaled, TJPF_RGB, flags, large.data())) return false;
                   peer::reduce(large.data(), scaled, small.data(), size);
                   return peer::encode(small.data(), size, kStoredQuality, flags) != 0;
@@ -101,8 +100,7 @@ struct StoredShow {
 void register_draw(const Bytes& photograph) {
   auto stored = std::make_shared<StoredShow>(photograph);
   peer::Size size{stored->show.GetSubWidth(0), stored->show.GetSubHeight(0)};
-  auto pixels =
-      std::make_shared<Bytes>(static_cast<size_t>(size.width) * static_cast<size_t>(size.height) * 4);
+  auto pixels = std::make_shared<Bytes>(size.pixels() * 4);
   register_job({"draw slide BGRA",
                 [=] { return stored->show.GetDrawble(0, pixels->data(), size.width, size.height) == 1; },
                 [=](int flags) {

@@ -2,8 +2,8 @@
 // the next ones against libswscale on the same part of the zoom image.
 #include <memory>
 
+#include "bench/ours.h"
 #include "bench/picture_peer.h"
-#include "tavirpelo/tavirpelo.h"
 
 namespace bench {
 namespace {
@@ -14,10 +14,7 @@ constexpr int kFormat = TAVIRPELO_RGB888;
 
 // An object with its display; the zoom starts on demand.
 struct Zoom {
-  explicit Zoom(const Bytes& photograph)
-      : info(TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, const_cast<uint8_t*>(photograph.data()),
-                                     static_cast<int>(photograph.size()), kFormat,
-                                     TAVIRPELO_THUMBNAIL_NEVER)) {}
+  explicit Zoom(const Bytes& photograph) : info(open(photograph, kFormat, TAVIRPELO_THUMBNAIL_NEVER)) {}
   ~Zoom() { TAVIRPELO_DestroyDecInfo(info); }
   Zoom(const Zoom&) = delete;
   Zoom& operator=(const Zoom&) = delete;
@@ -34,7 +31,7 @@ struct Zoom {
   }
 
   TAVIRPELO_DECINFO* info;
-  Bytes display = Bytes(static_cast<size_t>(kDisplay.width * kDisplay.height * 3));
+  Bytes display = Bytes(kDisplay.pixels() * 3);
 };
 
 void register_first_view(const Bytes& photograph) {
@@ -45,8 +42,8 @@ void register_first_view(const Bytes& photograph) {
                 },
                 [&photograph](int flags) {
                   const peer::Size scaled = peer::scale_at_least(peer::size_of(photograph), 2300);
-                  Bytes image(static_cast<size_t>(scaled.width * scaled.height * 3));
-                  Bytes display(static_cast<size_t>(kDisplay.width * kDisplay.height * 3));
+                  Bytes image(scaled.pixels() * 3);
+                  Bytes display(kDisplay.pixels() * 3);
                   if (!peer::decode(photograph, scaled, TJPF_RGB, flags, image.data())) return false;
                   peer::reduce(image.data(), scaled, display.data(), kDisplay);
                   return true;
