@@ -7,7 +7,7 @@
 
 #include "bench/job.h"
 #include "bench/ours.h"
-#include "codec/core/ground/byte_order.h"
+#include "codec/base/byte_order.h"
 
 namespace bench {
 namespace {

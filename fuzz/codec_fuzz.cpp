@@ -5,9 +5,9 @@
 #include <cstring>
 #include <vector>
 
-#include "codec/core/ground/byte_order.h"
+#include "codec/base/byte_order.h"
 #include "codec/pixel/packers.h"
-#include "codec/png/crc32.h"
+#include "codec/formats/png/crc32.h"
 #include "platform/android_log.h"
 #include "tavirpelo/tavirpelo.h"
 

@@ -2,7 +2,7 @@
 
 #include <cstddef>
 
-#include "codec/core/ground/byte_order.h"
+#include "codec/base/byte_order.h"
 #include "slideshow/text_field.h"
 
 namespace pelo::slideshow {

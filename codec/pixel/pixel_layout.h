@@ -4,7 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "codec/core/ground/byte_order.h"
+#include "codec/base/byte_order.h"
 #include "tavirpelo/decinfo.h"
 
 namespace pelo {

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstddef>
 
-#include "codec/core/ground/byte_order.h"
+#include "codec/base/byte_order.h"
 #include "codec/pixel/pixel_layout.h"
 #include "tavirpelo/yuv.h"
 

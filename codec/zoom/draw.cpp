@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "codec/core/ground/byte_order.h"
+#include "codec/base/byte_order.h"
 #include "codec/pixel/fill.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/view.h"

@@ -4,7 +4,7 @@
 #include <climits>
 #include <cstdlib>
 
-#include "codec/core/ground/dec_ratio.h"
+#include "codec/base/dec_ratio.h"
 
 namespace pelo::zoom {
 namespace {

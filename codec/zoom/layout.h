@@ -1,8 +1,8 @@
 // The sizes of a zoom, fixed when it starts: arithmetic on the state alone, without pixels.
 #pragma once
 
-#include "codec/core/ground/checked.h"
-#include "codec/core/ground/geometry.h"
+#include "codec/base/checked.h"
+#include "codec/base/geometry.h"
 #include "tavirpelo/zoom.h"
 
 namespace pelo::zoom {

@@ -1,8 +1,8 @@
 // Finding an object's picture and zoom, and ending the zoom.
 #include "codec/zoom/session.h"
 
-#include "codec/core/ground/zoom_state.h"
-#include "codec/jpeg/header_scan.h"
+#include "codec/base/zoom_state.h"
+#include "codec/formats/jpeg/header_scan.h"
 #include "codec/zoom/task.h"
 
 namespace pelo::zoom {

@@ -2,7 +2,7 @@
 // messages.
 #pragma once
 
-#include "codec/core/ground/geometry.h"
+#include "codec/base/geometry.h"
 #include "tavirpelo/zoom.h"
 
 namespace pelo::zoom {

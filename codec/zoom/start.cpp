@@ -1,8 +1,8 @@
 // Starting a zoom: state and buffers, then the first view from a decode or from the caller's preview.
 #include <algorithm>
 
-#include "codec/core/ground/checked.h"
-#include "codec/core/ground/os_memory.h"
+#include "codec/base/checked.h"
+#include "codec/base/os_memory.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/draw.h"
 #include "codec/zoom/layout.h"

@@ -2,7 +2,7 @@
 // inside the zoomed picture, and the zoomed picture between the fitted and the largest size.
 #pragma once
 
-#include "codec/core/ground/geometry.h"
+#include "codec/base/geometry.h"
 #include "tavirpelo/zoom.h"
 
 namespace pelo::zoom {

@@ -2,7 +2,7 @@
 // damaged.
 #include <bit>
 
-#include "codec/bmp/bmp_record.h"
+#include "codec/formats/bmp/bmp_record.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"
 

@@ -1,8 +1,8 @@
 // Input sources, the buffered reader, format detection, raw images and the small services of the ground.
 #include <cstdio>
 
-#include "codec/core/ground/buffered_source.h"
-#include "codec/core/ground/geometry.h"
+#include "codec/base/buffered_source.h"
+#include "codec/base/geometry.h"
 #include "tests/support/failures.h"
 #include "tests/support/gif_builder.h"
 #include "tests/support/guarded_decode.h"

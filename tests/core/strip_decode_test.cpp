@@ -1,6 +1,6 @@
 // Decoding in bands: the same pixels as in one piece whatever the bands, and an end on every path that
 // gives everything back.
-#include "codec/core/strip_decode.h"
+#include "codec/formats/jpeg/strips/strips.h"
 
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"

@@ -3,8 +3,8 @@
 
 #include <algorithm>
 
-#include "codec/core/ground/byte_order.h"
-#include "codec/jpeg/encoder/encoder.h"
+#include "codec/base/byte_order.h"
+#include "codec/formats/jpeg/encoder/encoder.h"
 #include "tests/support/jpeg_segments.h"
 
 namespace tests {

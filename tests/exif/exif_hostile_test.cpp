@@ -1,6 +1,6 @@
 // Damaged EXIF segments, contradictory entries, and memory that runs out: every read ends, inside its
 // buffers, and gives everything back.
-#include "codec/jpeg/exif/exif_reader.h"
+#include "codec/formats/jpeg/exif/exif_reader.h"
 #include "tests/support/exif_builder.h"
 #include "tests/support/failures.h"
 #include "tests/support/jpeg_segments.h"

@@ -1,8 +1,8 @@
 // Decodes in several calls: the same pixels as in one, whatever the split, and no mixing of requests.
 #include <functional>
 
-#include "codec/core/ground/format_state.h"
-#include "codec/gif/record.h"
+#include "codec/base/format_state.h"
+#include "codec/formats/gif/record.h"
 #include "tests/gif/gif_decode.h"
 
 namespace tests {

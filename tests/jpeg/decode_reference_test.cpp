@@ -1,7 +1,7 @@
 // Full-size decodes against slow formulas: coefficients as libjpeg reads them, the transform member by
 // last position, replication, four-point or centre sampling by division, and colour by multiplication.
-#include "codec/jpeg/decoder/idct.h"
-#include "codec/jpeg/tables.h"
+#include "codec/formats/jpeg/decoder/idct.h"
+#include "codec/formats/jpeg/tables.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_samples.h"
 

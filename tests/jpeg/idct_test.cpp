@@ -1,5 +1,5 @@
 // The inverse transforms against plain scalar formulas, on real, sparse and hostile coefficients.
-#include "codec/jpeg/decoder/idct.h"
+#include "codec/formats/jpeg/decoder/idct.h"
 
 #include <gtest/gtest.h>
 
@@ -7,7 +7,7 @@
 #include <array>
 #include <random>
 
-#include "codec/jpeg/tables.h"
+#include "codec/formats/jpeg/tables.h"
 
 namespace {
 

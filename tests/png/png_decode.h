@@ -1,7 +1,7 @@
 // One PNG decode from memory.
 #pragma once
 
-#include "codec/png/png_driver.h"
+#include "codec/formats/png/png_driver.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/png_builder.h"
 

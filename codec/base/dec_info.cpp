@@ -1,0 +1,84 @@
+// The decoder information object: creation, options, callbacks.
+#include "codec/base/os_memory.h"
+#include "codec/base/zoom_state.h"
+#include "tavirpelo/decinfo.h"
+
+static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_DECINFO) == 76);
+static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_CALLBACK) == 8);
+
+namespace {
+
+constexpr int kDecoderVersion = 35010;
+
+// An empty object; null with gTavirError set when memory is short.
+pelo::OsPtr<TAVIRPELO_DECINFO> new_dec_info() {
+  gTavirError = TAVIRPELO_ERROR_NONE;
+  auto decInfo = pelo::os_new<TAVIRPELO_DECINFO>();
+  if (!decInfo) gTavirError = TAVIRPELO_ERROR_MEMORY;
+  return decInfo;
+}
+
+TAVIRPELO_DECINFO* finish(pelo::OsPtr<TAVIRPELO_DECINFO> decInfo, TAVIRPELO_IO* io, int outFormat,
+                          uint32_t option) {
+  if (io == nullptr) return nullptr;
+  decInfo->pIO = io;
+  decInfo->outFormat = outFormat;
+  decInfo->option = decInfo->userOption = option;
+  decInfo->CheckFn = TAVIRPELO_CheckFn;
+  return decInfo.release();
+}
+
+}  // namespace
+
+TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfo(int ioType, void* source, int size, int outFormat,
+                                           uint32_t option) {
+  auto decInfo = new_dec_info();
+  if (!decInfo) return nullptr;
+  TAVIRPELO_IO* io = TAVIRPELO_Open_IO(ioType, source, size);
+  return finish(std::move(decInfo), io, outFormat, option);
+}
+
+TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfoWithStream(void* context, int size, TAVIRPELO_READFN pfRead,
+                                                     TAVIRPELO_SKIPFN pfSkip,
+                                                     TAVIRPELO_RESETFN pfReset, int outFormat,
+                                                     uint32_t option) {
+  auto decInfo = new_dec_info();
+  if (!decInfo) return nullptr;
+  TAVIRPELO_IO* io = TAVIRPELO_Open_Stream(context, pfRead, pfSkip, pfReset, size);
+  return finish(std::move(decInfo), io, outFormat, option);
+}
+
+int TAVIRPELO_DestroyDecInfo(TAVIRPELO_DECINFO* decInfo) {
+  gTavirError = decInfo == nullptr ? TAVIRPELO_ERROR_NULL : TAVIRPELO_ERROR_NONE;
+  if (decInfo == nullptr) return 0;
+  pelo::release_zoom_state(*decInfo);
+  TAVIRPELO_OsFree(decInfo->pCallback);
+  TAVIRPELO_Close_IO(decInfo->pIO);
+  TAVIRPELO_OsFree(decInfo);
+  return 1;
+}
+
+int TAVIRPELO_SetDecOption(TAVIRPELO_DECINFO* decInfo, uint32_t option) {
+  if (decInfo == nullptr) return 0;
+  decInfo->option = decInfo->userOption = option;
+  return 1;
+}
+
+int TAVIRPELO_SetDecMode(TAVIRPELO_DECINFO* decInfo, int mode) {
+  if (decInfo == nullptr) return 0;
+  decInfo->decMode = mode < 0 ? 0 : mode > 4 ? 4 : mode;
+  return 1;
+}
+
+int TAVIRPELO_GetErrorCode(void) { return gTavirError; }
+
+int PELOJ_GetVersion(void) { return kDecoderVersion; }
+
+int PELOJ_SetCallback(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_PROGRESSFN function, intptr_t argument) {
+  if (decInfo == nullptr) return 0;
+  TAVIRPELO_OsFree(decInfo->pCallback);
+  decInfo->pCallback = pelo::os_new<TAVIRPELO_CALLBACK>().release();
+  if (decInfo->pCallback == nullptr) return 0;
+  *decInfo->pCallback = {argument, function};
+  return 1;
+}

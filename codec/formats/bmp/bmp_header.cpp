@@ -1,0 +1,198 @@
+// Set-up of a BMP decode: headers, palette, bit fields, and the picture's place in the output.
+#include <algorithm>
+#include <climits>
+#include <cstring>
+
+#include "codec/formats/bmp/bmp_record.h"
+#include "codec/base/axis_stepper.h"
+#include "codec/base/byte_order.h"
+#include "codec/base/geometry.h"
+#include "codec/pixel/packers.h"
+
+namespace pelo::bmp {
+namespace {
+
+constexpr int64_t kHeadBytes = 54;
+constexpr int64_t kFileHeader = 14;
+constexpr uint8_t kCoreHeader = 12;  // header of 16-bit sizes and three-byte palette entries
+constexpr uint32_t kBitFields = 3;
+
+// Bytes [offset, offset + count) of a file or memory source; false when it ends before.
+bool read_at(TAVIRPELO_IO* io, int64_t offset, uint8_t* out, int64_t count) {
+  if (offset + count > io->size) return false;
+  if (io->ioType == TAVIRPELO_IO_MEMORY) {
+    std::memcpy(out, static_cast<const uint8_t*>(io->pSource) + offset, static_cast<size_t>(count));
+    return true;
+  }
+  const auto target = static_cast<int>(offset);
+  return io->ioType == TAVIRPELO_IO_FILE && TAVIRPELO_Seek_IO(io, target, SEEK_SET) == target &&
+         TAVIRPELO_Read_IO(io, out, static_cast<int>(count)) == count;
+}
+
+// ---- headers ----
+
+bool read_sizes(PELOI_BMPRECORD& record, const uint8_t* head) {
+  const uint8_t headerSize = head[kFileHeader];
+  int64_t height;
+  if (headerSize == kCoreHeader) {
+    record.width = load_le16(head + 18);
+    height = load_le16(head + 20);
+    record.bitCount = load_le16(head + 24);
+  } else if (headerSize == 40 || (headerSize >= 56 && headerSize <= 64)) {
+    record.width = static_cast<int32_t>(load_le32(head + 18));
+    height = static_cast<int32_t>(load_le32(head + 22));
+    record.bitCount = load_le16(head + 28);
+    record.compression = load_le32(head + 30);
+  } else {
+    TAVIRPELO_PrintMessage("__ValorenBmpInitialize : invalid BMP head size");
+    return false;
+  }
+  record.topDown = height < 0;
+  height = record.topDown ? -height : height;
+  record.height = static_cast<int>(std::min<int64_t>(height, INT_MAX));
+  return record.width > 0 && height > 0 && height <= INT_MAX;
+}
+
+// Run lengths, JPEG and PNG inside are not decoded; bit fields have 16 bits.
+bool accepted_compression(const PELOI_BMPRECORD& record) {
+  switch (record.compression) {
+    case 1:
+    case 2:
+    case 4:
+    case 5:
+      return false;
+    case kBitFields:
+      return record.bitCount == 16;
+    default:
+      return true;
+  }
+}
+
+bool known_bit_count(int bitCount) {
+  return bitCount == 1 || bitCount == 4 || bitCount == 8 || bitCount == 16 || bitCount == 24 ||
+         bitCount == 32;
+}
+
+// The entries between the header and the pixels.
+bool read_palette(PELOI_BMPRECORD& record, TAVIRPELO_IO* io, uint8_t headerSize) {
+  const int64_t entryBytes = headerSize == kCoreHeader ? 3 : 4;
+  const int64_t start = kFileHeader + headerSize;
+  const int64_t entries = (int64_t{record.dataOffset} - start) / entryBytes;
+  if (entries < 1 || start + entries * entryBytes > io->size) return false;
+  uint8_t bytes[256 * 4];
+  const int64_t kept = std::min<int64_t>(entries, 256);
+  if (!read_at(io, start, bytes, kept * entryBytes)) return false;
+  for (int64_t i = 0; i < kept; ++i) {
+    const uint8_t* bgr = bytes + i * entryBytes;
+    record.colours.palette[static_cast<size_t>(i)] = {bgr[2], bgr[1], bgr[0], 255};
+  }
+  return true;
+}
+
+struct FieldLayout {
+  PELOI_BMPCOLOURS::Field red, green, blue;
+};
+constexpr FieldLayout kFieldLayouts[] = {{{0xF800, 0}, {0x07E0, 0}, {0x001F, 0}},   // 5-6-5
+                                         {{0x0F00, 4}, {0x00F0, 3}, {0x000F, 1}},   // 4-4-4
+                                         {{0x7C00, 1}, {0x03E0, 1}, {0x001F, 0}}};  // 5-5-5
+
+bool read_fields(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
+  uint32_t masks[3] = {0x7C00, 0x03E0, 0x001F};
+  if (record.compression != 0) {
+    uint8_t bytes[12];
+    if (!read_at(io, kHeadBytes, bytes, sizeof bytes)) return false;
+    for (size_t i = 0; i < 3; ++i) masks[i] = load_le32(bytes + 4 * i);
+  }
+  for (const FieldLayout& layout : kFieldLayouts) {
+    if (masks[0] != layout.red.mask || masks[1] != layout.green.mask || masks[2] != layout.blue.mask)
+      continue;
+    record.colours.red = layout.red;
+    record.colours.green = layout.green;
+    record.colours.blue = layout.blue;
+    return true;
+  }
+  return false;
+}
+
+bool read_headers(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
+  uint8_t head[kHeadBytes];
+  if (!read_at(io, 0, head, kHeadBytes) || head[0] != 'B' || head[1] != 'M') return false;
+  record.dataOffset = load_le32(head + 10);
+  if (!read_sizes(record, head) || !accepted_compression(record)) return false;
+  for (auto& colour : record.colours.palette) colour = {0, 0, 0, 255};
+  if (record.bitCount == 1 || record.bitCount == 4 || record.bitCount == 8) {
+    return read_palette(record, io, head[kFileHeader]);
+  }
+  return record.bitCount != 16 || read_fields(record, io);
+}
+
+// ---- output ----
+
+void choose_size(PELOI_BMPRECORD& record) {
+  const Size box = turned({record.requestWidth, record.requestHeight}, record.option);
+  const Size picture{record.width, record.height};
+  Size out = box;
+  if ((record.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_STRETCH) {
+    record.oneToOne = picture.width <= box.width && picture.height <= box.height;
+    out = fit_by_width(picture.width, picture.height, box);
+  }
+  record.outWidth = out.width;
+  record.outHeight = out.height;
+}
+
+bool prepare_resizing(PELOI_BMPRECORD& record) {
+  if (record.oneToOne) return true;
+  const auto width = static_cast<size_t>(record.outWidth);
+  if (int64_t{record.outWidth} * 8 > kMaxPictureBlock) return false;
+  if (!record.columns.allocate(2 * width) || !record.accumulators.allocate(width)) return false;
+  AxisStepper quarter(record.width, record.outWidth, record.width / 4);
+  AxisStepper threeQuarters(record.width, record.outWidth, int64_t{3} * record.width / 4);
+  for (size_t x = 0; x < width; ++x, quarter.advance(), threeQuarters.advance()) {
+    record.columns[x] = static_cast<uint32_t>(quarter.position());
+    record.columns[width + x] = static_cast<uint32_t>(threeQuarters.position());
+  }
+  return true;
+}
+
+bool prepare_rows(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
+  if (!known_bit_count(record.bitCount)) return true;  // nothing will be decoded
+  const int64_t rowSize = row_size(record.width, record.bitCount);
+  if (rowSize > INT_MAX) return false;
+  return record.reader.open(io, record.dataOffset, rowSize, pixel_bytes(record.width, record.bitCount),
+                            io->readSize) &&
+         (record.outWidth == 0 || record.outHeight == 0 || prepare_resizing(record));
+}
+
+}  // namespace
+}  // namespace pelo::bmp
+
+using namespace pelo::bmp;
+
+PELOI_BMPRECORD* PELOI_BMP_Initialize(TAVIRPELO_DECINFO* decInfo, int width, int height, void* output) {
+  auto record = pelo::os_new<PELOI_BMPRECORD>();
+  if (record == nullptr || decInfo->pIO == nullptr || !read_headers(*record, decInfo->pIO))
+    return nullptr;
+  record->kind = PELOI_BMPRECORD::kKind;
+  record->output = output;
+  record->requestWidth = width;
+  record->requestHeight = height;
+  record->outFormat = decInfo->outFormat;
+  record->option = decInfo->option;
+  decInfo->scaleDenom = 1;
+  choose_size(*record);
+  if (!prepare_rows(*record, decInfo->pIO)) return nullptr;
+  decInfo->outWidth = record->outWidth;
+  decInfo->outHeight = record->outHeight;
+  record->grid = pelo::OutputGrid(output, {width, height}, {record->outWidth, record->outHeight},
+                                  pelo::bytes_per_pixel(record->outFormat), record->option);
+  return record.release();
+}
+
+void PELOI_BMP_DeleteDecInfo(PELOI_BMPRECORD* record) {
+  pelo::OsDelete{}(record);
+}
+
+int PELOI_BMP_DestroyBMP(TAVIRPELO_DECINFO* decInfo) {
+  pelo::release_state<PELOI_BMPRECORD>(*decInfo);
+  return 1;
+}

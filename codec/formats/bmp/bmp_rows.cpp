@@ -1,0 +1,176 @@
+// The row decoders and row writers of the six bit counts: one template over how a pixel is read.
+//
+// Resized pictures average four pixels: those at the quarter and three-quarter points of an output
+// pixel's span, in the rows at these points of its row. Points are counted from the last image row up,
+// as rows stand in an ordinary file, so that a top-down file gives the same picture.
+#include <algorithm>
+
+#include "codec/formats/bmp/bmp_record.h"
+#include "codec/base/byte_order.h"
+#include "codec/pixel/packed_samples.h"
+#include "codec/pixel/pixel_layout.h"
+
+namespace pelo::bmp {
+namespace {
+
+// Pixel sources: pixel x of a file row as four bytes.
+template <int Bits>
+struct PaletteSource {
+  static void pixel(const PELOI_BMPCOLOURS& colours, const uint8_t* row, size_t x, uint8_t* rgba) {
+    std::copy_n(colours.palette[packed_sample<Bits>(row, x)].data(), 4, rgba);
+  }
+};
+struct FieldSource {
+  static void pixel(const PELOI_BMPCOLOURS& colours, const uint8_t* row, size_t x, uint8_t* rgba) {
+    const uint32_t word = load_le16(row + 2 * x);
+    const auto field = [word](const PELOI_BMPCOLOURS::Field& f) { return (word & f.mask) << f.shift; };
+    rgba[0] = static_cast<uint8_t>(field(colours.red) >> 8 & 0xF8);
+    rgba[1] = static_cast<uint8_t>(field(colours.green) >> 3 & 0xFC);
+    rgba[2] = static_cast<uint8_t>(field(colours.blue) << 3 & 0xF8);
+    rgba[3] = 255;
+  }
+};
+template <size_t Bytes>
+struct ByteSource {
+  static void pixel(const PELOI_BMPCOLOURS&, const uint8_t* row, size_t x, uint8_t* rgba) {
+    const uint8_t* bgr = row + Bytes * x;
+    rgba[0] = bgr[2];
+    rgba[1] = bgr[1];
+    rgba[2] = bgr[0];
+    rgba[3] = Bytes == 4 ? bgr[3] : 255;
+  }
+};
+
+// Neighbouring pixels get a loop of their own: its constant stride is what vectorises.
+template <class Layout, class Pixel>
+void store_pixels(uint8_t* output, int count, ptrdiff_t pixelStep, Pixel pixel) {
+  const auto store = [&](int x, uint8_t* out) {
+    uint8_t rgba[4];
+    pixel(static_cast<size_t>(x), rgba);
+    Layout::store(out, rgba[0], rgba[1], rgba[2], rgba[3]);
+  };
+  if (pixelStep == Layout::kBytes) {
+    for (int x = 0; x < count; ++x) store(x, output + x * Layout::kBytes);
+  } else {
+    for (int x = 0; x < count; ++x) store(x, output + x * pixelStep);
+  }
+}
+
+template <class Source>
+void write_row(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
+               const PELOI_BMPCOLOURS& colours) {
+  visit_layout(format, [&](auto layout) {
+    store_pixels<decltype(layout)>(output, width, pixelStep, [&](size_t x, uint8_t* rgba) {
+      Source::pixel(colours, row, x, rgba);
+    });
+  });
+}
+
+// Adds two pixels of a row to each output pixel's word, a quarter of each channel.
+template <class Source>
+void add_row(PELOI_BMPRECORD& record, const uint8_t* row) {
+  const uint32_t* quarter = record.columns.data();
+  const uint32_t* threeQuarters = quarter + record.outWidth;
+  uint32_t* words = record.accumulators.data();
+  const auto word = [&](uint32_t column) {
+    uint8_t rgba[4];
+    Source::pixel(record.colours, row, column, rgba);
+    const uint32_t bgra =
+        uint32_t{rgba[3]} << 24 | uint32_t{rgba[0]} << 16 | uint32_t{rgba[1]} << 8 | rgba[2];
+    return bgra >> 2 & 0x3F3F3F3F;
+  };
+  for (int x = 0; x < record.outWidth; ++x) words[x] += word(quarter[x]) + word(threeQuarters[x]);
+}
+
+template <bool KeepsAlpha>
+void write_words(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pixelStep, int format) {
+  visit_layout(format, [&](auto layout) {
+    store_pixels<decltype(layout)>(output, width, pixelStep, [words](size_t x, uint8_t* rgba) {
+      rgba[0] = static_cast<uint8_t>(words[x] >> 16);
+      rgba[1] = static_cast<uint8_t>(words[x] >> 8);
+      rgba[2] = static_cast<uint8_t>(words[x]);
+      rgba[3] = KeepsAlpha ? static_cast<uint8_t>(words[x] >> 24) : 255;
+    });
+  });
+}
+
+// How a bit count is decoded.
+struct Family {
+  void (*write)(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
+                const PELOI_BMPCOLOURS* colours);
+  void (*add)(PELOI_BMPRECORD& record, const uint8_t* row);
+  void (*writeResized)(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pixelStep,
+                       int format);
+};
+
+// Row `up` counted from the last image row.
+const uint8_t* row_from_below(PELOI_BMPRECORD& record, int64_t up) {
+  return record.reader.row(record.topDown ? record.height - 1 - up : up);
+}
+
+// Output row `up`, counted from the last. False when the source lacks a row of it, which then keeps what
+// the buffer held.
+bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Family& family) {
+  const RowSpan span = record.grid.span(record.outHeight - 1 - up, 0, record.outWidth);
+  if (record.oneToOne) {
+    const uint8_t* row = row_from_below(record, up);
+    if (row == nullptr) return false;
+    family.write(row, span.first, span.count, span.step, record.outFormat, &record.colours);
+    return true;
+  }
+  std::fill_n(record.accumulators.data(), record.outWidth, 0u);
+  const int64_t quarters[2] = {record.height / 4, int64_t{3} * record.height / 4};
+  for (const int64_t phase : {quarters[record.topDown], quarters[!record.topDown]}) {  // in file order
+    const uint8_t* row = row_from_below(record, (phase + up * record.height) / record.outHeight);
+    if (row == nullptr) return false;
+    family.add(record, row);
+  }
+  family.writeResized(record.accumulators.data(), span.first, span.count, span.step, record.outFormat);
+  return true;
+}
+
+int decode_rows(PELOI_BMPRECORD& record, int rows, const Family& family) {
+  constexpr int kShort = 5;
+  const int count = std::min(rows, record.outHeight - record.rowsDone);
+  const int64_t lowest = int64_t{record.outHeight} - record.rowsDone - count;
+  record.rowsDone += count;
+  if (record.outWidth == 0 || !writes(record.outFormat)) return 1;
+  bool complete = true;
+  for (int64_t i = 0; i < count; ++i) {
+    complete &= decode_row(record, lowest + (record.topDown ? count - 1 - i : i), family);
+  }
+  return complete || record.reader.at_end() ? 1 : kShort;
+}
+
+}  // namespace
+}  // namespace pelo::bmp
+
+using namespace pelo::bmp;
+
+void PELOI_BMP_WriteResizedOutput(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
+                                  ptrdiff_t pixelStep, int format) {
+  write_words<false>(accumulatorRow, output, outWidth, pixelStep, format);
+}
+void PELOI_BMP_WriteResizedOutputWithAlpha(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
+                                           ptrdiff_t pixelStep, int format) {
+  write_words<true>(accumulatorRow, output, outWidth, pixelStep, format);
+}
+
+// A member of the family: its row writer and its row decoder.
+#define PELOI_BMP_MEMBER(bits, Source, writeResized)                                       \
+  void PELOI_BMP_Write##bits##bitOutput(const uint8_t* row, uint8_t* output, int width,    \
+                                        ptrdiff_t pixelStep, int format,                   \
+                                        const PELOI_BMPCOLOURS* colours) {                 \
+    write_row<Source>(row, output, width, pixelStep, format, *colours);                    \
+  }                                                                                        \
+  int PELOI_BMP_Decode##bits##bitBMP(PELOI_BMPRECORD* record, int rows) {                  \
+    return decode_rows(*record, rows,                                                      \
+                       {PELOI_BMP_Write##bits##bitOutput, add_row<Source>, writeResized}); \
+  }
+PELOI_BMP_MEMBER(1, PaletteSource<1>, PELOI_BMP_WriteResizedOutput)
+PELOI_BMP_MEMBER(4, PaletteSource<4>, PELOI_BMP_WriteResizedOutput)
+PELOI_BMP_MEMBER(8, PaletteSource<8>, PELOI_BMP_WriteResizedOutput)
+PELOI_BMP_MEMBER(16, FieldSource, PELOI_BMP_WriteResizedOutput)
+PELOI_BMP_MEMBER(24, ByteSource<3>, PELOI_BMP_WriteResizedOutput)
+PELOI_BMP_MEMBER(32, ByteSource<4>, PELOI_BMP_WriteResizedOutputWithAlpha)
+#undef PELOI_BMP_MEMBER

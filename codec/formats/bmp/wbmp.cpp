@@ -1,0 +1,188 @@
+#include "codec/formats/bmp/wbmp.h"
+
+#include <algorithm>
+#include <climits>
+#include <cstdio>
+#include <cstring>
+#include <utility>
+
+#include "codec/formats/bmp/row_reader.h"
+#include "codec/base/axis_stepper.h"
+#include "codec/base/geometry.h"
+#include "codec/base/output_grid.h"
+#include "codec/pixel/packed_samples.h"
+#include "codec/pixel/packers.h"
+#include "codec/pixel/pixel_layout.h"
+#include "tavirpelo/decode.h"
+
+namespace pelo::bmp {
+namespace {
+
+constexpr int kHeadBytes = 20;  // enough for any header that is accepted
+constexpr int kMaxGroups = 20;
+constexpr int kMaxIntGroups = 4;  // 28 bits
+constexpr uint16_t kWhite565 = 0xFFDF;
+constexpr uint32_t kWhiteSample = 63 << 16 | 63 << 8 | 63;  // a quarter of white in R, G and B
+
+struct Wbmp {
+  uint32_t width, height;
+  int dataOffset;
+  int64_t rowBytes;
+};
+
+bool read_integer(const uint8_t* data, int size, int* position, uint32_t& value) {
+  uint8_t packed[kMaxGroups];
+  int groups = 0;
+  PELOI_WBMPdecodeMultibyte(data, size, position, &groups, packed);
+  if (groups > kMaxIntGroups) return false;
+  value = PELOI_WBMPgetMultibyte2Int(packed, groups, groups);
+  return true;
+}
+
+bool parse(const uint8_t* data, int size, Wbmp& wbmp) {
+  if (size < 2 || data[0] != 0 || (data[1] & 0x80) != 0) return false;
+  wbmp.dataOffset = 2;
+  if (!read_integer(data, size, &wbmp.dataOffset, wbmp.width)) return false;
+  if (!read_integer(data, size, &wbmp.dataOffset, wbmp.height)) return false;
+  wbmp.rowBytes = (int64_t{wbmp.width} + 7) / 8;
+  return true;
+}
+
+bool read_header(TAVIRPELO_IO* io, Wbmp& wbmp) {
+  if (TAVIRPELO_Seek_IO(io, 0, SEEK_SET) != 0 || io->size <= 3) return false;
+  if (io->ioType == TAVIRPELO_IO_MEMORY) {
+    return parse(static_cast<const uint8_t*>(io->pSource), io->size, wbmp);
+  }
+  if (io->ioType != TAVIRPELO_IO_FILE) return false;
+  uint8_t head[kHeadBytes];
+  return parse(head, TAVIRPELO_Read_IO(io, head, kHeadBytes), wbmp);
+}
+
+// Black or white in an output format.
+template <class Store>
+void write_plain_row(const uint8_t* row, const RowSpan& span, Store store) {
+  for (int i = 0; i < span.count; ++i) {
+    store(span.first + i * span.step, packed_sample<1>(row, static_cast<size_t>(span.skip + i)) != 0);
+  }
+}
+
+bool write_plain(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, int format) {
+  for (uint32_t y = 0; y < wbmp.height; ++y) {
+    const uint8_t* row = reader.row(y);
+    if (row == nullptr) return false;
+    const RowSpan span = grid.span(y, 0, wbmp.width);
+    if (format == TAVIRPELO_RGB565) {
+      write_plain_row(row, span,
+                      [](uint8_t* out, bool white) { store_le16(out, white ? kWhite565 : 0u); });
+    } else {
+      write_plain_row(row, span, [](uint8_t* out, bool white) { std::memset(out, white ? 255 : 0, 3); });
+    }
+  }
+  return true;
+}
+
+// Adds the two samples of each output pixel in a row.
+void add_row(const uint8_t* row, const Wbmp& wbmp, OsBuffer<uint32_t>& words) {
+  const auto out = static_cast<int64_t>(words.size());
+  AxisStepper quarter(wbmp.width, out, wbmp.width / 4);
+  AxisStepper threeQuarters(wbmp.width, out, int64_t{3} * wbmp.width / 4);
+  const auto sample = [row](const AxisStepper& at) {
+    return packed_sample<1>(row, static_cast<size_t>(at.position())) != 0 ? kWhiteSample : 0u;
+  };
+  for (size_t x = 0; x < words.size(); ++x, quarter.advance(), threeQuarters.advance()) {
+    words[x] += sample(quarter) + sample(threeQuarters);
+  }
+}
+
+void write_words(const OsBuffer<uint32_t>& words, const RowSpan& span, int format) {
+  for (int i = 0; i < span.count; ++i) {
+    const uint32_t word = words[static_cast<size_t>(span.skip + i)];
+    const auto r = static_cast<uint8_t>(word >> 16), g = static_cast<uint8_t>(word >> 8);
+    const auto b = static_cast<uint8_t>(word);
+    uint8_t* out = span.first + i * span.step;
+    if (format == TAVIRPELO_RGB565) {
+      layout::Rgb565::store(out, r, g, b);
+    } else {
+      layout::Rgb888::store(out, r, g, b);
+    }
+  }
+}
+
+// Averages of four samples; the rows they stand in follow each other downwards.
+bool write_resized(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, Size out, int format) {
+  OsBuffer<uint32_t> words;
+  if (int64_t{out.width} * 4 > kMaxPictureBlock || !words.allocate(static_cast<size_t>(out.width)))
+    return false;
+  AxisStepper quarter(wbmp.height, out.height, wbmp.height / 4);
+  AxisStepper threeQuarters(wbmp.height, out.height, int64_t{3} * wbmp.height / 4);
+  for (int y = 0; y < out.height; ++y, quarter.advance(), threeQuarters.advance()) {
+    std::fill_n(words.data(), words.size(), 0u);
+    for (const int64_t source : {quarter.position(), threeQuarters.position()}) {
+      const uint8_t* row = reader.row(source);
+      if (row == nullptr) return false;
+      add_row(row, wbmp, words);
+    }
+    write_words(words, grid.span(y, 0, out.width), format);
+  }
+  return true;
+}
+
+}  // namespace
+}  // namespace pelo::bmp
+
+using namespace pelo::bmp;
+
+void PELOI_WBMPdecodeMultibyte(const uint8_t* data, int size, int* position, int* groupCount,
+                               uint8_t* packed) {
+  *groupCount = 0;
+  std::memset(packed, 0, kMaxGroups);
+  bool more = true;
+  for (int bit = 0; more && *position < size && *groupCount < kMaxGroups; bit += 7, ++*groupCount) {
+    const uint8_t byte = data[(*position)++];
+    more = (byte & 0x80) != 0;
+    for (int i = 0; i < 7; ++i) {
+      const int at = bit + i;
+      packed[at / 8] = static_cast<uint8_t>(packed[at / 8] | ((byte >> (6 - i) & 1) << (7 - at % 8)));
+    }
+  }
+}
+
+uint64_t PELOI_WBMPpow(uint64_t base, int exponent) {
+  uint64_t power = 1;
+  for (int i = 0; i < exponent; ++i) power *= base;
+  return power;
+}
+
+uint32_t PELOI_WBMPgetMultibyte2Int(const uint8_t* packed, int byteCount, int shift) {
+  if (byteCount > 8 || shift > 63) return 0;
+  uint64_t value = 0;
+  for (int i = 0; i < byteCount; ++i) value = value << 8 | packed[i];
+  return static_cast<uint32_t>(value / PELOI_WBMPpow(2, shift));
+}
+
+int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  if (decInfo == nullptr || decInfo->pIO == nullptr || output == nullptr || width < 0 || height < 0)
+    return 0;
+  TAVIRPELO_IO* io = decInfo->pIO;
+  Wbmp wbmp{};
+  if (!read_header(io, wbmp)) return 0;
+  if (int64_t{wbmp.height} * wbmp.rowBytes + wbmp.dataOffset > io->size) return 0;
+
+  const bool stretch = decInfo->option == TAVIRPELO_FIT_STRETCH;
+  const pelo::Size out =
+      stretch ? pelo::Size{width, height} : pelo::fit_by_ratio(wbmp.width, wbmp.height, {width, height});
+  decInfo->outWidth = out.width;
+  decInfo->outHeight = out.height;
+  if (out.width == 0 || out.height == 0 || wbmp.width == 0 || wbmp.height == 0) return 1;
+  const int format = decInfo->outFormat;
+  if (format != TAVIRPELO_RGB565 && format != TAVIRPELO_RGB888) return 1;
+
+  RowReader reader;
+  if (!reader.open(io, wbmp.dataOffset, wbmp.rowBytes, wbmp.rowBytes, io->readSize)) return 0;
+  const pelo::OutputGrid grid(output, {width, height}, (int64_t{width} - out.width + 1) / 2,
+                              (int64_t{height} - out.height + 1) / 2, pelo::bytes_per_pixel(format));
+  const bool plain =
+      out.width == static_cast<int64_t>(wbmp.width) && out.height == static_cast<int64_t>(wbmp.height);
+  return plain ? write_plain(wbmp, reader, grid, format)
+               : write_resized(wbmp, reader, grid, out, format);
+}

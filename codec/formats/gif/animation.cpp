@@ -1,0 +1,125 @@
+#include "codec/formats/gif/animation.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "codec/base/checked.h"
+#include "codec/formats/gif/driver.h"
+#include "codec/formats/gif/image.h"
+#include "codec/formats/gif/output.h"
+#include "codec/formats/gif/parse.h"
+#include "tavirpelo/decode.h"
+
+using namespace pelo;
+using namespace pelo::gif;
+
+namespace {
+
+constexpr int kRestoreBackground = 2;
+constexpr int kRestorePrevious = 3;
+
+Rgba* canvas_row(Record& record, int row) {
+  return record.canvas.data() + static_cast<size_t>(row) * static_cast<size_t>(record.screen.width);
+}
+
+// Paints the row's colours; transparent ones leave what is there.
+void paint(const Record& record, Rgba* target, int count) {
+  const uint8_t* indices = record.line.data() + record.lzw.start;
+  if (record.control.transparentIndex < 0) {
+    for (int i = 0; i < count; ++i) target[i] = record.palette[indices[i]];
+    return;
+  }
+  for (int i = 0; i < count; ++i) {
+    if (indices[i] != record.control.transparentIndex) target[i] = record.palette[indices[i]];
+  }
+}
+
+// What "restore to background" leaves: nothing under a transparent image, else the screen's background.
+Rgba background(const Record& record) {
+  if (record.control.transparentIndex >= 0) return {};
+  const uint32_t lanes = record.globalTable[record.backgroundIndex];
+  return {static_cast<uint8_t>(lanes >> 20), static_cast<uint8_t>(lanes >> 10),
+          static_cast<uint8_t>(lanes), 255};
+}
+
+void write_canvas_rows(Record& record, void* output, int begin, int end) {
+  for (int row = begin; row < std::min(end, record.screen.height); ++row) {
+    record.currentRow = row;
+    record.rowSource = canvas_row(record, row);
+    write_screen_row(record, output);
+  }
+}
+
+// The frame's first step: the rows above the image, and everything ready for its own.
+int start_frame(Record& record, void* output) {
+  write_canvas_rows(record, output, 0, record.frame.top);
+  record.inImage = true;
+  return PELOI_DecodeGIFImageIter(record.reader.source, &record, output, 1);
+}
+
+// The frame's last step: the rows below the image, and what comes next.
+int finish_frame(Record& record, void* output) {
+  write_canvas_rows(record, output, record.frame.top + record.frame.height, record.screen.height);
+  record.inImage = false;
+  return PELOI_SeekImageData(record.reader.source, &record);
+}
+
+int step(Record& record, void* output) {
+  if (!record.inImage) return start_frame(record, output);
+  const int result = PELOI_DecodeGIFImageIter(record.reader.source, &record, output, 0);
+  return result == kDone ? finish_frame(record, output) : result;
+}
+
+}  // namespace
+
+namespace pelo::gif {
+
+bool create_canvas(Record& record) {
+  const int64_t pixels = int64_t{record.screen.width} * record.screen.height;
+  if (pixels == 0) return true;
+  return pixels <= kMaxPictureBlock / int64_t{sizeof(Rgba)} &&
+         record.canvas.allocate(static_cast<size_t>(pixels)) &&
+         record.frameRow.allocate(static_cast<size_t>(record.screen.width));
+}
+
+}  // namespace pelo::gif
+
+int PELOI_MakeFrameLineBuffer(Record* record) {
+  if (record->currentRow >= record->screen.height || record->screen.width == 0) return 1;
+  const int width = record->screen.width;
+  const int left = std::min(record->frame.left, width);
+  const int count = std::min(record->frame.width, width - left);
+  Rgba* canvas = canvas_row(*record, record->currentRow);
+  const int disposal = record->control.disposal;
+  if (disposal != kRestoreBackground && disposal != kRestorePrevious) {
+    paint(*record, canvas + left, count);  // what is shown stays
+    record->rowSource = canvas;
+    return 1;
+  }
+  Rgba* shown = record->frameRow.data();
+  std::copy_n(canvas, width, shown);
+  paint(*record, shown + left, count);
+  if (disposal == kRestoreBackground) std::fill_n(canvas + left, count, background(*record));
+  record->rowSource = shown;
+  return 1;
+}
+
+int TAVIRPELOI_DecodeAGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  Record* record = continue_or_start(decInfo, output, width, height, Mode::kAnimated);
+  if (record == nullptr) return kFailure;
+  const int result = step(*record, output);
+  if (result != kMore && result != kImageFollows) release_state<Record>(*decInfo);
+  return result;
+}
+
+int TAVIRPELOI_DecodeAGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  int result;
+  do {
+    result = TAVIRPELOI_DecodeAGIFIter(decInfo, output, width, height);
+  } while (result == kMore);
+  return result;
+}
+
+int TAVIRPELOI_AborAGIF(TAVIRPELO_DECINFO* decInfo) {
+  return TAVIRPELOI_AbortGIFIter(decInfo);
+}

@@ -1,0 +1,16 @@
+// Animated GIFs: frames composed on a canvas of the whole screen.
+#pragma once
+
+#include "codec/formats/gif/record.h"
+#include "tavirpelo/api.h"
+
+namespace pelo::gif {
+
+// An unpainted canvas for the record's screen. False when it is too large or memory is short.
+[[nodiscard]] bool create_canvas(Record& record);
+
+}  // namespace pelo::gif
+
+// Composes the image row in the line buffer onto the current screen row, and points the row source at
+// what is to be shown. 1.
+TAVIRPELO_API int PELOI_MakeFrameLineBuffer(pelo::gif::Record* record);

@@ -1,0 +1,125 @@
+#include "codec/formats/gif/driver.h"
+
+#include "codec/formats/gif/animation.h"
+#include "codec/formats/gif/final_resample.h"
+#include "codec/formats/gif/geometry.h"
+#include "codec/formats/gif/image.h"
+#include "codec/formats/gif/output.h"
+#include "codec/formats/gif/parse.h"
+#include "tavirpelo/decode.h"
+
+using namespace pelo;
+using namespace pelo::gif;
+
+namespace {
+
+bool valid(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
+  return decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 && height >= 0;
+}
+
+// What a mode needs beyond the geometry of all.
+bool prepare(Record& record) {
+  switch (record.request.mode) {
+    case Mode::kLines:  // rows are delivered as they are
+      return set_geometry(record, record.option & ~uint32_t{TAVIRPELO_ROTATE_MASK});
+    case Mode::kAnimated:
+      return true;
+    default:
+      return plan_reduction(record);
+  }
+}
+
+// A record that stands at the first image's data; null on failure.
+OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, void* output, int width, int height, Mode mode) {
+  OsPtr<Record> record(PELOI_InitializeGIF(&decInfo, width, height, mode == Mode::kAnimated, output));
+  if (record == nullptr) return nullptr;
+  record->request.mode = mode;
+  if (PELOI_SeekImageData(decInfo.pIO, record.get()) != kImageFollows || !prepare(*record))
+    return nullptr;
+  decInfo.outWidth = record->picture.width;
+  decInfo.outHeight = record->picture.height;
+  return record;
+}
+
+bool foreign_state(const TAVIRPELO_DECINFO& decInfo) {
+  return decInfo.pFormatInfo != nullptr && held_state<Record>(decInfo) == nullptr;
+}
+
+}  // namespace
+
+namespace pelo::gif {
+
+Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode) {
+  if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return nullptr;
+  if (Record* held = held_state<Record>(*decInfo)) {
+    const Request asked{mode, {width, height}, decInfo->outFormat, decInfo->option};
+    if (held->request == asked) return held;
+    release_state<Record>(*decInfo);
+    return nullptr;
+  }
+  decInfo->pFormatInfo = start(*decInfo, output, width, height, mode).release();
+  return held_state<Record>(*decInfo);
+}
+
+}  // namespace pelo::gif
+
+Record* PELOI_InitializeGIF(TAVIRPELO_DECINFO* decInfo, int width, int height, int animated,
+                            void* output) {
+  if (!valid(decInfo, output, width, height)) return nullptr;
+  OsPtr<Record> record(PELOI_CreateGIFDecoderInfo());
+  if (record == nullptr) return nullptr;
+  decInfo->scaleDenom = 1;
+  record->animated = animated != 0;
+  record->request = {animated != 0 ? Mode::kAnimated : Mode::kWhole,
+                     {width, height},
+                     decInfo->outFormat,
+                     decInfo->option};
+  record->store = gif_storer(decInfo->outFormat);
+  if (!PELOI_ParseGIFHeader(decInfo->pIO, record.get())) return nullptr;
+  if (!set_geometry(*record, decInfo->option)) return nullptr;
+  if (record->animated && !create_canvas(*record)) return nullptr;
+  decInfo->imageWidth = record->screen.width;
+  decInfo->imageHeight = record->screen.height;
+  decInfo->outWidth = record->picture.width;
+  decInfo->outHeight = record->picture.height;
+  return record.release();
+}
+
+int TAVIRPELOI_DecodeGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return kFailure;
+  release_state<Record>(*decInfo);
+  const auto record = start(*decInfo, output, width, height, Mode::kWhole);
+  if (record == nullptr) return kFailure;
+  const int result = PELOI_DecodeGIFImage(decInfo->pIO, record.get(), output);
+  write_reduced(*record, output);
+  return result;
+}
+
+int TAVIRPELOI_DecodeGIFLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
+                             int lines) {
+  if (lines < 1) return kFailure;
+  const bool first = decInfo != nullptr && decInfo->pFormatInfo == nullptr;
+  Record* record = continue_or_start(decInfo, output, width, height, Mode::kLines);
+  if (record == nullptr) return kFailure;
+  const int result = PELOI_DecodeGIFImageLine(decInfo->pIO, record, output, lines, first);
+  if (result != kMore) release_state<Record>(*decInfo);
+  return result == kFailure ? kFailure : kDone;
+}
+
+int TAVIRPELOI_DecodeGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  const bool first = decInfo != nullptr && decInfo->pFormatInfo == nullptr;
+  Record* record = continue_or_start(decInfo, output, width, height, Mode::kIterative);
+  if (record == nullptr) return kFailure;
+  const int result = PELOI_DecodeGIFImageIter(decInfo->pIO, record, output, first);
+  if (result == kMore) return kMore;
+  // Damaged data end the image as its last row does.
+  if (!first) write_reduced(*record, output);
+  release_state<Record>(*decInfo);
+  return first ? kFailure : kDone;
+}
+
+int TAVIRPELOI_AbortGIFIter(TAVIRPELO_DECINFO* decInfo) {
+  if (decInfo == nullptr || foreign_state(*decInfo)) return 0;
+  release_state<Record>(*decInfo);
+  return 1;
+}

@@ -1,0 +1,20 @@
+// Setting up a GIF decode, and the record that its calls share.
+#pragma once
+
+#include "codec/formats/gif/record.h"
+#include "tavirpelo/api.h"
+#include "tavirpelo/decinfo.h"
+
+namespace pelo::gif {
+
+// The object's record when a decode of this kind and request goes on, or a new one for its first image.
+// Null, with nothing held, when the request differs from the first call's, or for a failure. Another
+// decoder's state is left alone and answered with null.
+Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode);
+
+}  // namespace pelo::gif
+
+// A record for the object's source with header read and output geometry computed; null for null
+// arguments, negative sizes, a source that is no GIF, a canvas that is too large, or short memory.
+TAVIRPELO_API pelo::gif::Record* PELOI_InitializeGIF(TAVIRPELO_DECINFO* decInfo, int width, int height,
+                                                     int animated, void* output);

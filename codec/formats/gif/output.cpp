@@ -1,0 +1,160 @@
+#include "codec/formats/gif/output.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "codec/formats/gif/geometry.h"
+#include "codec/formats/gif/interlace.h"
+#include "codec/formats/gif/store_span.h"
+#include "codec/pixel/lanes.h"
+#include "codec/pixel/packers.h"
+
+using namespace pelo;
+using namespace pelo::gif;
+
+namespace {
+
+// The picture columns that the frame covers, in one row of the picture.
+RowSpan frame_span(const Sampling& sampling, const OutputGrid& grid, int row) {
+  return grid.span(row, sampling.begin, sampling.end - sampling.begin);
+}
+
+// The indices of the current image row; [0] belongs to the frame's first column.
+const uint8_t* indices_of(const Record& record) {
+  return record.line.data() + record.lzw.start;
+}
+
+void write_sampled_row(const Record& record, const OutputGrid& grid, int row) {
+  const RowSpan span = frame_span(record.sampling, grid, row);
+  const uint8_t* indices = indices_of(record);
+  const Rgba* palette = record.palette;
+  if (!record.sampling.columns) {
+    store_span(record.store, span, [=](int i) { return palette[indices[i]]; });
+    return;
+  }
+  const uint16_t* columns = record.sampling.columns.data() + record.sampling.begin;
+  const int left = record.frame.left;
+  store_span(record.store, span, [=](int i) { return palette[indices[columns[i] - left]]; });
+}
+
+void write_into_plane(Record& record) {
+  const Sampling& sampling = record.sampling;
+  const OutputRows rows = rows_of(sampling, record.currentRow);
+  const uint8_t* indices = indices_of(record);
+  for (int row = rows.begin; row < rows.end; ++row) {
+    record.plane.painted[static_cast<size_t>(row)] = 1;
+    uint8_t* target = record.plane.row(row);
+    if (row > rows.begin) {
+      std::memcpy(target, record.plane.row(rows.begin), static_cast<size_t>(sampling.to.width));
+      continue;
+    }
+    for (int k = sampling.begin; k < sampling.end; ++k) {
+      const int column = sampling.columns ? sampling.columns[static_cast<size_t>(k)] : k;
+      target[k] = indices[column - record.frame.left];
+    }
+  }
+}
+
+}  // namespace
+
+namespace pelo::gif {
+
+StoreRgba gif_storer(int format) {
+  return format == TAVIRPELO_RGB565A8 ? nullptr : rgba_storer(format, Alpha::kIgnored);
+}
+
+void set_palette(Record& record) {
+  for (int i = 0; i < 256; ++i) {
+    const uint32_t lanes = record.colours[i];
+    record.palette[i] = {static_cast<uint8_t>(lanes >> 20), static_cast<uint8_t>(lanes >> 10),
+                         static_cast<uint8_t>(lanes), 255};
+  }
+  if (record.control.transparentIndex >= 0) record.palette[record.control.transparentIndex] = {};
+}
+
+bool row_is_wanted(const Record& record) {
+  if (record.currentRow >= record.screen.height) return false;
+  if (record.animated) return true;  // the canvas needs it
+  if (record.store == nullptr) return false;
+  const OutputRows rows = rows_of(record.sampling, record.currentRow);
+  return rows.end > std::max(rows.begin, record.lineRow);
+}
+
+void write_plane_row(const Record& record, int planeRow, const OutputGrid& grid, int row) {
+  const uint8_t* indices = record.plane.row(planeRow) + record.sampling.begin;
+  const Rgba* palette = record.palette;
+  store_span(record.store, frame_span(record.sampling, grid, row),
+             [=](int i) { return palette[indices[i]]; });
+}
+
+void write_screen_row(Record& record, void* output) {
+  if (record.picture == record.screen) {
+    PELOI_WriteAGIFOneToOneRow(&record, output);
+  } else {
+    PELOI_DownsizeAGIFRow(&record, output);
+  }
+}
+
+}  // namespace pelo::gif
+
+int PELOI_WriteGIFOneToOneRow(Record* record, void* output) {
+  if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
+  write_sampled_row(*record, grid_of(*record, output), record->currentRow);
+  return 1;
+}
+
+int PELOI_DownsizeGIFRow(Record* record, void* output) {
+  if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
+  const OutputGrid grid = grid_of(*record, output);
+  const OutputRows rows = rows_of(record->sampling, record->currentRow);
+  for (int row = rows.begin; row < rows.end; ++row) write_sampled_row(*record, grid, row);
+  return 1;
+}
+
+int PELOI_WriteAGIFOneToOneRow(Record* record, void* output) {
+  if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
+  const RowSpan span = grid_of(*record, output).span(record->currentRow, 0, record->picture.width);
+  store_colours(record->store, record->rowSource + span.skip, span.count, span.first, span.step);
+  return 1;
+}
+
+int PELOI_DownsizeAGIFRow(Record* record, void* output) {
+  if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
+  if (!record->sampling.columns) return 1;  // an empty picture
+  const OutputGrid grid = grid_of(*record, output);
+  const OutputRows rows = rows_of(record->sampling, record->currentRow);
+  const uint16_t* columns = record->sampling.columns.data();
+  const Rgba* source = record->rowSource;
+  for (int row = rows.begin; row < rows.end; ++row) {
+    const RowSpan span = grid.span(row, 0, record->picture.width);
+    store_span(record->store, span, [=](int i) { return source[columns[i]]; });
+  }
+  return 1;
+}
+
+int PELOI_WriteTheLine(Record* record, void* output) {
+  if (record->animated) {
+    write_screen_row(*record, output);
+  } else if (record->plane.indices) {
+    write_into_plane(*record);
+  } else if (record->picture == record->screen) {
+    PELOI_WriteGIFOneToOneRow(record, output);
+  } else {
+    PELOI_DownsizeGIFRow(record, output);
+  }
+  return advance_row(*record);
+}
+
+int PELOI_GIFMakeOut1Row(Record* record, void* output, int* consumed) {
+  const OutputRows rows = rows_of(record->sampling, record->currentRow);
+  if (record->lineRow < rows.end) {
+    // Rows above the image keep what the buffer holds.
+    if (record->lineRow >= rows.begin) {
+      write_sampled_row(*record, line_grid_of(*record, output), record->linesHere);
+    }
+    ++record->lineRow;
+    ++record->linesHere;
+  }
+  *consumed = record->lineRow >= rows.end;
+  return *consumed == 0 || advance_row(*record);
+}

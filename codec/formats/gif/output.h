@@ -1,0 +1,41 @@
+// Row writers: from colour indices or screen pixels into the caller's buffer.
+#pragma once
+
+#include "codec/base/output_grid.h"
+#include "codec/formats/gif/record.h"
+#include "tavirpelo/api.h"
+
+namespace pelo::gif {
+
+// The row store of an output format that GIF pictures are written in (0, 1, 5, 7, 8, 10, 11); null for
+// the others, which are decoded without writing.
+StoreRgba gif_storer(int format);
+
+// The colours of the current image's indices: opaque, but zeros for the transparent one.
+void set_palette(Record& record);
+
+// True when some output is made of the current row.
+bool row_is_wanted(const Record& record);
+
+// Writes a row of the plane into picture row `row` of a grid, where the frame covers it.
+void write_plane_row(const Record& record, int planeRow, const OutputGrid& grid, int row);
+
+// Writes the current screen row from the row source.
+void write_screen_row(Record& record, void* output);
+
+}  // namespace pelo::gif
+
+// Each writes the current row of an image (its indices stand in the line buffer) or of an animation's
+// screen; rows below the screen are ignored. 1.
+TAVIRPELO_API int PELOI_WriteGIFOneToOneRow(pelo::gif::Record* record, void* output);
+TAVIRPELO_API int PELOI_DownsizeGIFRow(pelo::gif::Record* record, void* output);
+TAVIRPELO_API int PELOI_WriteAGIFOneToOneRow(pelo::gif::Record* record, void* output);
+TAVIRPELO_API int PELOI_DownsizeAGIFRow(pelo::gif::Record* record, void* output);
+
+// Writes the current row where the record's mode wants it and moves on to the next image row. 1, or 0
+// when there is no such interlace pass.
+TAVIRPELO_API int PELOI_WriteTheLine(pelo::gif::Record* record, void* output);
+
+// Line mode: writes the next output row, unrotated, when it is made of the current image row. *consumed
+// becomes 1 when no further output row is; the current row has then moved on.
+TAVIRPELO_API int PELOI_GIFMakeOut1Row(pelo::gif::Record* record, void* output, int* consumed);

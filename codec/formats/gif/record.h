@@ -1,0 +1,128 @@
+// The GIF decoder record: everything that a decode keeps between rows, calls and frames.
+#pragma once
+
+#include <cstdint>
+
+#include "codec/base/format_state.h"
+#include "codec/base/geometry.h"
+#include "codec/base/lsb_bits.h"
+#include "codec/base/os_memory.h"
+#include "codec/formats/gif/reader.h"
+#include "codec/formats/gif/translation_table.h"
+#include "codec/pixel/rgba_store.h"
+
+namespace pelo::gif {
+
+enum class Mode { kWhole, kLines, kIterative, kAnimated };
+
+// What a decode was started with; its later calls must ask for the same.
+struct Request {
+  Mode mode;
+  Size buffer;  // the caller's, pixels
+  int format;
+  uint32_t option;
+  bool operator==(const Request&) const = default;
+};
+
+// A colour in memory order; a transparent or unpainted pixel is all zeros.
+struct alignas(4) Rgba {
+  uint8_t r, g, b, a;
+};
+
+// Where an image lies on the logical screen, pixels.
+struct Frame {
+  int left, top, width, height;
+};
+
+struct GraphicControl {
+  int disposal;
+  bool transparent;
+  int transparentIndex;  // -1: none
+  int delay;             // milliseconds
+};
+
+// Which pixels of the screen make up a picture of another size: the ones under its pixels' centres.
+struct Sampling {
+  Size from, to;
+  OsBuffer<uint16_t> columns;  // a screen column for each picture column; empty at 1:1
+  int begin, end;              // picture columns that the current frame covers
+};
+
+struct OutputRows {
+  int begin, end;
+};
+
+// Sampled rows of indices, kept until they can be written.
+struct IndexPlane {
+  Size size;
+  OsBuffer<uint8_t> indices;
+  OsBuffer<uint8_t> painted;  // per row: 1 once it is there
+
+  // Both stay empty for an empty plane. False when it is too large or memory is short.
+  [[nodiscard]] bool allocate(Size wanted);
+  uint8_t* row(int y) {
+    return indices.data() + static_cast<size_t>(y) * static_cast<size_t>(size.width);
+  }
+  const uint8_t* row(int y) const { return const_cast<IndexPlane*>(this)->row(y); }
+};
+
+// The decompressor between two codes.
+struct LzwState {
+  LsbBits bits;
+  const uint8_t* next;  // the unread part of the current sub-block, in the reader's buffer
+  const uint8_t* end;
+  int codeSize;       // bits
+  uint32_t nextCode;  // the code that gets the next entry
+  uint32_t previous;  // the code before; kNoCode behind a clear code
+  int start, fill;    // indices in the line buffer that no row has taken yet
+  int rows;           // image rows finished
+};
+constexpr uint32_t kNoCode = kCodes;
+
+struct Record : FormatState {
+  static constexpr FormatKind kKind = FormatKind::kGif;
+
+  Size screen;
+  int colourResolution;
+  int backgroundIndex;
+  int aspectRatio;
+  uint32_t globalTable[256];  // packed lanes, see pixel/lanes.h
+  Frame frame;
+  int interlacePass;  // 0: rows in order
+  uint32_t localTable[256];
+  int minimumCodeSize;
+  GraphicControl control;
+  const uint32_t* colours;  // the current image's table
+  Rgba palette[256];        // the same with transparency
+  TranslationTable table;
+  Reader reader;
+
+  Request request;
+  uint32_t option;  // the option word that the output is placed by
+  StoreRgba store;  // null: the output format has no writer
+  Size picture;     // produced size before rotation
+  Sampling sampling;
+  IndexPlane plane;
+  OsBuffer<uint8_t> line;  // indices of the current row and the rest of the string behind it
+  int currentRow;          // on the screen
+  LzwState lzw;
+
+  int lineRow;     // line mode: the next output row
+  int lines;       // output rows that the current call has room for
+  int linesHere;   // those done
+  bool imageDone;  // line mode: only rows below the image are left
+
+  bool animated;
+  OsBuffer<Rgba> canvas;    // the screen as the frames so far left it
+  OsBuffer<Rgba> frameRow;  // the shown row where it differs from what stays on the canvas
+  const Rgba* rowSource;    // the row to write
+  bool inImage;             // animation: image rows are being decoded
+};
+
+}  // namespace pelo::gif
+
+// An empty record; null when memory is short.
+TAVIRPELO_API pelo::gif::Record* PELOI_CreateGIFDecoderInfo(void);
+
+// Frees a record and all it owns; null is ignored.
+TAVIRPELO_API void PELOI_DelGIFDecoderInfo(pelo::gif::Record* record);

@@ -1,0 +1,108 @@
+#include "codec/formats/jpeg/decoder/bit_reader.h"
+
+#include "codec/formats/jpeg/decoder/jd_info.h"
+
+namespace pelo::jpeg {
+namespace {
+
+// The next source byte, reading another block when the window is used up; -1 when there is none.
+int next_byte(BitReader& reader) {
+  if (reader.next == reader.end) {
+    PELOJ_SOURCE& source = *reader.jd->source;
+    const int count = TAVIRPELO_Read_IO(source.io, source.buffer, static_cast<int>(kSourceBufferSize));
+    if (count <= 0) return -1;
+    source.consumed += static_cast<uint32_t>(count);
+    reader.next = source.buffer;
+    reader.end = reader.plainEnd = source.buffer + count;
+  }
+  return *reader.next++;
+}
+
+// The next data byte without its stuffing; -1 at a marker, which becomes the unread one, or at the end.
+int next_data_byte(BitReader& reader) {
+  const int byte = next_byte(reader);
+  if (byte != 0xFF) return byte;
+  int code;
+  do {
+    code = next_byte(reader);
+  } while (code == 0xFF);
+  if (code == 0) return 0xFF;
+  if (code > 0) reader.jd->unreadMarker = static_cast<uint8_t>(code);
+  return -1;
+}
+
+// Zeros behind the data, counted as invented.
+void pad(BitState& state) {
+  const int zeros = kBitBufferSize - 1 - state.left;
+  state.bits <<= zeros;
+  state.left += zeros;
+  state.invented += zeros;
+}
+
+// Searches a code bit by bit from a given length on (T.81 F.16).
+uint32_t match_code(BitReader& reader, const DerivedTable& table, int length) {
+  while (length <= kMaxCodeLength &&
+         static_cast<int32_t>(reader.peek(length)) > table.maxcode[static_cast<size_t>(length)]) {
+    ++length;
+  }
+  // A corrupt code is noticed when one bit more than the longest code is gone.
+  const auto code = static_cast<int32_t>(reader.take(length));
+  if (length > kMaxCodeLength) return 0;
+  const int32_t index = code + table.valoffset[static_cast<size_t>(length)];
+  return table.raw->symbols[static_cast<size_t>(index) & 255];
+}
+
+}  // namespace
+
+BitReader fill_by_bytes(BitReader reader) {
+  BitState& state = reader.state;
+  while (state.left <= kBitBufferSize - 8) {
+    const int byte = reader.jd->unreadMarker == 0 ? next_data_byte(reader) : -1;
+    if (byte < 0) {
+      reader.plainEnd = reader.next;
+      pad(state);
+      break;
+    }
+    state.bits = state.bits << 8 | static_cast<BitBuffer>(byte);
+    state.left += 8;
+  }
+  return reader;
+}
+
+uint32_t decode_long_code(BitReader& reader, const DerivedTable& table) {
+  reader.fill();
+  return match_code(reader, table, kLookBits + 1);
+}
+
+BitReader open_bits(PELOJ_JDINFO& jd) {
+  const uint8_t* next = jd.source->buffer + jd.source->pos;
+  const uint8_t* end = next + jd.source->avail;
+  return {jd.entropy->bits, next, end, jd.unreadMarker == 0 ? end : next, &jd};
+}
+
+void close_bits(PELOJ_JDINFO& jd, const BitReader& reader) {
+  jd.entropy->bits = reader.state;
+  jd.source->pos = static_cast<uint32_t>(reader.next - jd.source->buffer);
+  jd.source->avail = static_cast<uint32_t>(reader.end - reader.next);
+}
+
+}  // namespace pelo::jpeg
+
+using namespace pelo::jpeg;
+
+int PELOJ_ReadBits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
+  reader->state.bits = buffer;
+  reader->state.left = bitsLeft;
+  *reader = fill_by_bytes(*reader);
+  const int real = reader->state.left - reader->state.invented;
+  if (real >= needed) return 1;
+  return reader->jd->unreadMarker != 0 ? 1 : 0;
+}
+
+int PELOJ_DecodeHuffMan(BitReader* reader, BitBuffer buffer, int bitsLeft, const DerivedTable* derived,
+                        int minBits) {
+  reader->state.bits = buffer;
+  reader->state.left = bitsLeft;
+  if (bitsLeft <= kMaxCodeLength && !PELOJ_ReadBits(reader, buffer, bitsLeft, minBits)) return -1;
+  return static_cast<int>(match_code(*reader, *derived, minBits < 1 ? 1 : minBits));
+}

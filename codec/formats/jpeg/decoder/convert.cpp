@@ -1,0 +1,227 @@
+#include "codec/formats/jpeg/decoder/convert.h"
+
+#include <cstring>
+
+#include "codec/pixel/lanes.h"
+
+namespace pelo::jpeg {
+namespace {
+
+// What the channels of a full-grid row are, and the writers they go to.
+struct YccRows {
+  static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
+    PELOJ_YcbcrWriteOutput1to1(&jd, row.plane[0], row.plane[1], row.plane[2], count);
+  }
+  static void write_sums(PELOJ_JDINFO& jd) {
+    PELOJ_YcbcrWriteOutput(&jd, jd.accumulator.data(), jd.targetWidth);
+  }
+  static constexpr bool kGrey = false;
+};
+struct RgbRows {
+  static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
+    PELOJ_RGBWriteOutput1to1(&jd, row.plane[0], row.plane[1], row.plane[2], count);
+  }
+  static void write_sums(PELOJ_JDINFO& jd) {
+    PELOJ_RGBWriteOutput(&jd, jd.accumulator.data(), jd.targetWidth);
+  }
+  static constexpr bool kGrey = false;
+};
+struct GreyRows {
+  static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
+    PELOJ_GrayWriteOutput1to1(&jd, row.plane[0], count);
+  }
+  static void write_sums(PELOJ_JDINFO& jd) {
+    PELOJ_GrayWriteOutput(&jd, jd.accumulator.data(), jd.targetWidth);
+  }
+  static constexpr bool kGrey = true;
+};
+
+// The row at the read position, from the crop offset on.
+GridRow grid_row(const PELOJ_JDINFO& jd, int row) {
+  GridRow grid{};
+  for (int c = 0; c < jd.componentCount; ++c) {
+    grid.plane[c] = (*jd.components)[static_cast<size_t>(c)].colourRows[jd.readPosition + row] + jd.cropX;
+  }
+  return grid;
+}
+
+// True when an input row holds the sample point with offset q of output row y:
+// 0 <= y * inH + q - i * outH < outH.
+bool holds_point(const PELOJ_JDINFO& jd, int inputRow, int outputRow, int q) {
+  const int64_t distance =
+      int64_t{outputRow} * jd.usedHeight + q - int64_t{inputRow} * jd.targetHeight;
+  return distance >= 0 && distance < jd.targetHeight;
+}
+bool holds_quarter(const PELOJ_JDINFO& jd, int outputRow) {
+  return holds_point(jd, jd.inputRow, outputRow, jd.usedHeight / 4);
+}
+bool holds_three_quarters(const PELOJ_JDINFO& jd, int outputRow) {
+  return holds_point(jd, jd.inputRow, outputRow, static_cast<int>(int64_t{3} * jd.usedHeight / 4));
+}
+
+// Sets or adds the two points of each output column.
+template <class Rows, bool Add>
+void accumulate(PELOJ_JDINFO& jd, const GridRow& row) {
+  const uint16_t* __restrict columns = jd.columns.data();
+  uint32_t* __restrict sums = jd.accumulator.data();
+  const int width = jd.targetWidth;
+  for (int x = 0; x < width; ++x) {
+    const uint32_t a = columns[2 * x];
+    const uint32_t b = columns[2 * x + 1];
+    const uint8_t* first = row.plane[0];
+    const uint32_t sum0 = static_cast<uint32_t>(first[a]) + first[b];
+    uint32_t sum;
+    if constexpr (Rows::kGrey) {
+      sum = pack_lanes(sum0, sum0, sum0);
+    } else {
+      const uint8_t* second = row.plane[1];
+      const uint8_t* third = row.plane[2];
+      sum = pack_lanes(sum0, static_cast<uint32_t>(second[a]) + second[b],
+                       static_cast<uint32_t>(third[a]) + third[b]);
+    }
+    sums[x] = Add ? sums[x] + sum : sum;
+  }
+}
+
+// Serves the next output row from the current input row. A row is opened by its quarter point and closed
+// by its three-quarter point; since no output row's quarter point lies above the three-quarter point of
+// the one before, only one is open at a time. True when an output row was finished.
+template <class Rows>
+bool serve_output_row(PELOJ_JDINFO& jd, const GridRow& row) {
+  const int y = jd.output.emitted;
+  if (holds_quarter(jd, y)) accumulate<Rows, false>(jd, row);
+  if (!holds_three_quarters(jd, y)) return false;
+  accumulate<Rows, true>(jd, row);
+  Rows::write_sums(jd);
+  return true;
+}
+
+// True when the band is full and the picture goes on: the input row may have points of its next row too.
+bool pauses(const PELOJ_JDINFO& jd) {
+  return jd.output.emitted == jd.output.bandEnd && jd.output.emitted < jd.output.limit;
+}
+
+// Four-point averages; every row of the call is used up.
+template <class Rows>
+void convert_averaging(PELOJ_JDINFO& jd, int rows) {
+  for (int i = 0; i < rows; ++i, ++jd.inputRow) {
+    const GridRow row = grid_row(jd, i);
+    if (jd.exact) {
+      Rows::write(jd, row, jd.targetWidth);
+      continue;
+    }
+    while (jd.output.emitted < jd.output.bandEnd && serve_output_row<Rows>(jd, row)) {
+    }
+    if (pauses(jd)) return;
+  }
+  jd.continueFlag = 0;
+}
+
+// The same for enlarging: one output row a call.
+template <class Rows>
+void convert_enlarging(PELOJ_JDINFO& jd, int rows) {
+  if (rows > 0 && serve_output_row<Rows>(jd, grid_row(jd, 0))) {
+    // More points may fall into this input row.
+    if (jd.output.emitted < jd.output.limit && holds_quarter(jd, jd.output.emitted)) return;
+  }
+  jd.continueFlag = 0;
+  jd.inputRow += rows;
+}
+
+// Centre points: the row is written once for each output row whose centre falls into it.
+template <auto WriteRow>
+void convert_picking(PELOJ_JDINFO& jd, int rows) {
+  for (int i = 0; i < rows; ++i, ++jd.inputRow) {
+    const GridRow row = grid_row(jd, i);
+    if (jd.exact) {
+      YccRows::write(jd, row, jd.targetWidth);
+      continue;
+    }
+    while (jd.output.emitted < jd.output.bandEnd &&
+           holds_point(jd, jd.inputRow, jd.output.emitted, jd.usedHeight / 2)) {
+      WriteRow(&jd, row.plane[0], row.plane[1], row.plane[2], jd.targetWidth);
+    }
+    if (pauses(jd)) return;
+  }
+  jd.continueFlag = 0;
+}
+
+bool picks_centres(const PELOJ_JDINFO& jd) {
+  return jd.convert == PELOJ_DoFastYcbcrToRgb || jd.convert == PELOJ_DoFastYcbcrToUpscaleRgb;
+}
+
+// Small pictures, coarse modes, and in mode 1 pictures that hardly shrink take the fast converter.
+bool wants_fast(const PELOJ_JDINFO& jd) {
+  if (jd.outWidth <= 99 && jd.outHeight <= 99) return true;
+  if (jd.decMode >= 2) return true;
+  return jd.decMode == 1 && int64_t{12} * jd.outWidth >= int64_t{7} * jd.scaledWidth &&
+         int64_t{12} * jd.outHeight >= int64_t{7} * jd.scaledHeight;
+}
+
+uint16_t sample_column(int64_t x, int64_t in, int64_t out, int64_t q) {
+  return static_cast<uint16_t>((x * in + q) / out);
+}
+
+}  // namespace
+
+bool choose_converter(PELOJ_JDINFO& jd) {
+  const bool larger = jd.outWidth > jd.scaledWidth || jd.outHeight > jd.scaledHeight;
+  switch (jd.colourSpace) {
+    case ColourSpace::kYcc:
+      if (larger) {
+        jd.convert = jd.decMode >= 2 ? PELOJ_DoFastYcbcrToUpscaleRgb : PELOJ_DoYcbcrToUpscaleRgb;
+      } else {
+        jd.convert = wants_fast(jd) ? PELOJ_DoFastYcbcrToRgb : PELOJ_DoYcbcrToRgb;
+      }
+      return true;
+    case ColourSpace::kGrey:
+      jd.convert = larger ? PELOJ_DoGrayUpscaleConvert : PELOJ_DoGrayConvert;
+      return true;
+    case ColourSpace::kRgb:
+      jd.convert = larger ? PELOJ_DoRgbUpscaleConvert : PELOJ_DoRgbConvert;
+      return true;
+    default:
+      return false;
+  }
+}
+
+bool prepare_resampling(PELOJ_JDINFO& jd) {
+  if (jd.exact) return true;
+  const auto width = static_cast<size_t>(jd.targetWidth);
+  const int64_t in = jd.usedWidth;
+  const bool picks = picks_centres(jd);
+  if (!jd.columns.allocate(picks ? width : 2 * width)) return false;
+  for (size_t x = 0; x < width; ++x) {
+    const auto column = static_cast<int64_t>(x);
+    if (picks) {
+      jd.columns[x] = sample_column(column, in, jd.targetWidth, in / 2);
+    } else {
+      jd.columns[2 * x] = sample_column(column, in, jd.targetWidth, in / 4);
+      jd.columns[2 * x + 1] = sample_column(column, in, jd.targetWidth, 3 * in / 4);
+    }
+  }
+  return picks || jd.accumulator.allocate(width);
+}
+
+}  // namespace pelo::jpeg
+
+using namespace pelo::jpeg;
+
+void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows) { convert_averaging<YccRows>(*jdInfo, rows); }
+void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_enlarging<YccRows>(*jdInfo, rows);
+}
+void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_picking<PELOJ_FastYcbcrWriteOutput>(*jdInfo, rows);
+}
+void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_picking<PELOJ_FastYcbcrUpscaleWriteOutput>(*jdInfo, rows);
+}
+void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, int rows) { convert_averaging<GreyRows>(*jdInfo, rows); }
+void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_enlarging<GreyRows>(*jdInfo, rows);
+}
+void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, int rows) { convert_averaging<RgbRows>(*jdInfo, rows); }
+void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_enlarging<RgbRows>(*jdInfo, rows);
+}

@@ -1,0 +1,32 @@
+// The converters: full-grid rows of the decoded size become rows of the target size (copied, picked at
+// centres, or averaged from four points) and go to a row writer.
+//
+// Output column x of outW draws on input columns floor((x * inW + q) / outW): q = inW/2 for the centre
+// point, inW/4 and 3*inW/4 for the two points of the averages; rows likewise.
+#pragma once
+
+#include "codec/formats/jpeg/decoder/jd_info.h"
+
+// Each converts `rows` rows of the current row group from the read position on. The plain members and the
+// fast enlarging one finish their rows in one call; the averaging enlarging ones return after every output
+// row. All clear the continue flag when the input row is used up, and keep it, one row a call, when the
+// band of output rows is full before.
+TAVIRPELO_API void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows);
+
+namespace pelo::jpeg {
+
+// Picks the converter of the state's colour space, sizes and decode mode; false for a colour space that
+// has none.
+[[nodiscard]] bool choose_converter(PELOJ_JDINFO& jd);
+
+// Allocates the accumulators and the column table that the chosen converter needs.
+[[nodiscard]] bool prepare_resampling(PELOJ_JDINFO& jd);
+
+}  // namespace pelo::jpeg

@@ -1,0 +1,154 @@
+// The JPEG decode entry: an embedded thumbnail when the option word allows it, else the main picture.
+#include "codec/formats/jpeg/decoder/driver.h"
+#include "codec/formats/jpeg/header_scan.h"
+#include "platform/android_log.h"
+#include "tavirpelo/decode.h"
+
+namespace pelo::jpeg {
+namespace {
+
+struct Request {
+  void* buffer;
+  int width, height;
+};
+
+// The thumbnail's header scan; nothing is present when the file's own scan fails.
+PELOJ_FILEHEADER scan_header(PELOJ_SOURCE& source) {
+  PELOJ_FILEHEADER header{};
+  if (PELOJ_ParseFileHeader(&source, kScanMode, &header) != PELOJ_OK) header = {};
+  return header;
+}
+
+// True when an embedded JPEG is at least as large as the request; reads its own header for that. Fills
+// the thumbnail's size.
+bool large_enough(PELOJ_SOURCE& source, PELOJ_THUMBNAIL& thumbnail, const Request& request) {
+  if (thumbnail.type == PELOJ_THUMBNAIL_PHOTOSHOP) {
+    return thumbnail.width != 0 && thumbnail.height != 0 && request.width < thumbnail.width &&
+           request.height < thumbnail.height;
+  }
+  if (thumbnail.type != PELOJ_THUMBNAIL_JPEG || !source_reposition(source, thumbnail.offset)) return false;
+  PELOJ_FILEHEADER header{};
+  if (PELOJ_ParseFileHeader(&source, kScanMode, &header) != PELOJ_OK) return false;
+  thumbnail.width = header.width;
+  thumbnail.height = header.height;
+  return header.width != 0 && header.height != 0 && request.width <= header.width &&
+         request.height <= header.height;
+}
+
+bool usable(PELOJ_SOURCE& source, PELOJ_THUMBNAIL& thumbnail, uint32_t policy, const Request& request) {
+  if (!thumbnail_in_source(thumbnail, source.size)) return false;
+  if (policy == TAVIRPELO_THUMBNAIL_ANY) {
+    return thumbnail.type == PELOJ_THUMBNAIL_JPEG || thumbnail.type == PELOJ_THUMBNAIL_PHOTOSHOP;
+  }
+  return large_enough(source, thumbnail, request);
+}
+
+bool decode_at(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, uint32_t offset, int imageWidth,
+               int imageHeight, const Request& request) {
+  if (!source_reposition(source, offset)) {
+    log_error("TAVIRPELO_DecodeJPEG : seek Fail");
+    return false;
+  }
+  decInfo.imageWidth = imageWidth;
+  decInfo.imageHeight = imageHeight;
+  return PELOJ_ValorenDecodeFrame(&decInfo, &source, request.buffer, request.width, request.height) != 0;
+}
+
+// The thumbnail turned to the main picture's orientation, when the two differ.
+bool decode_turned(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const PELOJ_FILEHEADER& header,
+                   const Request& request) {
+  const PELOJ_THUMBNAIL& thumbnail = header.thumbnail;
+  const bool portrait = header.height > header.width;
+  const bool differs = portrait ? thumbnail.width > thumbnail.height : thumbnail.height > thumbnail.width;
+  if (!differs) {
+    return decode_at(decInfo, source, thumbnail.offset, thumbnail.width, thumbnail.height, request);
+  }
+  const Request transposed{request.buffer, request.height, request.width};
+  return decode_at(decInfo, source, thumbnail.offset, thumbnail.width, thumbnail.height, transposed) &&
+         PELOJ_RotateImage90(request.buffer, request.height, request.width, decInfo.outFormat) != 0;
+}
+
+bool decode(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const Request& request) {
+  const uint32_t policy = decInfo.option & TAVIRPELO_THUMBNAIL_MASK;
+  int width = 0;
+  int height = 0;
+  if (policy != TAVIRPELO_THUMBNAIL_NEVER) {
+    PELOJ_FILEHEADER header = scan_header(source);
+    if (policy != TAVIRPELO_THUMBNAIL_ANY) {
+      width = header.width;
+      height = header.height;
+    }
+    if (usable(source, header.thumbnail, policy, request)) {
+      if (policy == TAVIRPELO_THUMBNAIL_TURNED) return decode_turned(decInfo, source, header, request);
+      const PELOJ_THUMBNAIL& thumbnail = header.thumbnail;
+      if (decode_at(decInfo, source, thumbnail.offset, thumbnail.width, thumbnail.height, request)) {
+        return true;
+      }
+    }
+  }
+  return decode_at(decInfo, source, 0, width, height, request);
+}
+
+// A reader at the start of the object's source; false with a line in the log.
+bool open_source(TAVIRPELO_DECINFO& decInfo, BufferedSource& source) {
+  if (!source.open(decInfo.pIO)) {
+    gTAVIRPELO_Error = TAVIRPELO_ERROR_MEMORY;
+    log_error("TAVIRPELO_DecodeJPEG : malloc Fail");
+    return false;
+  }
+  if (TAVIRPELO_Seek_IO(decInfo.pIO, 0, SEEK_SET) < 0) {
+    log_error("TAVIRPELO_DecodeJPEG : seek Fail");
+    return false;
+  }
+  return true;
+}
+
+}  // namespace
+}  // namespace pelo::jpeg
+
+using namespace pelo;
+using namespace pelo::jpeg;
+
+int TAVIRPELO_DecodeJPEG(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight) {
+  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  if (decInfo == nullptr || outBuffer == nullptr) {
+    gTAVIRPELO_Error = TAVIRPELO_ERROR_NULL;
+    return 0;
+  }
+  if (reqWidth < 1 || reqHeight < 1) {
+    log_error("TAVIRPELO_DecodeJPEG : Invalid Size");
+    return 0;
+  }
+  BufferedSource source;
+  if (!open_source(*decInfo, source)) return 0;
+  if (decode(*decInfo, *source.get(), {outBuffer, reqWidth, reqHeight})) return 1;
+  log_error("TAVIRPELO_DecodeJPEG : decode Fail");
+  return 0;
+}
+
+int PELOJ_DecodeThumbnail(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight,
+                          int* outWidth, int* outHeight) {
+  if (decInfo == nullptr || outBuffer == nullptr || outWidth == nullptr || outHeight == nullptr) return 0;
+  *outWidth = *outHeight = 0;
+  if (reqWidth < 1 || reqHeight < 1) return 0;
+  BufferedSource source;
+  if (!open_source(*decInfo, source)) return 0;
+  const PELOJ_THUMBNAIL thumbnail = scan_header(*source.get()).thumbnail;
+  if (thumbnail_in_source(thumbnail, source->size)) {
+    decInfo->option = (decInfo->option & ~0xF00u) | TAVIRPELO_FIT_TIGHT;
+    if (decode_at(*decInfo, *source.get(), thumbnail.offset, thumbnail.width, thumbnail.height,
+                  {outBuffer, reqWidth, reqHeight})) {
+      return PELOJ_GetDecSize(decInfo, outWidth, outHeight);
+    }
+  }
+  log_error("TAVIRPELO_DecodeJPEG : decode Fail");
+  return 0;
+}
+
+int PELOJ_DecodeUncompressThumbnail(void) { return 1; }
+
+int PELOJ_GetDecSize(const TAVIRPELO_DECINFO* decInfo, int* width, int* height) {
+  *width = decInfo->outWidth;
+  *height = decInfo->outHeight;
+  return 1;
+}

@@ -1,0 +1,64 @@
+#include "codec/formats/jpeg/decoder/dequantise.h"
+
+namespace pelo::jpeg {
+namespace {
+
+// The steps that a decode in mode 1 quantises to: Annex K at 30 %.
+int32_t reference_step(const Component& component, size_t position) {
+  const auto& table = component.index == 0 ? kLuminanceQuant : kChrominanceQuant;
+  return (table[position] * 30 + 50) / 100;
+}
+
+const QuantTable* quant_table(const PELOJ_JDINFO& jd, const Component& component) {
+  return component.quantTable < 4 ? jd.quant[component.quantTable].get() : nullptr;
+}
+
+// Some AC step of the first component is less than half of the reference's.
+bool much_finer_than_reference(const QuantTable& table, const Component& first) {
+  for (size_t k = 1; k < 64; ++k) {
+    if (reference_step(first, k) > 2 * table.value[k]) return true;
+  }
+  return false;
+}
+
+void set_multipliers(const PELOJ_JDINFO& jd, const QuantTable& table, Component& component) {
+  // The 4-point table belongs to scale 1/2 whatever the frame type, although progressive pictures run an
+  // 8-point member there: their detail loses a tenth of its contrast, which is how they have always been
+  // shown.
+  const auto& factors = jd.scale == kHalf ? kFourPointScale : kAanScale;
+  for (size_t k = 0; k < 64; ++k) component.multiplier[k] = table.value[k] * factors[k] >> 2;
+}
+
+// Steps finer than the reference are replaced by it; the correction brings stored coefficients there.
+void set_requantising(QuantTable& table, Component& component) {
+  for (size_t k = 1; k < 64; ++k) {
+    const size_t n = PELOJ_NATURAL_ORDER[k];
+    const int32_t reference = reference_step(component, n);
+    table.correction[k] = 8192;
+    if (table.value[n] < reference) {
+      component.multiplier[n] = kAanScale[n] * reference >> 2;
+      table.correction[k] = table.value[n] * 8192 / reference;
+    }
+  }
+}
+
+}  // namespace
+
+bool prepare_multipliers(PELOJ_JDINFO& jd) {
+  for (int c = 0; c < jd.componentCount; ++c) {
+    if (quant_table(jd, (*jd.components)[static_cast<size_t>(c)]) == nullptr) return false;
+  }
+  const Component& first = (*jd.components)[0];
+  jd.requantise = jd.decMode == 1 && much_finer_than_reference(*quant_table(jd, first), first);
+  const bool requantise =
+      jd.requantise && jd.scale == kFull && jd.marker->frameType == FrameType::kBaseline;
+  for (int c = 0; c < jd.componentCount; ++c) {
+    Component& component = (*jd.components)[static_cast<size_t>(c)];
+    QuantTable& table = *jd.quant[component.quantTable];
+    set_multipliers(jd, table, component);
+    if (requantise) set_requantising(table, component);
+  }
+  return true;
+}
+
+}  // namespace pelo::jpeg

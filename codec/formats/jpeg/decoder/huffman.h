@@ -1,0 +1,55 @@
+// Huffman decoding tables: what a DHT segment lists (HuffmanSpec) made ready for table look-up
+// (ITU-T T.81 Annex C and F.2.2.3).
+#pragma once
+
+#include <array>
+#include <cstdint>
+
+#include "codec/formats/jpeg/tables.h"
+
+typedef struct PELOJ_JDINFO PELOJ_JDINFO;
+
+namespace pelo::jpeg {
+
+// Bits looked at in one step. Most codes of a photograph are shorter; a table stays within 2 KiB, so
+// that the tables of a scan share the first-level cache with the samples.
+constexpr int kLookBits = 10;
+constexpr uint32_t kLookSize = 1u << kLookBits;
+constexpr int kMaxCodeLength = 16;
+
+struct DerivedTable {
+  std::array<int32_t, kMaxCodeLength + 2> maxcode;    // largest code of each length, -1 for none;
+                                                      // entry 17 ends every search
+  std::array<int32_t, kMaxCodeLength + 1> valoffset;  // index of a length's first symbol - its code
+  const HuffmanSpec* raw;
+  // By the next kLookBits bits: code length << 8 | symbol, or 0 for a longer code.
+  std::array<uint16_t, kLookSize> lookup;
+  // AC tables, by the next kLookBits bits, when a code and its extra bits fit in them:
+  // value << 16 | run << 8 | bits used; 0 otherwise. The value is sign-extended (T.81 F.12).
+  std::array<int32_t, kLookSize> coefficient;
+};
+
+// By the next kSkipBits bits: how far the complete AC codes in them move the position. Wider than a look
+// at single codes: the wait for one entry passes several of them.
+//   bits 0-15   bits used, with the extra bits of the last code (may exceed kSkipBits)
+//   bits 16-22  coefficient positions passed
+//   bit 23      an end-of-block code was reached
+// 0: not even the first code fits.
+constexpr int kSkipBits = 12;
+constexpr uint32_t kSkipSize = 1u << kSkipBits;
+using SkipTable = std::array<uint32_t, kSkipSize>;
+constexpr uint32_t kSkipEndOfBlock = 1u << 23;
+constexpr uint32_t skip_used(uint32_t entry) { return entry & 0xFFFF; }
+constexpr int skip_advance(uint32_t entry) { return static_cast<int>(entry >> 16 & 0x7F); }
+
+struct EntropyState;
+
+}  // namespace pelo::jpeg
+
+// Derives the table of a class and number into the next pool slot and stores it in *derivedOut; for an
+// AC table of a baseline image at a reduced scale its skip table as well (in `entropy`). 200; 201 without
+// a raw table or memory; 0 for a bad table: more than 256 codes, a code that does not fit its length, a
+// DC symbol above 15.
+TAVIRPELO_API int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
+                                          const pelo::jpeg::DerivedTable** derivedOut,
+                                          pelo::jpeg::EntropyState* entropy);

@@ -1,0 +1,152 @@
+// The 8x8 inverse transforms: the whole one and those for sparse blocks.
+#include <cstring>
+
+#include "codec/formats/jpeg/decoder/idct.h"
+#include "codec/formats/jpeg/decoder/idct_math.h"
+#include "codec/formats/jpeg/lanes.h"
+
+namespace pelo::jpeg {
+namespace {
+
+inline int32_t any_bit(const Lanes& lanes) {
+  int32_t bits = 0;
+  for (int i = 0; i < 8; ++i) bits |= lanes[i];
+  return bits;
+}
+
+// Dequantises the first N rows and columns, the others are zero, in 32 bits. False when a product or a
+// result leaves the range in which that is exact; no real picture does. A |coefficient| below 1024 times
+// the largest multiplier (255 x 31521 >> 2) stays below 2^31.
+template <int N>
+inline bool dequantise_lanes(const int32_t* multiplier, const int32_t* block, Lanes (&x)[8]) {
+  constexpr Lanes kColumns{-1, -(N > 1), -(N > 2), -(N > 3), -(N > 4), -(N > 5), -(N > 6), -(N > 7)};
+  Lanes magnitude{};
+  for (int r = 0; r < N; ++r) {
+    x[r] = load_lanes(block + 8 * r) & kColumns;
+    magnitude |= x[r] ^ (x[r] >> 31);
+  }
+  if (any_bit(magnitude) >= 1024) return false;
+  magnitude = Lanes{};
+  for (int r = 0; r < N; ++r) {
+    x[r] = x[r] * load_lanes(multiplier + 8 * r) >> 10;
+    magnitude |= x[r] ^ (x[r] >> 31);
+  }
+  return any_bit(magnitude) < kDequantisedMax;
+}
+
+// The one-dimensional transform of N inputs; up to three take the folded form.
+template <int N>
+inline void transform_lanes(Lanes (&x)[8]) {
+  for (int i = N; i < 8; ++i) x[i] = Lanes{};
+  if constexpr (N > 3) {
+    butterfly8(x);
+  } else {
+    butterfly3(x);
+  }
+}
+
+inline void store_samples(const Lanes (&x)[8], uint8_t* const* rows, int column) {
+  ShortLanes samples[8];
+  for (int i = 0; i < 8; ++i) {
+    Lanes v = (x[i] >> 5) + 128;
+    v &= ~(v >> 31);                // below 0
+    v |= (Lanes{} + 255 - v) >> 31; // above 255: all bits of the byte
+    samples[i] = __builtin_convertvector(v & 255, ShortLanes);
+  }
+  transpose(samples);
+  for (int r = 0; r < 8; ++r) {
+    const ByteLanes bytes = __builtin_convertvector(samples[r], ByteLanes);
+    std::memcpy(rows[r] + column, &bytes, sizeof bytes);
+  }
+}
+
+// Reads the first N x N coefficients.
+template <int N>
+void transform_square(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+  Lanes x[8];
+  if (!dequantise_lanes<N>(multiplier, block, x)) {
+    for (int r = 0; r < N; ++r) {
+      x[r] = Lanes{};
+      for (int c = 0; c < N; ++c) x[r][c] = dequantise(block[8 * r + c], multiplier[8 * r + c]);
+    }
+  }
+  transform_lanes<N>(x);
+  transpose(x);
+  transform_lanes<N>(x);
+  store_samples(x, rows, column);
+}
+
+inline void fill_rows(uint8_t sample, uint8_t* const* rows, int column) {
+  for (int r = 0; r < 8; ++r) std::memset(rows[r] + column, sample, 8);
+}
+
+// Rows that are flat each: there is no horizontal detail.
+void transform_column(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+  int32_t x[8] = {dequantise(block[0], multiplier[0]), dequantise(block[8], multiplier[8])};
+  butterfly3(x);
+  for (int r = 0; r < 8; ++r) std::memset(rows[r] + column, to_sample(x[r]), 8);
+}
+
+// One row of samples for every output row: there is no vertical detail.
+void transform_row(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+  int32_t x[8] = {dequantise(block[0], multiplier[0]), dequantise(block[1], multiplier[1])};
+  butterfly3(x);
+  uint8_t samples[8];
+  for (int i = 0; i < 8; ++i) samples[i] = to_sample(x[i]);
+  for (int r = 0; r < 8; ++r) std::memcpy(rows[r] + column, samples, 8);
+}
+
+}  // namespace
+
+uint8_t idct_dc(int32_t multiplier, int32_t dc) { return to_sample(dequantise(dc, multiplier)); }
+
+InverseDct idct_full(int lastPosition) {
+  if (lastPosition == 0) return PELOJ_DoIdct1By1;
+  if (lastPosition == 1) return PELOJ_DoIdct2By1;
+  if (lastPosition <= 3) return PELOJ_DoIdct2By2;
+  if (lastPosition <= 8) return PELOJ_DoIdct3By3;
+  if (lastPosition <= 13) return PELOJ_DoIdct4By4;
+  return PELOJ_DoIdct8By8;
+}
+
+}  // namespace pelo::jpeg
+
+using namespace pelo::jpeg;
+
+void PELOJ_DoIdct8By8(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                      uint8_t* const* rows, int column) {
+  transform_square<8>(multiplier, block, rows, column);
+}
+void PELOJ_DoIdct(const uint8_t*, const int32_t* multiplier, const int32_t* block, uint8_t* const* rows,
+                  int column) {
+  transform_square<8>(multiplier, block, rows, column);
+}
+void PELOJ_DoIdct4By4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                      uint8_t* const* rows, int column) {
+  transform_square<4>(multiplier, block, rows, column);
+}
+void PELOJ_DoIdct3By3(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                      uint8_t* const* rows, int column) {
+  transform_square<3>(multiplier, block, rows, column);
+}
+void PELOJ_DoIdct2By2All(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                         uint8_t* const* rows, int column) {
+  transform_square<2>(multiplier, block, rows, column);
+}
+void PELOJ_DoIdct1By2(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                      uint8_t* const* rows, int column) {
+  transform_column(multiplier, block, rows, column);
+}
+void PELOJ_DoIdct2By2(const uint8_t* range, const int32_t* multiplier, const int32_t* block,
+                      uint8_t* const* rows, int column) {
+  const bool noHorizontal = block[1] == 0 && block[9] == 0;
+  (noHorizontal ? PELOJ_DoIdct1By2 : PELOJ_DoIdct2By2All)(range, multiplier, block, rows, column);
+}
+void PELOJ_DoIdct2By1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                      uint8_t* const* rows, int column) {
+  transform_row(multiplier, block, rows, column);
+}
+void PELOJ_DoIdct1By1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                      uint8_t* const* rows, int column) {
+  fill_rows(idct_dc(multiplier[0], block[0]), rows, column);
+}

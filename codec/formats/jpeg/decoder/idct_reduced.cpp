@@ -1,0 +1,112 @@
+// Reduced outputs of the 8-point transform: each keeps or averages some of the eight results. Column
+// results stay at full precision; only row results become samples.
+#include "codec/formats/jpeg/decoder/idct.h"
+#include "codec/formats/jpeg/decoder/idct_math.h"
+
+namespace pelo::jpeg {
+namespace {
+
+inline uint8_t mean(int32_t a, int32_t b) {
+  return static_cast<uint8_t>((to_sample(a) + to_sample(b)) >> 1);
+}
+
+// The odd part of inputs 1 and 3.
+struct OddPart {
+  int32_t q, a, b, c;
+};
+inline OddPart odd_part(int32_t d1, int32_t d3) {
+  const int32_t p = d1 - d3;
+  OddPart odd;
+  odd.q = d1 + d3;
+  odd.a = scaled(p, 473);
+  odd.b = scaled(d3, 669) - odd.q + odd.a;
+  odd.c = scaled(p, 362) - odd.b;
+  return odd;
+}
+
+inline void column_2to1(const int32_t (&d)[4], int32_t (&y)[4]) {
+  const OddPart odd = odd_part(d[1], d[3]);
+  y[0] = d[0] + d[2] + odd.q;
+  y[1] = d[0] + d[2] - scaled(d[2], 362) + odd.c;
+  y[2] = d[0] - d[2] + scaled(d[1], 277) - odd.a + odd.c;
+  y[3] = d[0] + scaled(d[2], 362) - d[2] - odd.b;
+}
+
+inline void row_2to1(const int32_t (&x)[4], uint8_t* out) {
+  const OddPart odd = odd_part(x[1], x[3]);
+  const int32_t e0 = x[0] + x[2];
+  const int32_t e1 = x[0] + scaled(x[2], 362) - x[2];
+  const int32_t e2 = x[0] - scaled(x[2], 362) + x[2];
+  const int32_t e3 = x[0] - x[2];
+  const int32_t o4 = scaled(x[1], 277) - odd.a + odd.c;
+  out[0] = mean(e0 + odd.q, e1 + odd.b);
+  out[1] = mean(e2 + odd.c, e3 - o4);
+  out[2] = mean(e3 + o4, e2 - odd.c);
+  out[3] = mean(e1 - odd.b, e0 - odd.q);
+}
+
+inline void column_8to3(const int32_t (&d)[4], int32_t (&y)[3]) {
+  const OddPart odd = odd_part(d[1], d[3]);
+  y[0] = odd.q + d[0] + d[2];
+  y[1] = scaled(d[1] - d[3], 362) + scaled(d[1], 277) - odd.a - odd.b + (d[0] - d[2]);
+  y[2] = d[0] - d[2] - odd.b + scaled(d[2], 362);
+}
+
+inline void row_8to3(int32_t r0, int32_t r1, int32_t r2, uint8_t* out) {
+  const int32_t s = r0 + r2;
+  const int32_t u = r0 - r2 + scaled(r2, 362);
+  const int32_t w = scaled(r1, 473) - r1;
+  out[0] = mean(u + w, s + r1);
+  out[1] = to_sample(r0 - r2);
+  out[2] = mean(s - r1, u - w);
+}
+
+inline int32_t p_4to1(int32_t x) { return scaled(x, 473) - x; }
+inline int32_t q_4to1(int32_t x) { return scaled(x, 362) + x - scaled(x, 473); }
+
+inline void row_4to1(int32_t a, int32_t b, uint8_t* out) {
+  out[0] = mean(a - scaled(b, 277) + scaled(b, 473) - q_4to1(b), a + p_4to1(b));
+  out[1] = mean(a - q_4to1(b), a - b);
+}
+
+}  // namespace
+}  // namespace pelo::jpeg
+
+using namespace pelo::jpeg;
+
+void PELOJ_DoIdct_2to1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                       uint8_t* const* rows, int column) {
+  int32_t work[4][4];
+  for (int c = 0; c < 4; ++c) {
+    int32_t d[4];
+    for (int r = 0; r < 4; ++r) d[r] = dequantise(block[8 * r + c], multiplier[8 * r + c]);
+    column_2to1(d, work[c]);
+  }
+  for (int r = 0; r < 4; ++r) {
+    row_2to1({work[0][r], work[1][r], work[2][r], work[3][r]}, rows[r] + column);
+  }
+}
+
+void PELOJ_DoIdct_8to3(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                       uint8_t* const* rows, int column) {
+  int32_t work[3][3];
+  for (int c = 0; c < 3; ++c) {
+    int32_t d[4];
+    for (int r = 0; r < 4; ++r) d[r] = dequantise(block[8 * r + c], multiplier[8 * r + c]);
+    column_8to3(d, work[c]);
+  }
+  for (int r = 0; r < 3; ++r) row_8to3(work[0][r], work[1][r], work[2][r], rows[r] + column);
+}
+
+void PELOJ_DoIdct_4to1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
+                       uint8_t* const* rows, int column) {
+  int32_t top[2], bottom[2];
+  for (int c = 0; c < 2; ++c) {
+    const int32_t d0 = dequantise(block[c], multiplier[c]);
+    const int32_t d1 = dequantise(block[8 + c], multiplier[8 + c]);
+    top[c] = d0 + p_4to1(d1);
+    bottom[c] = d0 - q_4to1(d1);
+  }
+  row_4to1(top[0], top[1], rows[0] + column);
+  row_4to1(bottom[0], bottom[1], rows[1] + column);
+}

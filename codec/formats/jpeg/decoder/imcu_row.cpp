@@ -1,0 +1,119 @@
+#include "codec/formats/jpeg/decoder/imcu_row.h"
+
+#include "codec/formats/jpeg/decoder/idct.h"
+#include "codec/formats/jpeg/decoder/mcu_decode.h"
+#include "codec/formats/jpeg/decoder/progressive.h"
+#include "codec/formats/jpeg/decoder/scan_setup.h"
+#include "platform/android_log.h"
+
+namespace pelo::jpeg {
+namespace {
+
+// Everything that a scale changes.
+struct FullSize {
+  static constexpr int kBlock = 8;
+  static InverseDct transform(int lastPosition) { return idct_full(lastPosition); }
+};
+struct HalfSize {
+  static constexpr int kBlock = 4;
+  static InverseDct transform(int lastPosition) { return idct_half(lastPosition); }
+};
+struct ThreeEighthsSize {
+  static constexpr int kBlock = 3;
+  static InverseDct transform(int) { return PELOJ_DoIdct_8to3; }
+};
+struct QuarterSize {
+  static constexpr int kBlock = 2;
+  static InverseDct transform(int) { return PELOJ_DoIdct_4to1; }
+};
+struct EighthSize {
+  static constexpr int kBlock = 1;
+};
+
+template <class Size>
+void transform_block(const Component& component, const int32_t* block, int lastPosition,
+                     uint8_t* const* rows, int column) {
+  if constexpr (Size::kBlock == 1) {
+    rows[0][column] = idct_dc(component.multiplier[0], block[0]);
+  } else {
+    Size::transform(lastPosition)(nullptr, component.multiplier.data(), block, rows, column);
+  }
+}
+
+// Transforms the MCU's blocks of one component, but for those beyond the picture's last column and row.
+// Returns the index of the next component's first block.
+template <class Size>
+int transform_component(PELOJ_JDINFO& jd, const Component& component, int block, int mcu, int blockRow) {
+  const int wide = mcu == jd.mcusPerRow - 1 ? component.lastColumnWidth : component.mcuWidth;
+  const int firstRow = jd.imcuRow * component.v + blockRow;
+  for (int y = 0; y < component.mcuHeight; ++y) {
+    if (firstRow + y >= component.blocksHigh) break;
+    uint8_t* const* rows = component.samples.get() + (blockRow + y) * Size::kBlock;
+    for (int x = 0; x < wide; ++x) {
+      const auto b = static_cast<size_t>(block + y * component.mcuWidth + x);
+      transform_block<Size>(component, jd.blocks[b], jd.lastPosition[b], rows,
+                            (mcu * component.mcuWidth + x) * Size::kBlock);
+    }
+  }
+  return block + component.mcuBlocks;
+}
+
+template <class Size>
+void transform_mcu(PELOJ_JDINFO& jd, int mcu, int blockRow) {
+  int block = 0;
+  for (int i = 0; i < jd.scanComponentCount; ++i) {
+    const Component& component = *jd.scan[static_cast<size_t>(i)];
+    block = transform_component<Size>(jd, component, block, mcu, blockRow);
+  }
+}
+
+using DecodeMcu = int (*)(PELOJ_JDINFO*, int32_t* const*);
+
+template <class Size>
+int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
+  const auto used = static_cast<size_t>(jd.mcuBlocks) * 64 * sizeof(int32_t);
+  for (int blockRow = 0; blockRow < jd.mcuRowsPerImcu; ++blockRow) {
+    for (int mcu = 0; mcu < jd.mcusPerRow; ++mcu) {
+      TAVIRPELO_OsMemset(jd.coefficients.data(), 0, used);
+      jd.lastPosition = {};
+      if (!decode(&jd, jd.blocks.data())) {
+        if (jd.usedHeight - jd.rowsDone < 16) return PELOJ_IMAGE_DONE;
+        log_error(failure);
+        return PELOJ_ROW_FAIL;
+      }
+      transform_mcu<Size>(jd, mcu, blockRow);
+    }
+  }
+  if (++jd.imcuRow >= jd.imcuRows) return PELOJ_IMAGE_DONE;
+  PELOJ_SetupiMcu(&jd);
+  return PELOJ_ROW_DONE;
+}
+
+}  // namespace
+}  // namespace pelo::jpeg
+
+using namespace pelo::jpeg;
+
+int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo) {
+  return decode_imcu_row<FullSize>(*jdInfo, jdInfo->requantise ? PELOJ_FastDecodeMcu : PELOJ_DecodeMcu,
+                                   "PELOJ_DecodeSingleiMcu : PELOJ_DecodeMcu fail");
+}
+
+int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo) {
+  if (jdInfo->scale == kHalf) {
+    return decode_imcu_row<HalfSize>(*jdInfo, PELOJ_DecodeMcu_2to1,
+                                     "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_2to1 fail");
+  }
+  if (jdInfo->scale == kThreeEighths) {
+    return decode_imcu_row<ThreeEighthsSize>(*jdInfo, PELOJ_DecodeMcu_8to3,
+                                             "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_8to3 fail");
+  }
+  if (jdInfo->scale == kQuarter) {
+    return decode_imcu_row<QuarterSize>(*jdInfo, PELOJ_DecodeMcu_4to1,
+                                        "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_4to1 fail");
+  }
+  // A progressive picture's first scan is all that an eighth of its size needs.
+  const bool progressive = jdInfo->marker->frameType == FrameType::kProgressive;
+  return decode_imcu_row<EighthSize>(*jdInfo, progressive ? PELOJ_ProgDecodeMcu : PELOJ_DecodeMcu8to1,
+                                     "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu8to1 fail");
+}

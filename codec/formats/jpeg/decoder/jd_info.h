@@ -1,0 +1,190 @@
+// The JPEG decoder's state for one picture: headers, tables, entropy state, sample rows, resampling and
+// the output position. Made by PELOJ_Initialize, emptied by PELOJ_DeleteDecoderInfo.
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+
+#include "codec/base/buffered_source.h"
+#include "codec/base/os_memory.h"
+#include "codec/formats/jpeg/decoder/bit_reader.h"
+#include "codec/formats/jpeg/decoder/huffman.h"
+#include "codec/formats/jpeg/decoder/row_output.h"
+#include "tavirpelo/decinfo.h"
+
+// Results of the row decoders.
+enum { PELOJ_ROW_DONE = 100, PELOJ_IMAGE_DONE = 101, PELOJ_ROW_FAIL = 102 };
+
+namespace pelo::jpeg {
+
+constexpr int kMaxComponents = 3;
+constexpr int kMaxSampling = 4;
+constexpr int kMaxMcuBlocks = 10;  // T.81 B.2.3
+constexpr size_t kTablePoolSize = 120;
+
+enum class ColourSpace : uint8_t { kNone = 0, kGrey = 1, kRgb = 2, kYcc = 3 };
+enum class FrameType : uint8_t { kNone = 0, kBaseline = 1, kProgressive = 2 };
+
+struct OsFreeDelete {
+  void operator()(void* block) const { TAVIRPELO_OsFree(block); }
+};
+// Row pointers and the samples behind them, one allocation (PELOJ_AllocSampleArry).
+using SampleRows = std::unique_ptr<uint8_t*, OsFreeDelete>;
+
+struct QuantTable {
+  std::array<uint16_t, 64> value;       // natural order
+  std::array<int32_t, 64> correction;   // zig-zag order, 8192 = 1.0: stored to reference step
+};
+
+// A component of the frame (T.81 B.2.2), and its layout in the picture.
+struct Component {
+  uint8_t id;
+  uint8_t index;          // in frame order
+  uint8_t h, v;           // sampling factors
+  uint8_t quantTable;
+  uint8_t dcTable, acTable;
+  int blocksWide, blocksHigh;
+  int downsampledWidth, downsampledHeight;  // samples
+  int scaledWidth;        // downsampled width at the decode scale
+  int mcuWidth, mcuHeight, mcuBlocks;       // blocks of one MCU of the current scan
+  int lastColumnWidth, lastRowHeight;       // blocks of the last MCU inside the picture
+  uint8_t hExpand, vExpand;                 // replication to the full grid
+  void (*upsample)(PELOJ_JDINFO*, Component*, uint8_t**, uint8_t***);
+  std::array<int32_t, 64> multiplier;       // dequantisation, natural order
+  SampleRows samples;     // one iMCU row
+  SampleRows colour;      // replicated rows; empty when the samples are used as they are
+  uint8_t* colourRows[kMaxSampling];        // the current row group on the full grid
+};
+
+struct MarkerRecord {
+  int32_t discardedBytes;
+  uint8_t nextRestart;    // n of the RSTn expected next
+  FrameType frameType;
+  uint8_t sawSos, sawDht, sawDqt, sawApp0, sawApp14;
+  uint8_t transform;      // last byte of the last APP14
+  std::array<uint8_t, kMaxComponents> componentIds;
+};
+
+struct EntropyState {
+  uint8_t insufficient;   // zeros were consumed in place of data: MCUs stay flat until a restart
+  BitState bits;
+  std::array<uint32_t, kMaxComponents> lastDc;  // by scan position; unsigned, as hostile sums wrap
+  uint32_t restartsToGo;
+  std::array<const DerivedTable*, 4> dc, ac;
+  std::array<const SkipTable*, 4> skip;
+  std::array<const DerivedTable*, kMaxMcuBlocks> blockDc, blockAc;
+  std::array<const SkipTable*, kMaxMcuBlocks> blockSkip;
+};
+
+// Numerator / 2^shift: 1/1, 1/2, 3/8, 1/4, 1/8.
+struct Scale {
+  int numerator;
+  int shift;
+  constexpr int of(int64_t size) const { return static_cast<int>(size * numerator >> shift); }
+  constexpr int block_size() const { return 8 * numerator >> shift; }  // samples of a block's side
+  constexpr bool operator==(const Scale&) const = default;
+};
+constexpr Scale kFull{1, 0}, kHalf{1, 1}, kThreeEighths{3, 3}, kQuarter{1, 2}, kEighth{1, 3};
+
+// A scan of a progressive picture between visits: its header, and where its decoding stands.
+constexpr size_t kMaxScans = 30;
+struct ScanRecord {
+  int componentCount;
+  std::array<Component*, kMaxComponents> components;
+  int lastComponent;
+  int ss, se, ah, al;
+  int restartInterval;
+  EntropyState entropy;
+  uint32_t sourcePosition;  // next unread byte
+  uint32_t eobRun;
+  uint8_t nextRestart;
+  uint8_t unreadMarker;
+};
+
+// The row of full-grid samples that the converters read.
+struct GridRow {
+  const uint8_t* plane[kMaxComponents];
+};
+
+}  // namespace pelo::jpeg
+
+struct PELOJ_JDINFO {
+  PELOJ_SOURCE* source;
+  TAVIRPELO_DECINFO* decInfo;
+  TAVIRPELO_CHECKFN checkFn;
+  int outFormat;
+  uint32_t rotation;
+  int decMode;
+
+  // Frame and scan headers.
+  int componentCount;
+  int hMax, vMax;
+  pelo::jpeg::ColourSpace colourSpace;
+  int imageWidth, imageHeight;
+  int restartInterval;    // MCUs; 0: none
+  pelo::OsPtr<pelo::jpeg::MarkerRecord> marker;
+  std::array<pelo::OsPtr<pelo::jpeg::QuantTable>, 4> quant;
+  std::array<const pelo::jpeg::HuffmanSpec*, 4> dcRaw, acRaw;
+  // Every DHT definition keeps its slot: derived tables of earlier scans point into it.
+  std::array<pelo::OsPtr<pelo::jpeg::HuffmanSpec>, pelo::jpeg::kTablePoolSize> rawPool;
+  size_t rawCount;
+  std::array<pelo::OsPtr<pelo::jpeg::DerivedTable>, pelo::jpeg::kTablePoolSize> derivedPool;
+  size_t derivedCount;
+  std::array<pelo::OsPtr<pelo::jpeg::SkipTable>, 4> skipTables;
+  pelo::OsPtr<std::array<pelo::jpeg::Component, pelo::jpeg::kMaxComponents>> components;
+  int scanComponentCount;
+  std::array<pelo::jpeg::Component*, pelo::jpeg::kMaxComponents> scan;
+  int lastScanComponent;  // frame index
+  int ss, se, ah, al;
+
+  // Entropy decoding.
+  pelo::OsPtr<pelo::jpeg::EntropyState> entropy;
+  uint8_t unreadMarker;   // second byte of a marker met in the data; 0: none
+  int mcuBlocks;
+  std::array<uint8_t, pelo::jpeg::kMaxMcuBlocks> blockComponent;  // scan position
+  std::array<uint8_t, pelo::jpeg::kMaxMcuBlocks> lastPosition;    // zig-zag, last non-zero coefficient
+  pelo::OsBuffer<int32_t> coefficients;                           // one MCU
+  std::array<int32_t*, pelo::jpeg::kMaxMcuBlocks> blocks;
+  int requantise;         // AC coefficients are brought to the reference steps while decoding
+
+  // Progressive pictures.
+  std::array<pelo::OsPtr<pelo::jpeg::ScanRecord>, pelo::jpeg::kMaxScans> scans;
+  size_t scanCount;
+  uint32_t eobRun;        // blocks that an end-of-band code still covers (T.81 G.1.2.2)
+  std::array<pelo::OsBuffer<int32_t>, pelo::jpeg::kMaxComponents> rowCoefficients;  // one iMCU row
+
+  // Progress.
+  int mcusPerRow;         // of the current scan
+  int mcuRowsPerImcu;     // rows of MCUs in the current iMCU row
+  int imcuRows;           // in the picture
+  int imcuRow;            // decoded
+  int bufferFull;         // an iMCU row waits to be shown
+  int lastImcuDecoded;
+  int rowGroup;           // of that iMCU row, next to be replicated
+  int readPosition;       // rows of the current row group already converted
+  int rowsDone;           // full-grid rows handed to the converter, or skipped
+  int skipping;           // rows above the wanted region: no conversion
+
+  // Sizes.
+  int bufferWidth, bufferHeight;
+  int outWidth, outHeight;
+  pelo::jpeg::Scale scale;
+  int exact;              // the scaled picture has the output size
+  int scaledWidth, scaledHeight;
+  int usedWidth, usedHeight;
+  int cropX, cropY;
+  int targetWidth, targetHeight;
+
+  // Conversion and output.
+  void (*convert)(PELOJ_JDINFO*, int);
+  int continueFlag;       // the input row must still yield more output rows
+  int inputRow;
+  pelo::OsBuffer<uint32_t> accumulator;   // one output row of packed sums
+  pelo::OsBuffer<uint16_t> columns;       // sample columns of each output column
+  pelo::jpeg::RowOutput output;
+};
+
+// Frees what the state owns and clears it; a second call does nothing.
+TAVIRPELO_API void PELOJ_DeleteDecoderInfo(PELOJ_JDINFO* jdInfo);

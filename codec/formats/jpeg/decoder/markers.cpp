@@ -1,0 +1,232 @@
+#include "codec/formats/jpeg/decoder/markers.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "codec/base/byte_order.h"
+#include "codec/formats/jpeg/header_scan.h"
+#include "codec/formats/jpeg/marker_codes.h"
+
+using namespace pelo;
+using namespace pelo::jpeg;
+
+namespace {
+
+using enum Marker;
+
+// Consumes n bytes into `bytes`; false when the source ends first.
+bool read(PELOJ_SOURCE& source, void* bytes, uint32_t n) {
+  if (!source_need(source, n)) return false;
+  std::memcpy(bytes, source_take(source, n), n);
+  return true;
+}
+
+// SOF0, SOF2 (T.81 B.2.2).
+bool read_frame(PELOJ_JDINFO& jd, Marker code) {
+  MarkerRecord& marker = *jd.marker;
+  uint8_t head[8];
+  if (marker.frameType != FrameType::kNone || !read(*jd.source, head, 8)) return false;
+  jd.imageHeight = load_be16(head + 3);
+  jd.imageWidth = load_be16(head + 5);
+  const int count = head[7];
+  if (head[2] != 8 || jd.imageHeight > kMaxSide || jd.imageWidth > kMaxSide) return false;
+  if (count > kMaxComponents || load_be16(head) != 8 + 3 * count) return false;
+
+  jd.components = os_new<std::array<Component, kMaxComponents>>();
+  if (!jd.components) return false;
+  jd.componentCount = count;
+  for (int i = 0; i < count; ++i) {
+    uint8_t bytes[3];
+    if (!read(*jd.source, bytes, 3)) return false;
+    Component& component = (*jd.components)[static_cast<size_t>(i)];
+    component.index = static_cast<uint8_t>(i);
+    component.id = bytes[0];
+    component.h = bytes[1] >> 4;
+    component.v = bytes[1] & 15;
+    component.quantTable = bytes[2];
+    if (component.h < 1 || component.h > kMaxSampling || component.v < 1 || component.v > kMaxSampling) {
+      return false;
+    }
+    marker.componentIds[static_cast<size_t>(i)] = component.id;
+    jd.hMax = std::max<int>(jd.hMax, component.h);
+    jd.vMax = std::max<int>(jd.vMax, component.v);
+  }
+  marker.frameType = code == kSof0 ? FrameType::kBaseline : FrameType::kProgressive;
+  return true;
+}
+
+// DHT (T.81 B.2.4.2): every definition takes a slot of its own.
+bool read_huffman_tables(PELOJ_JDINFO& jd) {
+  uint32_t left;
+  jd.marker->sawDht = 1;
+  if (!segment_length(*jd.source, left)) return false;
+  while (left > 0) {
+    uint8_t head[17];
+    if (left < 17 || jd.rawCount >= kTablePoolSize || !read(*jd.source, head, 17)) return false;
+    const bool isAc = (head[0] & 0x10) != 0;
+    const uint8_t number = isAc ? head[0] - 0x10 : head[0];
+    if (number > 3) return false;
+
+    auto table = os_new<HuffmanSpec>();
+    if (!table) return false;
+    uint32_t total = 0;
+    for (size_t i = 1; i <= 16; ++i) total += table->counts[i] = head[i];
+    left -= 17;
+    if (total > 256 || total > left || !read(*jd.source, table->symbols.data(), total)) return false;
+    left -= total;
+    (isAc ? jd.acRaw : jd.dcRaw)[number] = table.get();
+    jd.rawPool[jd.rawCount++] = std::move(table);
+  }
+  return true;
+}
+
+// DQT (T.81 B.2.4.1), 8-bit tables.
+bool read_quant_tables(PELOJ_JDINFO& jd) {
+  uint32_t left;
+  if (!segment_length(*jd.source, left)) return false;
+  while (left > 0) {
+    uint8_t bytes[65];
+    if (left < 65 || !read(*jd.source, bytes, 65) || bytes[0] > 3) return false;
+    auto table = os_new<QuantTable>();
+    if (!table) return false;
+    for (size_t i = 0; i < 64; ++i) table->value[PELOJ_NATURAL_ORDER[i]] = bytes[1 + i];
+    jd.quant[bytes[0]] = std::move(table);
+    left -= 65;
+  }
+  jd.marker->sawDqt = 1;
+  return true;
+}
+
+bool read_restart_interval(PELOJ_JDINFO& jd) {
+  uint8_t bytes[4];
+  if (!read(*jd.source, bytes, 4) || load_be16(bytes) != 4) return false;
+  jd.restartInterval = load_be16(bytes + 2);
+  return true;
+}
+
+// APPn, COM, DNL: skipped, but for what an APP14 ends with.
+bool read_application(PELOJ_JDINFO& jd, Marker code) {
+  uint32_t left;
+  if (!segment_length(*jd.source, left)) return false;
+  if (code == kApp0) jd.marker->sawApp0 = 1;
+  if (code != kApp14) return source_skip(*jd.source, left);
+  jd.marker->sawApp14 = 1;
+  if (left == 0) return true;
+  return source_skip(*jd.source, left - 1) && read(*jd.source, &jd.marker->transform, 1);
+}
+
+Component* find_component(PELOJ_JDINFO& jd, uint8_t id) {
+  for (int i = 0; i < jd.componentCount; ++i) {
+    Component& component = (*jd.components)[static_cast<size_t>(i)];
+    if (component.id == id) return &component;
+  }
+  return nullptr;
+}
+
+// A progressive scan's band must stay inside a block (T.81 G.1.1.1.1).
+bool valid_band(const PELOJ_JDINFO& jd) {
+  if (jd.ss > jd.se || jd.se > 63 || jd.ah > 13 || jd.al > 13) return false;
+  return jd.ss == 0 ? jd.se == 0 : jd.scanComponentCount == 1;
+}
+
+// SOS (T.81 B.2.3).
+bool read_scan(PELOJ_JDINFO& jd) {
+  uint8_t head[3];
+  if (jd.marker->frameType == FrameType::kNone || !read(*jd.source, head, 3)) return false;
+  const int count = head[2];
+  if (count < 1 || count > kMaxComponents || load_be16(head) != 6 + 2 * count) return false;
+  jd.scanComponentCount = count;
+  for (int i = 0; i < count; ++i) {
+    uint8_t bytes[2];
+    if (!read(*jd.source, bytes, 2)) return false;
+    Component* component = find_component(jd, bytes[0]);
+    const auto begin = jd.scan.begin();
+    // A component twice in a scan would be decoded twice and leave another undecoded.
+    if (component == nullptr || std::find(begin, begin + i, component) != begin + i) return false;
+    component->dcTable = bytes[1] >> 4;
+    component->acTable = bytes[1] & 15;
+    jd.scan[static_cast<size_t>(i)] = component;
+    jd.lastScanComponent = component->index;
+  }
+  uint8_t band[3];
+  if (!read(*jd.source, band, 3)) return false;
+  jd.ss = band[0];
+  jd.se = band[1];
+  jd.ah = band[2] >> 4;
+  jd.al = band[2] & 15;
+  if (jd.marker->frameType == FrameType::kBaseline) {
+    jd.ss = jd.ah = jd.al = 0;
+    jd.se = 63;
+  } else if (!valid_band(jd)) {
+    return false;
+  }
+  jd.marker->sawSos = 1;
+  return true;
+}
+
+// One segment by its code; codes that are not listed are passed over, scanning goes on behind them.
+bool read_segment(PELOJ_JDINFO& jd, Marker code) {
+  switch (code) {
+    case kSof0:
+    case kSof2: return read_frame(jd, code);
+    case kDht: return read_huffman_tables(jd);
+    case kDqt: return read_quant_tables(jd);
+    case kDri: return read_restart_interval(jd);
+    case kSos: return read_scan(jd);
+    case kDnl:
+    case kCom: return read_application(jd, code);
+    default: return code < kApp0 || code > kApp15 || read_application(jd, code);
+  }
+}
+
+// From the component count, the application segments and the identifiers (JFIF; T.872 for APP14).
+ColourSpace colour_space(const PELOJ_JDINFO& jd) {
+  const MarkerRecord& marker = *jd.marker;
+  if (jd.componentCount == 1) return ColourSpace::kGrey;
+  if (jd.componentCount != 3) return ColourSpace::kNone;
+  if (marker.sawApp0) return ColourSpace::kYcc;
+  if (marker.sawApp14) {
+    if (marker.transform > 1) return ColourSpace::kNone;
+    return marker.transform == 0 ? ColourSpace::kRgb : ColourSpace::kYcc;
+  }
+  using Ids = std::array<uint8_t, kMaxComponents>;
+  if (marker.componentIds == Ids{0, 1, 2} || marker.componentIds == Ids{1, 2, 3}) return ColourSpace::kYcc;
+  return marker.componentIds == Ids{'R', 'G', 'B'} ? ColourSpace::kRgb : ColourSpace::kNone;
+}
+
+bool parse_header(PELOJ_JDINFO& jd) {
+  jd.marker = os_new<MarkerRecord>();
+  if (!jd.marker) return false;
+  jd.marker->transform = 1;
+  int status = PELOJ_FAIL;
+  if (!find_soi(*jd.source) || PELOJ_ParseNextMarker(&jd, &status) == static_cast<int>(kEoi) || status != PELOJ_OK) {
+    return false;
+  }
+  jd.colourSpace = colour_space(jd);
+  const MarkerRecord& marker = *jd.marker;
+  return jd.colourSpace != ColourSpace::kNone && marker.sawDht && marker.sawDqt && marker.sawSos;
+}
+
+}  // namespace
+
+int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status) {
+  *status = PELOJ_FAIL;
+  uint8_t code = 0;
+  while (next_marker(*jdInfo->source, code)) {
+    // Behind a scan, EOI ends the picture; what follows is another file's.
+    const auto marker = static_cast<Marker>(code);
+    if (marker == kEoi && jdInfo->marker->sawSos) return code;
+    if (!read_segment(*jdInfo, marker)) return code;
+    if (marker == kSos) {
+      *status = PELOJ_OK;
+      return code;
+    }
+  }
+  return code;
+}
+
+int PELOJ_ParseHeader(PELOJ_JDINFO* jdInfo, int) {
+  if (parse_header(*jdInfo)) return PELOJ_OK;
+  PELOJ_DeleteDecoderInfo(jdInfo);
+  return PELOJ_FAIL;
+}

@@ -1,0 +1,42 @@
+// Turning a decoded buffer in place.
+#include <cstring>
+
+#include "codec/base/os_memory.h"
+#include "codec/pixel/packers.h"
+#include "tavirpelo/decode.h"
+
+namespace {
+
+// Source pixel (c, r) goes to column height - 1 - r of row c, or for the other way to column r of row
+// width - 1 - c, of a picture height pixels wide.
+int rotate(void* buffer, int width, int height, int outFormat, bool clockwise) {
+  const bool known = outFormat == TAVIRPELO_RGB565 || outFormat == TAVIRPELO_RGB888 ||
+                     outFormat == TAVIRPELO_RGB565_DITHER;
+  if (!known || buffer == nullptr || width < 1 || height < 1) return 0;
+  const auto size = static_cast<size_t>(pelo::bytes_per_pixel(outFormat));
+  const auto w = static_cast<size_t>(width);
+  const auto h = static_cast<size_t>(height);
+  const auto pixels = pelo::checked_mul(w, h);
+  const auto bytes = pixels ? pelo::checked_mul(*pixels, size) : std::nullopt;
+  pelo::OsBuffer<uint8_t> turned;
+  if (!bytes || !turned.allocate(*bytes)) return 0;
+  const auto* in = static_cast<const uint8_t*>(buffer);
+  for (size_t r = 0; r < h; ++r) {
+    for (size_t c = 0; c < w; ++c, in += size) {
+      const size_t to = clockwise ? c * h + (h - 1 - r) : (w - 1 - c) * h + r;
+      std::memcpy(turned.data() + to * size, in, size);
+    }
+  }
+  std::memcpy(buffer, turned.data(), *bytes);
+  return 1;
+}
+
+}  // namespace
+
+int PELOJ_RotateImage90(void* buffer, int width, int height, int outFormat) {
+  return rotate(buffer, width, height, outFormat, true);
+}
+
+int PELOJ_RotateImage270(void* buffer, int width, int height, int outFormat) {
+  return rotate(buffer, width, height, outFormat, false);
+}

@@ -1,0 +1,102 @@
+#include "codec/formats/jpeg/decoder/row_process.h"
+
+#include "codec/formats/jpeg/decoder/imcu_row.h"
+#include "codec/formats/jpeg/decoder/progressive.h"
+#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/header_scan.h"
+#include "platform/android_log.h"
+
+namespace pelo::jpeg {
+namespace {
+
+// One row function: how it decodes, and what it says.
+struct RowDecoder {
+  int (*decodeRow)(PELOJ_JDINFO*);
+  const char* aborted;
+  const char* failed;
+};
+
+// Decodes the next iMCU row into the sample rows. Returns its status, 201 for a failure.
+int fill_sample_rows(PELOJ_JDINFO& jd, const RowDecoder& function) {
+  if (jd.checkFn != nullptr && jd.checkFn(jd.decInfo, jd.output.emitted, jd.rowsDone) == 0) {
+    log_error(function.aborted);
+    return PELOJ_FAIL;
+  }
+  const int before = jd.imcuRow;
+  const int status = function.decodeRow(&jd);
+  if (status == PELOJ_ROW_FAIL) {
+    log_error(function.failed);
+    return PELOJ_FAIL;
+  }
+  jd.lastImcuDecoded = status == PELOJ_IMAGE_DONE;
+  jd.bufferFull = jd.imcuRow != before;
+  jd.rowGroup = 0;
+  return status;
+}
+
+int process(PELOJ_JDINFO& jd, const RowDecoder& function, int* rowCounter, int rowsWanted) {
+  int status = 0;
+  if (!jd.bufferFull) {
+    status = fill_sample_rows(jd, function);
+    if (status == PELOJ_FAIL || !jd.bufferFull) return status;
+  }
+  (jd.skipping ? PELOJ_SkipRowUpsample : PELOJ_SetupUpsample)(&jd, rowCounter, rowsWanted);
+  if (jd.rowGroup < jd.scale.block_size()) return 0;
+  jd.bufferFull = 0;
+  return jd.lastImcuDecoded ? PELOJ_IMAGE_DONE : 0;
+}
+
+}  // namespace
+
+RowFunction row_function(const PELOJ_JDINFO& jd) {
+  const bool full = jd.scale == kFull;
+  if (needs_all_scans(jd)) {
+    return full ? PELOJ_ProgProcessData : PELOJ_ProgProcessData_resize;
+  }
+  return full ? PELOJ_ProcessData : PELOJ_ProcessData_resize;
+}
+
+int show_rows(PELOJ_JDINFO& jd) {
+  const RowFunction process = row_function(jd);
+  while (jd.rowsDone < jd.usedHeight && jd.output.emitted < jd.output.bandEnd) {
+    int rows = 0;
+    const int status = process(&jd, &rows, 1);
+    jd.rowsDone += rows;
+    if (status == PELOJ_FAIL || status == PELOJ_IMAGE_DONE) return status;
+    if (rows == 0) break;
+  }
+  return jd.rowsDone < jd.usedHeight && jd.output.emitted < jd.output.limit ? 0 : PELOJ_IMAGE_DONE;
+}
+
+}  // namespace pelo::jpeg
+
+using namespace pelo::jpeg;
+
+int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+  return process(*jdInfo,
+                 {PELOJ_DecodeSingleiMcu, "PELOJ_ProcessData : pJDInfo->CheckFn fail",
+                  "PELOJ_ProcessData : PELOJ_DecodeSingleiMcu fail"},
+                 rowCounter, rowsWanted);
+}
+
+int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+  return process(*jdInfo,
+                 {PELOJ_DecodeSingleiMcu_resize, "PELOJ_ProcessData_resize : pJDInfo->CheckFn fail",
+                  "PELOJ_ProcessData_resize : PELOJ_DecodeSingleiMcu_resize fail"},
+                 rowCounter, rowsWanted);
+}
+
+int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+  return process(*jdInfo,
+                 {PELOJ_ProgDecodeSingleiMcu, "PELOJ_ProgProcessData : pJDInfo->CheckFn fail",
+                  "PELOJ_ProgCompleteProcessData : PELOJ_ProgIDct fail"},
+                 rowCounter, rowsWanted);
+}
+
+int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+  return process(*jdInfo,
+                 {PELOJ_ProgDecodeSingleiMcu,
+                  "PELOJ_ProgCompleteProcessData_resize : pJDInfo->CheckFn fail",
+                  "PELOJ_ProgCompleteProcessData_resize : PELOJ_ProgIDct fail"},
+                 rowCounter, rowsWanted);
+}

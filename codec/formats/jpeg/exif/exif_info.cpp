@@ -1,0 +1,117 @@
+// The EXIF information object: made from a file, a buffer, an open source or a segment; and its end.
+#include <memory>
+
+#include "codec/base/byte_order.h"
+#include "codec/formats/jpeg/exif/exif_reader.h"
+#include "codec/formats/jpeg/header_scan.h"
+#include "codec/formats/jpeg/marker_codes.h"
+#include "platform/android_log.h"
+
+using namespace pelo;
+using namespace pelo::jpeg;
+
+namespace {
+
+struct DestroyExif {
+  void operator()(TAVIRPELO_EXIFINFO* info) const { PELOJ_DestroyExifInfo(info); }
+};
+using ExifInfo = std::unique_ptr<TAVIRPELO_EXIFINFO, DestroyExif>;
+
+ExifInfo new_exif_info() {
+  return ExifInfo(os_new<TAVIRPELO_EXIFINFO>().release());
+}
+
+TAVIRPELO_EXIFINFO* fail(const char* text) {
+  log_error(text);
+  return nullptr;
+}
+
+TAVIRPELO_EXIFINFO* create_from(int ioType, void* source, int size) {
+  TAVIRPELO_DECINFO* decInfo = TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_RGB565, 0);
+  if (decInfo == nullptr) return nullptr;
+  TAVIRPELO_EXIFINFO* info = PELOJ_CreatExifInfo(decInfo);
+  TAVIRPELO_DestroyDecInfo(decInfo);
+  return info;
+}
+
+void destroy_gps(TAVIRPELO_GPSINFO* gps) {
+  if (gps == nullptr) return;
+  TAVIRPELO_OsFree(gps->mapDatum);
+  TAVIRPELO_OsFree(gps->processingMethod);
+  TAVIRPELO_OsFree(gps);
+}
+
+// Bytes of the TIFF data behind the ten of marker, length and identifier; 0 when they do not fit.
+uint32_t segment_tiff_size(const uint8_t* segment, uint32_t size) {
+  constexpr uint32_t kHead = 4 + kExifIdentifierSize;
+  if (size < kHead || segment[0] != 0xFF || segment[1] != static_cast<uint8_t>(Marker::kApp1)) return 0;
+  const uint32_t end = 2 + uint32_t{load_be16(segment + 2)};  // the length counts itself
+  if (end < kHead || end > size || !is_exif_identifier(segment + 4)) return 0;
+  return end - kHead;
+}
+
+}  // namespace
+
+TAVIRPELO_EXIFINFO* PELOJ_CreatExifInfo(TAVIRPELO_DECINFO* decInfo) {
+  if (decInfo == nullptr) return nullptr;
+  ExifInfo info = new_exif_info();
+  if (!info) return fail("PELOJ_CreatExifInfo : TAVIRPELO_EXIFINFO is null");
+  BufferedSource cursor;
+  if (!cursor.open(decInfo->pIO)) return fail("PELOJ_CreatExifInfo : malloc fail");
+  if (TAVIRPELO_Seek_IO(decInfo->pIO, 0, SEEK_SET) < 0) {
+    return fail("PELOJ_CreatExifInfo : seek fail");
+  }
+  if (PELOJ_GetExifInfo(cursor.get(), info.get()) != PELOJ_OK) {
+    return fail("PELOJ_CreatExifInfo : PELOJ_GetExifInfo fail");
+  }
+  return info.release();
+}
+
+TAVIRPELO_EXIFINFO* PELOJ_CreatExifInfoUseExifBuffer(const uint8_t* segment, int size) {
+  if (segment == nullptr || size < 0) return nullptr;
+  const uint32_t length = segment_tiff_size(segment, static_cast<uint32_t>(size));
+  ExifInfo info = length == 0 ? nullptr : new_exif_info();
+  if (!info) return nullptr;
+  constexpr uint32_t kTiff = 4 + kExifIdentifierSize;
+  return PELOJ_ReadExifInfo(segment + kTiff, kTiff, length, info.get()) == PELOJ_OK ? info.release()
+                                                                                    : nullptr;
+}
+
+int PELOJ_DestroyExifInfo(TAVIRPELO_EXIFINFO* info) {
+  if (info == nullptr) {
+    log_error("PELOJ_DestroyExifInfo : TAVIRPELO_EXIFINFO is null");
+    return 0;
+  }
+  for (char* text : {info->make, info->model, info->software, info->rights, info->captureTime,
+                     info->digitizingTime}) {
+    TAVIRPELO_OsFree(text);
+  }
+  TAVIRPELO_OsFree(info->exifVersion);
+  destroy_gps(info->gps);
+  TAVIRPELO_OsFree(info);
+  return 1;
+}
+
+TAVIRPELO_EXIFINFO* elo_create_jpeg_exifinfo_from_file(const char* path) {
+  return create_from(TAVIRPELO_IO_FILE, const_cast<char*>(path), 0);
+}
+
+TAVIRPELO_EXIFINFO* elo_create_jpeg_exifinfo_from_buffer(const void* buffer, int size) {
+  return create_from(TAVIRPELO_IO_MEMORY, const_cast<void*>(buffer), size);
+}
+
+int elo_destory_jpeg_exifinfo(TAVIRPELO_EXIFINFO* info) {
+  return PELOJ_DestroyExifInfo(info);
+}
+
+TAVIRPELO_EXIFINFO* TAVIRPELO_CreateJpegExifInfoFromFile(const char* path) {
+  return path == nullptr ? nullptr : elo_create_jpeg_exifinfo_from_file(path);
+}
+
+TAVIRPELO_EXIFINFO* TAVIRPELO_CreateJpegExifInfoFromBuffer(const void* buffer, int size) {
+  return buffer == nullptr || size == 0 ? nullptr : elo_create_jpeg_exifinfo_from_buffer(buffer, size);
+}
+
+int TAVIRPELO_DestroyJpegExifInfo(TAVIRPELO_EXIFINFO* info) {
+  return info == nullptr ? 0 : elo_destory_jpeg_exifinfo(info);
+}

@@ -1,0 +1,83 @@
+// The way to the EXIF data: the APP1 segment among a JPEG's markers, and the TIFF header inside it.
+#include <algorithm>
+#include <cstring>
+
+#include "codec/formats/jpeg/exif/exif_reader.h"
+#include "codec/formats/jpeg/header_scan.h"
+#include "codec/formats/jpeg/marker_codes.h"
+
+using namespace pelo;
+using namespace pelo::jpeg;
+
+namespace {
+
+// Reads n bytes, more than the reader's window if need be.
+bool read(PELOJ_SOURCE& source, uint8_t* bytes, uint32_t n) {
+  while (n > 0) {
+    if (!source_need(source, 1)) return false;
+    const uint32_t part = std::min(n, source.avail);
+    std::memcpy(bytes, source_take(source, part), part);
+    bytes += part;
+    n -= part;
+  }
+  return true;
+}
+
+// True with the cursor at the TIFF header when the segment that `remaining` bytes are left of is EXIF;
+// `remaining` then counts from there. Otherwise the segment has been passed; `lost` when that failed.
+bool enter_exif(PELOJ_SOURCE& cursor, uint32_t& remaining, bool& lost) {
+  const int64_t end = int64_t{source_offset(cursor)} + remaining;
+  if (remaining >= kExifIdentifierSize && end <= cursor.size &&
+      source_need(cursor, kExifIdentifierSize)) {
+    const bool found = is_exif_identifier(source_take(cursor, kExifIdentifierSize));
+    remaining -= kExifIdentifierSize;
+    if (found) return true;
+  }
+  lost = !source_skip(cursor, remaining);
+  return false;
+}
+
+// Finds the EXIF segment; false when a length makes no sense or the source ends.
+bool find_exif(PELOJ_SOURCE& cursor, uint32_t& remaining) {
+  bool lost = false;
+  uint8_t code;
+  while (!lost && next_marker(cursor, code)) {
+    const Marker marker{code};
+    if (marker == Marker::kApp1) {
+      lost = !segment_length(cursor, remaining);
+      if (!lost && enter_exif(cursor, remaining, lost)) return true;
+    } else if (has_segment(marker) || marker == Marker::kSof0 || marker == Marker::kSof2 ||
+               marker == Marker::kSos) {
+      lost = !skip_segment(cursor);
+    }
+  }
+  return false;
+}
+
+}  // namespace
+
+bool pelo::jpeg::is_exif_identifier(const uint8_t* bytes) {
+  return std::memcmp(bytes, "Exif\0", kExifIdentifierSize) == 0;
+}
+
+int PELOJ_GetExifInfo(PELOJ_SOURCE* cursor, TAVIRPELO_EXIFINFO* info) {
+  constexpr uint8_t kStart[] = {0xFF, static_cast<uint8_t>(Marker::kSoi)};
+  uint32_t remaining;
+  if (!source_need(*cursor, 2) || std::memcmp(source_take(*cursor, 2), kStart, 2) != 0)
+    return PELOJ_FAIL;
+  if (!find_exif(*cursor, remaining)) return PELOJ_FAIL;
+  const uint32_t base = source_offset(*cursor);
+  OsBuffer<uint8_t> tiff;
+  if (!tiff.allocate(remaining) || !read(*cursor, tiff.data(), remaining)) return PELOJ_FAIL;
+  return PELOJ_ReadExifInfo(tiff.data(), base, remaining, info);
+}
+
+int PELOJ_ReadExifInfo(const uint8_t* data, uint32_t base, uint32_t size, TAVIRPELO_EXIFINFO* info) {
+  if (size < tiff::kHeaderSize) return PELOJ_FAIL;
+  const auto header = tiff::parse_header(data);
+  if (!header || header->ifd0 >= size) return PELOJ_FAIL;
+  const tiff::Structure tiff{data, size, header->order, base};
+  const uint32_t ifd1 = PELOJ_Read0thIFDInfo(&tiff, header->ifd0, info);
+  if (ifd1 != 0) read_thumbnail_directory(tiff, ifd1, info->thumbnail);
+  return PELOJ_OK;
+}

@@ -1,0 +1,108 @@
+// The three header scans: one walk over the markers up to the first scan, which differ in the segments
+// that are searched for thumbnails.
+#include "codec/formats/jpeg/header_scan.h"
+
+#include <cstddef>
+
+#include "codec/base/byte_order.h"
+#include "codec/formats/jpeg/header_scan_segments.h"
+#include "codec/formats/jpeg/marker_codes.h"
+
+using namespace pelo;
+using namespace pelo::jpeg;
+
+static_assert(sizeof(PELOJ_THUMBNAIL) == 40 && offsetof(PELOJ_THUMBNAIL, length) == 20 &&
+              offsetof(PELOJ_THUMBNAIL, offset) == 32);
+
+namespace {
+
+// Segments that a scan looks into; null: skipped like any other.
+struct ScanPolicy {
+  SegmentReader app0;
+  SegmentReader app1;
+  SegmentReader app13;
+
+  constexpr SegmentReader reader(Marker code) const {
+    switch (code) {
+      case Marker::kApp0:
+        return app0;
+      case Marker::kApp1:
+        return app1;
+      case Marker::kApp13:
+        return app13;
+      default:
+        return nullptr;
+    }
+  }
+};
+constexpr ScanPolicy kEverything{read_jfif, read_exif, read_photoshop};
+constexpr ScanPolicy kExifOnly{nullptr, read_exif, nullptr};
+constexpr ScanPolicy kSizeOnly{nullptr, nullptr, nullptr};
+
+bool valid_side(int side) {
+  return side >= 1 && side <= kMaxSide;
+}
+
+// SOF0, SOF2 (T.81 B.2.2): precision, height, width.
+bool read_frame(PELOJ_SOURCE& source, Marker code, PELOJ_FILEHEADER& result) {
+  constexpr uint32_t kHead = 5;
+  uint32_t remaining;
+  if (!segment_length(source, remaining) || remaining < kHead || !source_need(source, kHead))
+    return false;
+  const uint8_t* head = source_take(source, kHead);
+  const int height = load_be16(head + 1);
+  const int width = load_be16(head + 3);
+  if (head[0] != 8 || !valid_side(height) || !valid_side(width)) return false;
+  result.width = width;
+  result.height = height;
+  if (code == Marker::kSof2) result.progressive = 1;
+  return source_skip(source, remaining - kHead);
+}
+
+bool search_segment(PELOJ_SOURCE& source, SegmentReader reader, ThumbnailSearch& search) {
+  uint32_t remaining;
+  if (!segment_length(source, remaining)) return false;
+  const Segment segment{source, int64_t{source_offset(source)} + remaining};
+  if (segment.end >= source.size) return false;
+  return reader(segment, search) && segment.leave();
+}
+
+int scan(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result, const ScanPolicy& policy) {
+  if (source == nullptr || result == nullptr || (mode != 2 && mode != kScanMode)) return PELOJ_FAIL;
+  if (!find_soi(*source)) return PELOJ_FAIL;
+  ThumbnailSearch search{result->thumbnail};
+  uint8_t code;
+  while (next_marker(*source, code)) {
+    const Marker marker{code};
+    bool passed = true;
+    if (marker == Marker::kSos) return PELOJ_OK;
+    if (marker == Marker::kSof0 || marker == Marker::kSof2) {
+      passed = read_frame(*source, marker, *result);
+    } else if (const SegmentReader reader = policy.reader(marker)) {
+      passed = search_segment(*source, reader, search);
+    } else if (has_segment(marker)) {
+      passed = skip_segment(*source);
+    }
+    if (!passed) return PELOJ_FAIL;
+  }
+  return PELOJ_FAIL;
+}
+
+}  // namespace
+
+bool pelo::jpeg::thumbnail_in_source(const PELOJ_THUMBNAIL& thumbnail, uint32_t sourceSize) {
+  return thumbnail.present != 0 && thumbnail.offset != 0 &&
+         uint64_t{thumbnail.offset} + thumbnail.length < sourceSize;
+}
+
+int PELOJ_ParseFileHeader(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
+  return scan(source, mode, result, kEverything);
+}
+
+int PELOJ_ParseExifThumbnail(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
+  return scan(source, mode, result, kExifOnly);
+}
+
+int PELOJ_SimpleParser(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
+  return scan(source, mode, result, kSizeOnly);
+}

@@ -1,0 +1,173 @@
+#include "codec/formats/jpeg/transform/rotate.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace pelo::jpeg {
+namespace {
+
+constexpr int kFailed = 0, kDone = 1, kMore = 4;
+constexpr int kStep = 16;  // output pixels after which a call in steps returns
+
+// The source's rows go from the last to the first when the operation turns the picture upside down; each
+// becomes a row of the output, or with exchanged directions its next column.
+class Rotation {
+ public:
+  bool start(void* source, int size, Size picture, ELO_DESTINATION* destination,
+             const Operation& operation);
+  int run(bool inSteps);
+  // Completes the output with what there is.
+  bool end();
+
+ private:
+  void take_parameters(int size);
+  bool start_encoder(Size picture, ELO_DESTINATION* destination);
+  bool one_row();
+  int position() const { return operation_->transposes ? columns_.column : encoder_->row; }
+
+  const Operation* operation_ = nullptr;
+  CoefficientSource source_;
+  RowSnapshots snapshots_;
+  TransformParameters parameters_;
+  ELO_ENCODER* encoder_ = nullptr;
+  ColumnEncoder columns_;
+  OsBuffer<CoefficientBlock> row_, turned_;
+  int rowsTaken_ = 0;
+};
+
+bool Rotation::start(void* source, int size, Size picture, ELO_DESTINATION* destination,
+                     const Operation& operation) {
+  operation_ = &operation;
+  if (!source_.open(TAVIRPELO_IO_MEMORY, source, size, picture.width / 8, picture.height / 8))
+    return false;
+  const PELOJ_JDINFO& jd = source_.decoder();
+  if (source_.progressive() || jd.imageWidth != picture.width || jd.imageHeight != picture.height)
+    return false;
+  const size_t blocks = source_.grid().row_blocks();
+  if (!row_.allocate(blocks) || !turned_.allocate(blocks)) return false;
+  take_parameters(size);
+  if (!start_encoder(picture, destination)) return false;
+  return !operation.mirrorsRows || __elo_create_row_info(&source_, &snapshots_);
+}
+
+void Rotation::take_parameters(int size) {
+  __elo_jpeg_adv_set_enc_info_from_dec_info(&source_, &parameters_);
+  parameters_.sourceSize = size;
+  if (!operation_->transposes) return;
+  parameters_.coding.restartPerRow = true;
+  elo_jpeg_transpose_enc_info(&parameters_);
+}
+
+bool Rotation::start_encoder(Size picture, ELO_DESTINATION* destination) {
+  if (operation_->transposes) std::swap(picture.width, picture.height);
+  TAVIRPELO_RAWINFO image{};
+  image.width = static_cast<uint32_t>(picture.width);
+  image.height = static_cast<uint32_t>(picture.height);
+  image.format = TAVIRPELO_YUV420;
+  const TAVIRPELO_ENCOPTION options{100, nullptr, 0};
+  encoder_ = elo_jpeg_enc_mcu_init(&image, destination, &options, &parameters_.coding);
+  if (encoder_ == nullptr) return false;
+  const McuGrid& grid = source_.grid();
+  const Size mcus = operation_->transposes ? Size{grid.down, grid.across} : Size{grid.across, grid.down};
+  if (encoder_->mcusAcross != mcus.width || encoder_->mcusDown != mcus.height) return false;
+  return !operation_->transposes ||
+         __elo_jpeg_enc_col_encoder_init(&columns_, encoder_, parameters_.sourceSize);
+}
+
+// The source's next row, in the order of the operation, transformed and coded.
+bool Rotation::one_row() {
+  const McuGrid& grid = source_.grid();
+  if (operation_->mirrorsRows) {
+    const auto row = static_cast<size_t>(grid.down - 1 - rowsTaken_);
+    if (!__ValorenOrbLoadPartialInfo(&source_.decoder(), &snapshots_[row])) return false;
+  }
+  if (!source_.read_row(row_.data())) return false;
+  for (int mcu = 0; mcu < grid.across; ++mcu) {
+    const int target = operation_->mirrorsColumns ? grid.across - 1 - mcu : mcu;
+    transform_mcu(*operation_, grid, row_.data() + mcu * grid.blocks,
+                  turned_.data() + target * grid.blocks);
+  }
+  ++rowsTaken_;
+  return operation_->transposes ? __elo_jpeg_enc_col_entroy_encoder(&columns_, turned_.data())
+                                : __elo_jpeg_enc_entroy_encoder(encoder_, turned_.data());
+}
+
+int Rotation::run(bool inSteps) {
+  while (rowsTaken_ < source_.grid().down) {
+    if (!one_row()) return kFailed;
+    if (inSteps && position() % kStep == 0 && rowsTaken_ < source_.grid().down) return kMore;
+  }
+  return end() ? kDone : kFailed;
+}
+
+bool Rotation::end() {
+  if (encoder_ == nullptr) return true;
+  const bool joined = __elo_jpeg_enc_col_encoder_finish(&columns_);
+  const bool finished = elo_jpeg_enc_mcu_finish(std::exchange(encoder_, nullptr), nullptr, nullptr);
+  columns_.encoder = nullptr;
+  return joined && finished;
+}
+
+using OwnedRotation = OsPtr<Rotation>;
+
+OwnedRotation begin(void* source, int size, Size picture, ELO_DESTINATION* destination,
+                    const Operation& operation) {
+  OwnedRotation rotation = os_new<Rotation>();
+  if (rotation == nullptr || rotation->start(source, size, picture, destination, operation))
+    return rotation;
+  rotation->end();
+  return nullptr;
+}
+
+int fail(ELO_DESTINATION& destination) {
+  if (destination.kind == ELO_TO_MEMORY) discard(destination);
+  return kFailed;
+}
+
+// Runs a new or a kept turn; the state keeps it when there is more to do.
+int proceed(OwnedRotation rotation, ELO_DESTINATION& destination, ELO_TRANSFORMSTATE* state) {
+  const int result = rotation->run(state != nullptr);
+  if (result == kMore) {
+    *state = {1, 1, rotation.release()};
+    return result;
+  }
+  if (result == kFailed) {
+    rotation->end();
+    return fail(destination);
+  }
+  return result;
+}
+
+}  // namespace
+}  // namespace pelo::jpeg
+
+using namespace pelo;
+using namespace pelo::jpeg;
+
+int elo_rotate_jpeg(void* source, int size, int width, int height, ELO_DESTINATION* destination,
+                    int angle, int flip, ELO_TRANSFORMSTATE* state) {
+  if (angle == 0 && flip == 0) return kDone;
+  const Operation* operation = find_operation(angle, flip != 0);
+  if (destination == nullptr) return kFailed;
+  if (operation == nullptr || source == nullptr) return fail(*destination);
+  if (state != nullptr && state->context != nullptr) {
+    OwnedRotation kept(static_cast<Rotation*>(state->context));
+    *state = {};
+    return proceed(std::move(kept), *destination, state);
+  }
+  OwnedRotation rotation = begin(source, size, {width, height}, destination, *operation);
+  if (rotation == nullptr) return fail(*destination);
+  return proceed(std::move(rotation), *destination, state);
+}
+
+void __elo_jpeg_abort_transform(void* context) {
+  const OwnedRotation rotation(static_cast<Rotation*>(context));
+  if (rotation != nullptr) rotation->end();
+}
+
+int elo_abort_rotate_jpeg(ELO_TRANSFORMSTATE* state) {
+  if (state == nullptr) return 1;
+  __elo_jpeg_abort_transform(state->context);
+  *state = {};
+  return 1;
+}

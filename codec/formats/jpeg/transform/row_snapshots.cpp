@@ -1,0 +1,38 @@
+#include "codec/formats/jpeg/transform/row_snapshots.h"
+
+using namespace pelo::jpeg;
+
+void __ValorenOrbInitPartialInfo(const PELOJ_JDINFO* jdInfo, RowSnapshot* snapshot) {
+  const EntropyState& entropy = *jdInfo->entropy;
+  *snapshot = {entropy.bits,         entropy.lastDc,
+               entropy.restartsToGo, pelo::source_offset(*jdInfo->source),
+               entropy.insufficient, jdInfo->marker->nextRestart,
+               jdInfo->unreadMarker};
+}
+
+int __ValorenOrbLoadPartialInfo(PELOJ_JDINFO* jdInfo, const RowSnapshot* snapshot) {
+  if (!pelo::source_reposition(*jdInfo->source, snapshot->sourcePosition)) return 0;
+  EntropyState& entropy = *jdInfo->entropy;
+  entropy.bits = snapshot->bits;
+  entropy.lastDc = snapshot->lastDc;
+  entropy.restartsToGo = snapshot->restartsToGo;
+  entropy.insufficient = snapshot->insufficient;
+  jdInfo->marker->nextRestart = snapshot->nextRestart;
+  jdInfo->unreadMarker = snapshot->unreadMarker;
+  return 1;
+}
+
+int __elo_create_row_info(CoefficientSource* source, RowSnapshots* snapshots) {
+  PELOJ_JDINFO& jd = source->decoder();
+  const int rows = source->grid().down;
+  if (!snapshots->allocate(static_cast<size_t>(rows))) return 0;
+  for (int row = 0; row < rows; ++row) {
+    if (!jd.checkFn(jd.decInfo, row, row)) {
+      TAVIRPELO_PrintMessage("__ValorenJpgProcessDataSkip : pJDInfo->CheckFn fail");
+      return 0;
+    }
+    __ValorenOrbInitPartialInfo(&jd, &(*snapshots)[static_cast<size_t>(row)]);
+    if (!source->skip_row()) return 0;
+  }
+  return 1;
+}

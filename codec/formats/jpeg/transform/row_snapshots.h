@@ -1,0 +1,32 @@
+// Where each row of MCUs of a baseline scan begins, so that its rows can be decoded from the last to the
+// first: entropy-coded data can only be read forwards.
+#pragma once
+
+#include "codec/formats/jpeg/transform/coefficient_source.h"
+
+namespace pelo::jpeg {
+
+// What decoding a row depends on.
+struct RowSnapshot {
+  BitState bits;
+  std::array<uint32_t, kMaxComponents> lastDc;
+  uint32_t restartsToGo;
+  uint32_t sourcePosition;  // next unread byte
+  uint8_t insufficient;
+  uint8_t nextRestart;
+  uint8_t unreadMarker;
+};
+using RowSnapshots = OsBuffer<RowSnapshot>;
+
+}  // namespace pelo::jpeg
+
+// Reads the whole source once, DC only, and notes where each of its rows begins. False when memory is
+// short, data fail or the progress function refuses.
+TAVIRPELO_API int __elo_create_row_info(pelo::jpeg::CoefficientSource* source,
+                                        pelo::jpeg::RowSnapshots* snapshots);
+
+// Notes, and goes back to, the decoder's place. Load: 0 when the source cannot be moved there.
+TAVIRPELO_API void __ValorenOrbInitPartialInfo(const PELOJ_JDINFO* jdInfo,
+                                               pelo::jpeg::RowSnapshot* snapshot);
+TAVIRPELO_API int __ValorenOrbLoadPartialInfo(PELOJ_JDINFO* jdInfo,
+                                              const pelo::jpeg::RowSnapshot* snapshot);

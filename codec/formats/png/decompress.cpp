@@ -1,0 +1,169 @@
+// The four variants of decompression: plain or interlaced images, from memory or from any other source.
+#include <algorithm>
+#include <cstdio>
+#include <cstring>
+
+#include "codec/base/byte_order.h"
+#include "codec/formats/png/crc32.h"
+#include "codec/formats/png/png_context.h"
+#include "codec/formats/png/unused_helpers.h"
+
+namespace pelo::png {
+namespace {
+
+constexpr uint8_t kEmptyIend[12] = {0, 0, 0, 0, 'I', 'E', 'N', 'D', 0xAE, 0x42, 0x60, 0x82};
+
+// Makes one IDAT chunk, followed by IEND, of all IDAT chunks inside the caller's buffer, so that their
+// data can be read in one run. The room is always there: every chunk given up had twelve bytes around
+// its data.
+bool merge_chunks(PELOI_PNGCONTEXT& context) {
+  PELOI_PNGINFO& info = context.info;
+  uint8_t* const data = info.idat[0].data;
+  const uint8_t* const end = context.reader.base + context.reader.limit;
+  if (info.idatLength + 4 + sizeof kEmptyIend > static_cast<uint64_t>(end - data)) return false;
+  uint8_t* out = data + info.idat[0].length;
+  for (size_t i = 1; i < info.idatCount; ++i) {
+    std::memmove(out, info.idat[i].data, info.idat[i].length);
+    out += info.idat[i].length;
+  }
+  const auto length = static_cast<uint32_t>(info.idatLength);
+  store_be32(data - 8, length);
+  store_be32(out, __PELOI_PngCrc32(data - 4, length + 4));
+  std::memcpy(out + 4, kEmptyIend, sizeof kEmptyIend);
+  info.idat[0].length = length;
+  info.idatCount = 1;
+  return true;
+}
+
+Result open_memory_input(PELOI_PNGCONTEXT& context) {
+  if (context.inputReady) return kDone;
+  if (context.info.idatCount > 1 && !merge_chunks(context)) return kFailed;
+  InflateInput& input = context.inflater.input();
+  input.next = context.info.idat[0].data;
+  input.end = input.next + context.info.idat[0].length;
+  context.inputReady = true;
+  return kDone;
+}
+
+bool refill(void* opaque) {
+  auto* context = static_cast<PELOI_PNGCONTEXT*>(opaque);
+  PELOI_PNGREADBUFFER& reader = context->reader;
+  if (__checkbuffer_util1_multiPELOI_IDAT(context, &reader, context->idatEntry) != 1) return false;
+  InflateInput& input = context->inflater.input();
+  input.next = reader.base + reader.cursor;
+  input.end = input.next + reader.remaining;
+  return true;
+}
+
+// The source may have been moved between calls; bytes already read stay in the reader's window.
+Result open_stream_input(PELOI_PNGCONTEXT& context) {
+  context.reader.consumed = -1;
+  context.inflater.input().refill = refill;
+  context.inflater.input().context = &context;
+  return kDone;
+}
+
+Result result_of(InflateStop stop) {
+  switch (stop) {
+    case InflateStop::kCorrupt:
+      return kCorrupt;
+    case InflateStop::kInputEnded:
+      return kFailed;
+    case InflateStop::kNoMemory:
+      return kNoMemory;
+    default:
+      return kDone;
+  }
+}
+
+// Rows go out before the reason why the decompressor stopped counts, so that a caller gets all that the
+// data hold.
+Result run(PELOI_PNGCONTEXT& context) {
+  Inflater& inflater = context.inflater;
+  for (;;) {
+    if (const Result result = consume(context); result != kDone) return result;
+    const InflateStop stop = context.lastStop;
+    if (stop == InflateStop::kStreamEnd) return kDone;
+    if (const Result result = result_of(stop); result != kDone) return result;
+    if (stop == InflateStop::kBlockEnd && context.iterFlag != 0) {
+      context.lastStop = InflateStop::kWindowFull;
+      return kMore;
+    }
+    context.lastStop = inflater.run();
+  }
+}
+
+Result open_decompression(PELOI_PNGCONTEXT& context) {
+  if (context.inflaterOpen) return kDone;
+  if (!context.inflater.open() || !begin_scanlines(context)) return kNoMemory;
+  context.inflaterOpen = true;
+  return kDone;
+}
+
+// A much smaller output than image was once smoothed here.
+void smooth_output(PELOI_PNGCONTEXT& context) {
+  const uint32_t side = std::max(context.fullWidth, context.fullHeight);
+  const uint32_t outSide = std::max(context.output.width, context.output.height);
+  if (outSide != 0 && side / outSide > 3) {
+    __PELOI_NearestInterpolateOutput(&context, nullptr, context.output.width, context.output.height);
+  }
+}
+
+using OpenInput = Result (*)(PELOI_PNGCONTEXT&);
+
+int inflate_image(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInput) {
+  Result result = open_decompression(context);
+  if (result == kDone) result = openInput(context);
+  if (result == kDone) result = run(context);
+  *total = static_cast<uint32_t>(context.inflater.total());
+  if (result == kDone) smooth_output(context);
+  return result;
+}
+
+int inflate_interlaced(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInput) {
+  const int result = inflate_image(context, total, openInput);
+  if (result == kDone && context.output.wholeImage) __PELOI_WriteOutputDataFromINTBuffer(&context);
+  return result;
+}
+
+}  // namespace
+}  // namespace pelo::png
+
+using namespace pelo::png;
+
+int __checkbuffer_util1_multiPELOI_IDAT(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer,
+                                        uint32_t entryIndex) {
+  PELOI_PNGINFO& info = context->info;
+  while (entryIndex < info.idatCount && info.idat[entryIndex].length == 0) ++entryIndex;
+  context->idatEntry = entryIndex;
+  if (entryIndex >= info.idatCount) return 0;
+  IdatEntry& entry = info.idat[entryIndex];
+  if (buffer->consumed != entry.offset) {
+    const auto offset = pelo::checked_int(entry.offset);
+    if (!offset || TAVIRPELO_Seek_IO(buffer->source, *offset, SEEK_SET) != *offset) return 0;
+  }
+  const uint32_t wanted = std::min(entry.length, kReadWindow);
+  const int count = TAVIRPELO_Read_IO(buffer->source, buffer->base, static_cast<int>(wanted));
+  if (count <= 0 || static_cast<uint32_t>(count) > wanted) return 0;
+  const auto read = static_cast<uint32_t>(count);
+  buffer->bufferPosition = entry.offset;
+  entry.offset += read;
+  entry.length -= read;
+  buffer->consumed = entry.offset;
+  buffer->cursor = 0;
+  buffer->remaining = read;
+  return 1;
+}
+
+int _PELOI_PngInflateZStreamData(PELOI_PNGCONTEXT* context, uint32_t* total) {
+  return inflate_image(*context, total, open_memory_input);
+}
+int _PELOI_PngInflateZStreamData_streamming(PELOI_PNGCONTEXT* context, uint32_t* total) {
+  return inflate_image(*context, total, open_stream_input);
+}
+int _PELOI_PngInflateZStreamDataInterlaced(PELOI_PNGCONTEXT* context, uint32_t* total) {
+  return inflate_interlaced(*context, total, open_memory_input);
+}
+int _PELOI_PngInflateZStreamDataInterlaced_streamming(PELOI_PNGCONTEXT* context, uint32_t* total) {
+  return inflate_interlaced(*context, total, open_stream_input);
+}

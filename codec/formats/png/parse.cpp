@@ -1,0 +1,225 @@
+// The chunk loop of a PNG stream (ISO/IEC 15948): every chunk's checksum is verified before it is used.
+#include <algorithm>
+#include <cstring>
+
+#include "codec/base/byte_order.h"
+#include "codec/formats/png/crc32.h"
+#include "codec/formats/png/png_info.h"
+
+namespace pelo::png {
+namespace {
+
+constexpr uint8_t kSignature[8] = {137, 'P', 'N', 'G', 13, 10, 26, 10};
+constexpr uint32_t kIhdr = 0x49484452, kPlte = 0x504C5445, kIdat = 0x49444154, kIend = 0x49454E44,
+                   kTrns = 0x74524E53;
+constexpr uint32_t kCrcBytes = 4;
+
+struct Chunk {
+  uint32_t length;
+  uint32_t type;
+  int64_t data;  // stream position
+};
+
+// Runs over type and data and compares with the stored checksum; leaves the reader behind it.
+int verify(PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
+  uint8_t type[4];
+  store_be16(type, chunk.type >> 16);
+  store_be16(type + 2, chunk.type);
+  uint32_t crc = crc32_update(kCrcPreset, type, sizeof type);
+  for (uint32_t left = chunk.length; left != 0;) {
+    if (!need(buffer, 1)) return kFailed;
+    const uint32_t part = std::min(left, buffer.remaining);
+    crc = crc32_update(crc, take(buffer, part), part);
+    left -= part;
+  }
+  if (!need(buffer, kCrcBytes)) return kFailed;
+  return load_be32(take(buffer, kCrcBytes)) == ~crc ? kDone : kCorrupt;
+}
+
+int channels(uint8_t colourType) {
+  switch (colourType) {
+    case kGreyAlpha:
+      return 2;
+    case kTruecolour:
+      return 3;
+    case kTruecolourAlpha:
+      return 4;
+    default:
+      return 1;
+  }
+}
+
+bool accepted_depth(uint8_t colourType, uint8_t depth) {
+  const bool power = depth == 1 || depth == 2 || depth == 4 || depth == 8 || depth == 16;
+  switch (colourType) {
+    case kGrey:
+      return power;
+    case kPalette:
+      return power && depth <= 8;
+    case kTruecolour:
+    case kGreyAlpha:
+    case kTruecolourAlpha:
+      return depth == 8 || depth == 16;
+    default:
+      return false;
+  }
+}
+
+// Sides and combinations of depth and type (table 11.1). Sides are 31 bits by the standard.
+bool accepted(const PELOI_PNGINFO& info) {
+  constexpr uint32_t kMaxSide = 0x7FFFFFFF;
+  return info.width != 0 && info.height != 0 && info.width <= kMaxSide && info.height <= kMaxSide &&
+         accepted_depth(info.colourType, info.bitDepth);
+}
+
+int parse_ihdr(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
+  if (length != 13 || !need(buffer, length)) return kFailed;
+  const uint8_t* p = take(buffer, length);
+  info.width = __PELOI_PngGetUINT32(p);
+  info.height = __PELOI_PngGetUINT32(p + 4);
+  info.bitDepth = p[8];
+  info.colourType = p[9];
+  const uint8_t compression = p[10], filter = p[11];
+  info.interlace = p[12];
+  if (compression != 0 || filter != 0 || info.interlace > 1) return kFailed;
+  info.hasAlpha = (info.colourType & 4) != 0;
+  if (!accepted(info)) return kFailed;
+  const int planes = channels(info.colourType);
+  info.bitsPerPixel = static_cast<uint8_t>(info.bitDepth * planes);
+  info.bytesPerPixel = static_cast<uint8_t>((info.bitDepth + 7) / 8 * planes);
+  // What an earlier header gave a meaning to is void.
+  info.ancillaryFlags &= ~kTrnsRead;
+  info.colourKey = {};
+  info.paletteAlpha.fill(0xFFFF);
+  info.criticalFlags = kIhdrRead;
+  return kDone;
+}
+
+int parse_plte(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
+  if ((info.criticalFlags & kIhdrRead) == 0) return kFailed;
+  if (info.colourType != kPalette) return kDone;
+  if (length % 3 != 0 || length > info.palette.size() || !need(buffer, length)) return kFailed;
+  info.palette.fill(0);
+  info.paletteAlpha.fill(0xFFFF);
+  if (length != 0) std::memcpy(info.palette.data(), take(buffer, length), length);
+  info.paletteEntries = length / 3;
+  info.criticalFlags |= kPlteRead;
+  return kDone;
+}
+
+int parse_trns(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
+  if (__PELOI_PngParseTRNSbKGd(&info, &buffer, length, kTrns, &info.colourKey) != 1) return kFailed;
+  info.ancillaryFlags |= kTrnsRead;
+  return kDone;
+}
+
+int note_idat(PELOI_PNGINFO& info, const PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
+  if (info.idatCount == kMaxIdatChunks) return kFailed;
+  uint8_t* data = is_memory(buffer) ? buffer.base + chunk.data : nullptr;
+  info.idat[info.idatCount++] = {chunk.length, data, chunk.data};
+  info.idatLength += chunk.length;
+  return kDone;
+}
+
+using ReadChunk = int (*)(PELOI_PNGINFO&, PELOI_PNGREADBUFFER&, uint32_t);
+
+// The reader of a chunk whose data are looked at here.
+ReadChunk reader_of(uint32_t type) {
+  switch (type) {
+    case kIhdr:
+      return parse_ihdr;
+    case kPlte:
+      return parse_plte;
+    case kTrns:
+      return parse_trns;
+    default:
+      return nullptr;
+  }
+}
+
+bool read_chunk_head(PELOI_PNGREADBUFFER& buffer, Chunk& chunk) {
+  if (!need(buffer, 8)) return false;
+  const uint8_t* head = take(buffer, 8);
+  chunk.length = __PELOI_PngGetUINT32(head);
+  chunk.type = __PELOI_PngGetUINT32(head + 4);
+  chunk.data = tell(buffer);
+  return chunk.length <= buffer.limit;
+}
+
+// Leaves the reader behind the chunk. Only chunks whose data are wanted are visited twice.
+int parse_chunk(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
+  if (const int result = verify(buffer, chunk); result != kDone) return result;
+  if (chunk.type == kIdat) return note_idat(info, buffer, chunk);
+  if (chunk.type == kIend) return chunk.length == 0 ? kDone : kFailed;
+  const ReadChunk read = reader_of(chunk.type);
+  if (read == nullptr) return kDone;
+  if (!move_to(buffer, chunk.data)) return kFailed;
+  if (const int result = read(info, buffer, chunk.length); result != kDone) return result;
+  return move_to(buffer, chunk.data + chunk.length + kCrcBytes) ? kDone : kFailed;
+}
+
+// 16-bit sample to the 16-bit key that decoded samples are compared with. A greyscale key is widened as
+// its pixels are; one beyond the depth equals none.
+uint16_t grey_key(uint32_t value, uint8_t depth) {
+  if (depth == 16) return static_cast<uint16_t>(value >> 8);
+  if (depth == 8) return static_cast<uint16_t>(value);
+  if (value >> depth != 0) return kNoGrey;
+  switch (depth) {
+    case 1:
+      return value != 0 ? 255 : 0;
+    case 2:
+      return static_cast<uint16_t>(value << 6 | 0x3F);
+    default:
+      return static_cast<uint16_t>(value << 4 | 0x0F);
+  }
+}
+
+}  // namespace
+}  // namespace pelo::png
+
+using namespace pelo::png;
+
+uint32_t __PELOI_PngGetUINT32(const uint8_t* bytes) {
+  return pelo::load_be32(bytes);
+}
+
+int __PELOI_PngParseTRNSbKGd(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer, uint32_t length, uint32_t,
+                             std::array<uint16_t, 3>* colourKey) {
+  constexpr int kNoHeader = 3, kNotAllowed = 6;
+  if ((info->criticalFlags & kIhdrRead) == 0) return kNoHeader;
+  switch (info->colourType) {
+    case kPalette:
+      if ((info->criticalFlags & kPlteRead) == 0) return kNotAllowed;
+      if (length > info->paletteEntries || !need(*buffer, length)) return kFailed;
+      for (uint32_t i = 0; i < length; ++i) info->paletteAlpha[i] = *take(*buffer, 1);
+      return kDone;
+    case kTruecolour:
+      if (length != 6) return kNotAllowed;
+      if (!need(*buffer, length)) return kFailed;
+      for (uint16_t& key : *colourKey) {
+        key = static_cast<uint16_t>(pelo::load_be16(take(*buffer, 2)) >> (info->bitDepth - 8));
+      }
+      return kDone;
+    case kGrey:
+      if (length != 2) return kNotAllowed;
+      if (!need(*buffer, length)) return kFailed;
+      colourKey->fill(grey_key(pelo::load_be16(take(*buffer, 2)), info->bitDepth));
+      return kDone;
+    default:
+      return kNotAllowed;
+  }
+}
+
+int __PELOI_PngParserMain(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer) {
+  info->idatCount = 0;
+  info->ancillaryFlags = 0;
+  for (const uint8_t byte : kSignature) {
+    if (!need(*buffer, 1) || *take(*buffer, 1) != byte) return kFailed;
+  }
+  Chunk chunk;
+  do {
+    if (!read_chunk_head(*buffer, chunk)) return kFailed;
+    if (const int result = parse_chunk(*info, *buffer, chunk); result != kDone) return result;
+  } while (chunk.length != 0);
+  return kDone;
+}

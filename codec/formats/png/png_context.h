@@ -1,0 +1,135 @@
+// The state of one PNG decode, held by the decoder information object between calls.
+#pragma once
+
+#include <cstdint>
+
+#include "codec/base/axis_stepper.h"
+#include "codec/base/format_state.h"
+#include "codec/base/output_grid.h"
+#include "codec/pixel/rgba_store.h"
+#include "codec/formats/png/expand.h"
+#include "codec/formats/png/inflate.h"
+#include "codec/formats/png/png_info.h"
+#include "tavirpelo/decode.h"
+
+namespace pelo::png {
+
+// What the caller asked for at the first call; later calls must ask for the same.
+struct Request {
+  int width, height;
+  int outFormat;
+  uint32_t option;
+  bool operator==(const Request&) const = default;
+};
+
+// The pass of an Adam7 image being read (ISO/IEC 15948, 8.2).
+struct PassState {
+  int number;  // 1 to 7; 0 for an image that is not interlaced
+  uint32_t width, height;
+  uint32_t firstColumn, columnStep;
+  uint32_t firstRow, rowStep;
+  uint32_t columnCount;  // output columns that show a pixel of this pass (resampled images)
+};
+
+// Scanlines: the one being filled or just restored, and the one above it.
+struct ScanlineState {
+  OsBuffer<uint8_t> rows;  // two rows of a filter type and rowBytes bytes
+  size_t rowBytes;         // of the current pass
+  uint8_t* current;        // at its filter type byte
+  uint8_t* above;
+  size_t filled;            // bytes of the current row received
+  uint32_t row;             // rows of the pass finished
+  const uint8_t* finished;  // the restored row's bytes while output rows of it are pending
+};
+
+struct OutputState {
+  uint32_t width, height;  // of the picture, unrotated
+  StoreRgba store;         // null: a format that has no writer
+  int bytesPerPixel;
+  Expander expand;
+  SampleMeaning meaning;
+  bool copiesRows;                 // scanlines are output rows already
+  OsBuffer<uint32_t> columns;      // source column of each output column, when resampled
+  OsBuffer<uint32_t> passColumns;  // of the pass: the pass's pixel, and behind these
+  uint32_t* passTargets;           // the output columns that show it
+  AxisStepper rows;                // source row of the next output row
+  uint32_t written;                // output rows written
+  uint32_t base;                   // of these, by earlier line-mode calls
+  uint32_t stop;                   // line mode: rows after which to stop; 0 never
+  OutputGrid grid;
+  OsBuffer<uint8_t> wholeImage;  // R, G, B, A bytes, when the picture is gathered before it is written
+};
+
+}  // namespace pelo::png
+
+typedef struct PELOI_PNGCONTEXT : pelo::FormatState {
+  static constexpr pelo::FormatKind kKind = pelo::FormatKind::kPng;
+  PELOI_PNGINFO info;
+  pelo::png::Request request;
+  uint32_t iterFlag;
+  PELOI_PNGREADBUFFER reader;
+  bool inputReady;     // memory: chunks merged
+  uint32_t idatEntry;  // other sources: the entry being read
+  pelo::png::Inflater inflater;
+  bool inflaterOpen;
+  pelo::png::InflateStop lastStop;
+  uint32_t fullWidth, fullHeight;  // interlaced images: info holds the pass's size meanwhile
+  pelo::png::PassState pass;
+  pelo::png::ScanlineState scanline;
+  uint32_t pendingRows;  // 1 while the finished scanline may give another output row
+  pelo::png::OutputState output;
+} PELOI_PNGCONTEXT;
+
+// Undoes one scanline's filter in place; its type stands in the byte before `row`.
+TAVIRPELO_API void __PELOI_PngReadFilterRow(PELOI_PNGCONTEXT* context, uint8_t* row,
+                                            const uint8_t* previousRow, size_t rowBytes);
+
+// Writes the next output row that the finished scanline gives, if there is one, and sets or clears
+// pendingRows. A scanline of an interlaced image writes all of its rows at once.
+TAVIRPELO_API void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context);
+
+// Writes the gathered whole image, rotated, into the output.
+TAVIRPELO_API void __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context);
+
+// Sets the pass's size in the information record, and answers the bytes of its rows (0 when it is
+// empty).
+TAVIRPELO_API uint32_t getPassRowBytes(PELOI_PNGCONTEXT* context, uint32_t fullWidth,
+                                       uint32_t fullHeight, int pass);
+
+// Reads the next piece of the image data, at most 4096 bytes and never beyond the chunk of `entryIndex`
+// or, when that is used up, the next. 1, or 0 when there is none.
+TAVIRPELO_API int __checkbuffer_util1_multiPELOI_IDAT(PELOI_PNGCONTEXT* context,
+                                                      PELOI_PNGREADBUFFER* buffer, uint32_t entryIndex);
+
+// Decompress and write until the image ends or the mode says stop: a Result. `total` receives the number
+// of bytes decompressed so far.
+TAVIRPELO_API int _PELOI_PngInflateZStreamData(PELOI_PNGCONTEXT* context, uint32_t* total);
+TAVIRPELO_API int _PELOI_PngInflateZStreamData_streamming(PELOI_PNGCONTEXT* context, uint32_t* total);
+TAVIRPELO_API int _PELOI_PngInflateZStreamDataInterlaced(PELOI_PNGCONTEXT* context, uint32_t* total);
+TAVIRPELO_API int _PELOI_PngInflateZStreamDataInterlaced_streamming(PELOI_PNGCONTEXT* context,
+                                                                    uint32_t* total);
+
+namespace pelo::png {
+
+// ---- scanlines.cpp ----
+
+// Begins the image's first scanline or, interlaced, its first pass that is not empty.
+[[nodiscard]] bool begin_scanlines(PELOI_PNGCONTEXT& context);
+
+// Takes decompressed bytes into scanlines and writes those that are complete: kDone when all bytes are
+// used, kMore to stop after an output row, kFailed when cancelled. Bytes behind the last row are
+// dropped.
+Result consume(PELOI_PNGCONTEXT& context);
+
+// ---- output.cpp ----
+
+// Sizes, placement and writers for the request. kDone, or kNoMemory.
+Result set_up_output(PELOI_PNGCONTEXT& context);
+
+// The output of this call: a whole picture, or `lines` rows.
+void aim_output(PELOI_PNGCONTEXT& context, void* output, int lines);
+
+// Lists the output columns that show a pixel of the current pass.
+void begin_pass_output(PELOI_PNGCONTEXT& context);
+
+}  // namespace pelo::png

@@ -1,0 +1,127 @@
+#include "codec/formats/png/png_driver.h"
+
+namespace pelo::png {
+namespace {
+
+// The state of a first call: reader, header, output.
+Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
+  if (!open_read_buffer(context.reader, decInfo.pIO)) return kNoMemory;
+  if (__PELOI_PngParserMain(&context.info, &context.reader) != kDone) return kNoMemory;
+  const PELOI_PNGINFO& info = context.info;
+  if (info.width == 0 || info.height == 0 || info.idatCount == 0) return kNoMemory;
+  if (info.colourType == kPalette && (info.criticalFlags & kPlteRead) == 0) return kNoMemory;
+  const Result result = set_up_output(context);
+  decInfo.outWidth = static_cast<int>(context.output.width);
+  decInfo.outHeight = static_cast<int>(context.output.height);
+  return result;
+}
+
+// The object's state: the one it holds when the request is the same, else a new one.
+Result obtain(TAVIRPELO_DECINFO& decInfo, const Request& request, PELOI_PNGCONTEXT*& context) {
+  context = held_state<PELOI_PNGCONTEXT>(decInfo);
+  if (context != nullptr) return context->request == request ? kDone : kFailed;
+  if (decInfo.pFormatInfo != nullptr) return kFailed;  // another format's
+  context = os_new<PELOI_PNGCONTEXT>().release();
+  if (context == nullptr) return kNoMemory;
+  context->kind = PELOI_PNGCONTEXT::kKind;
+  decInfo.pFormatInfo = context;
+  context->request = request;
+  return begin(*context, decInfo);
+}
+
+int decompress(PELOI_PNGCONTEXT& context) {
+  using Decompress = int (*)(PELOI_PNGCONTEXT*, uint32_t*);
+  constexpr Decompress kVariants[2][2] = {
+      {_PELOI_PngInflateZStreamData, _PELOI_PngInflateZStreamData_streamming},
+      {_PELOI_PngInflateZStreamDataInterlaced, _PELOI_PngInflateZStreamDataInterlaced_streamming}};
+  const size_t interlaced = context.info.interlace != 0 ? 1 : 0;
+  const size_t streaming = is_memory(context.reader) ? 0 : 1;
+  uint32_t total = 0;
+  return kVariants[interlaced][streaming](&context, &total);
+}
+
+bool accepts_lines(const PELOI_PNGCONTEXT& context, int lines) {
+  if (context.info.interlace == 0 || lines == 0) return true;
+  const uint32_t height = context.inflaterOpen ? context.fullHeight : context.info.height;
+  return static_cast<uint32_t>(lines) == height;
+}
+
+int decode(TAVIRPELO_DECINFO& decInfo, void* output, const Request& request, int lines) {
+  PELOI_PNGCONTEXT* context;
+  if (const Result result = obtain(decInfo, request, context); result != kDone) return result;
+  if (context->output.width == 0 || context->output.height == 0) return kDone;
+  if (!accepts_lines(*context, lines)) return kLineMode;
+  context->reader.source = decInfo.pIO;
+  context->iterFlag = decInfo.pngIterFlag != 0 ? 1 : 0;
+  aim_output(*context, output, lines);
+  return decompress(*context);
+}
+
+bool usable(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
+  return decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 && height >= 0;
+}
+
+// The codes of the public operations: 1 complete, 4 more to come, 0 failed.
+int public_result(int result) {
+  return result == kDone ? 1 : result == kMore ? 4 : 0;
+}
+
+int start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines, int iterFlag) {
+  if (!usable(decInfo, output, width, height) || lines < 0) return 0;
+  decInfo->scaleDenom = 1;
+  decInfo->pngIterFlag = iterFlag;
+  return public_result(PELOI_FastImgDecodePng(decInfo, output, width, height, lines));
+}
+
+}  // namespace
+}  // namespace pelo::png
+
+using namespace pelo::png;
+
+int PELOI_FastImgDecodePng(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
+  const Request request{width, height, decInfo->outFormat, decInfo->option};
+  const int result = decode(*decInfo, output, request, lines);
+  if (result != kMore) PELOI_DestroyDecodePng(decInfo);
+  return result;
+}
+
+int PELOI_DestroyDecodePng(TAVIRPELO_DECINFO* decInfo) {
+  pelo::release_state<PELOI_PNGCONTEXT>(*decInfo);
+  return 1;
+}
+
+int PELOI_GetAlphaTrFlag(TAVIRPELO_DECINFO* decInfo) {
+  if (decInfo == nullptr || decInfo->pIO == nullptr) return 0;
+  const auto context = pelo::os_new<PELOI_PNGCONTEXT>();
+  if (context == nullptr || !open_read_buffer(context->reader, decInfo->pIO)) return 0;
+  // What was read before a failure decides.
+  static_cast<void>(__PELOI_PngParserMain(&context->info, &context->reader));
+  PELOI_DestroyDecodePng(decInfo);
+  const bool carriesAlpha = (context->info.colourType & 4) != 0;
+  return carriesAlpha || (context->info.ancillaryFlags & kTrnsRead) != 0;
+}
+
+int TAVIRPELOI_DecodePNG(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  if (decInfo == nullptr) return 0;
+  PELOI_DestroyDecodePng(decInfo);
+  return start(decInfo, output, width, height, 0, 0);
+}
+
+int TAVIRPELOI_DecodePNGLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
+                             int lines) {
+  return start(decInfo, output, width, height, lines, 0);
+}
+
+int TAVIRPELOI_DecodePNGIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  return start(decInfo, output, width, height, 0, 1);
+}
+
+int TAVIRPELOI_DestroyPNGInfo(TAVIRPELO_DECINFO* decInfo) {
+  if (decInfo == nullptr) return 0;
+  PELOI_DestroyDecodePng(decInfo);
+  return decInfo->pFormatInfo == nullptr;
+}
+
+int TAVIRPELOI_AbortPNGIter(TAVIRPELO_DECINFO* decInfo) {
+  return TAVIRPELOI_DestroyPNGInfo(decInfo);
+}

@@ -1,0 +1,73 @@
+// What the chunks before the pixels say: header, palette, transparency, and where the image data lie.
+#pragma once
+
+#include <array>
+#include <cstdint>
+
+#include "codec/formats/png/read_buffer.h"
+#include "tavirpelo/decinfo.h"
+
+namespace pelo::png {
+
+enum ColourType : uint8_t {
+  kGrey = 0,
+  kTruecolour = 2,
+  kPalette = 3,
+  kGreyAlpha = 4,
+  kTruecolourAlpha = 6
+};
+
+// Outcomes of the inner operations.
+enum Result {
+  kNoLookup = 0,
+  kDone = 1,
+  kCorrupt = 6,  // checksum, zlib or DEFLATE data
+  kNoMemory = 7,
+  kFailed = 8,    // anything else: header, palette, a read or seek, cancelled
+  kMore = 9,      // stopped with its state kept
+  kLineMode = 10  // line mode asked of an interlaced image
+};
+
+constexpr size_t kMaxIdatChunks = 2048;
+constexpr uint32_t kTrnsRead = 0x1000;            // in ancillaryFlags
+constexpr uint32_t kIhdrRead = 1, kPlteRead = 2;  // in criticalFlags
+constexpr uint32_t kNoGrey = 0xFFFF;              // a colour key that no pixel equals
+
+struct IdatEntry {
+  uint32_t length;  // bytes not yet read
+  uint8_t* data;    // memory sources
+  int64_t offset;   // other sources: stream position
+};
+
+}  // namespace pelo::png
+
+typedef struct PELOI_PNGINFO {
+  std::array<uint16_t, 3> colourKey;  // R, G, B brought to the range of decoded samples
+  uint32_t wholeMultiple;             // 1: the output is the image at scale 1
+  uint32_t hasAlpha;                  // 1 for colour types 4 and 6
+  uint32_t width, height;
+  uint8_t bitDepth, colourType, interlace;
+  std::array<uint16_t, 256> paletteAlpha;
+  uint64_t idatLength;               // of all chunks
+  std::array<uint8_t, 768> palette;  // R, G, B; entries that the file lacks are black
+  uint32_t paletteEntries;
+  uint32_t ancillaryFlags, criticalFlags;
+  uint8_t bitsPerPixel;
+  uint8_t bytesPerPixel;  // the filters' distance, at least 1
+  std::array<pelo::png::IdatEntry, pelo::png::kMaxIdatChunks> idat;
+  uint32_t idatCount;
+} PELOI_PNGINFO;
+
+// Reads the chunks from the source's start to the first empty chunk; their data are checked, not
+// decompressed. A Result: 1, 6 (a checksum differs), 8.
+TAVIRPELO_API int __PELOI_PngParserMain(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer);
+
+// Reads the `length` bytes of a tRNS chunk at the cursor into the palette's alpha or the colour key. 1;
+// 3 before any IHDR; 6 for a colour type or length that allows none; 8 when the read fails or there are
+// more values than palette entries. The chunk type is not looked at.
+TAVIRPELO_API int __PELOI_PngParseTRNSbKGd(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer,
+                                           uint32_t length, uint32_t chunkType,
+                                           std::array<uint16_t, 3>* colourKey);
+
+// A big-endian 32-bit value.
+TAVIRPELO_API uint32_t __PELOI_PngGetUINT32(const uint8_t* bytes);
