@@ -1,8 +1,10 @@
 #include "platform/fault_injection.h"
 
+#ifdef TAVIR_FAULT_HOOKS
 namespace pelo::faults {
 
-Counter allocations;
-Counter containerCalls;
+constinit Counter allocations;
+constinit Counter containerCalls;
 
 }  // namespace pelo::faults
+#endif

@@ -1,24 +1,32 @@
 // The decoder information object: creation, options, callbacks.
+#include "codec/base/dec_info.h"
+
+#include <atomic>
+
+#include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
-#include "codec/base/zoom_state.h"
 #include "tavirpelo/decinfo.h"
 
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_DECINFO) == 76);
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_CALLBACK) == 8);
 
+using namespace pelo;
+
 namespace {
 
 constexpr int kDecoderVersion = 35010;
 
+constinit std::atomic<ReleaseZoom> releaseZoom{nullptr};
+
 // An empty object; null with gTavirError set when memory is short.
-pelo::OsPtr<TAVIRPELO_DECINFO> new_dec_info() {
-  gTavirError = TAVIRPELO_ERROR_NONE;
-  auto decInfo = pelo::os_new<TAVIRPELO_DECINFO>();
-  if (!decInfo) gTavirError = TAVIRPELO_ERROR_MEMORY;
+OsPtr<TAVIRPELO_DECINFO> new_dec_info() {
+  record_error(ErrorWord::kObject, TAVIRPELO_ERROR_NONE);
+  auto decInfo = os_new<TAVIRPELO_DECINFO>();
+  if (!decInfo) record_error(ErrorWord::kObject, TAVIRPELO_ERROR_MEMORY);
   return decInfo;
 }
 
-TAVIRPELO_DECINFO* finish(pelo::OsPtr<TAVIRPELO_DECINFO> decInfo, TAVIRPELO_IO* io, int outFormat,
+TAVIRPELO_DECINFO* finish(OsPtr<TAVIRPELO_DECINFO> decInfo, TAVIRPELO_IO* io, int outFormat,
                           uint32_t option) {
   if (io == nullptr) return nullptr;
   decInfo->pIO = io;
@@ -29,6 +37,10 @@ TAVIRPELO_DECINFO* finish(pelo::OsPtr<TAVIRPELO_DECINFO> decInfo, TAVIRPELO_IO* 
 }
 
 }  // namespace
+
+void pelo::set_zoom_release(ReleaseZoom release) {
+  releaseZoom.store(release);
+}
 
 TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfo(int ioType, void* source, int size, int outFormat,
                                            uint32_t option) {
@@ -49,9 +61,10 @@ TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfoWithStream(void* context, int size, TA
 }
 
 int TAVIRPELO_DestroyDecInfo(TAVIRPELO_DECINFO* decInfo) {
-  gTavirError = decInfo == nullptr ? TAVIRPELO_ERROR_NULL : TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kObject, decInfo == nullptr ? TAVIRPELO_ERROR_NULL : TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) return 0;
-  pelo::release_zoom_state(*decInfo);
+  const ReleaseZoom release = releaseZoom.load();
+  if (decInfo->pZoomInfo != nullptr && release != nullptr) release(*decInfo);
   TAVIRPELO_OsFree(decInfo->pCallback);
   TAVIRPELO_Close_IO(decInfo->pIO);
   TAVIRPELO_OsFree(decInfo);
@@ -70,14 +83,16 @@ int TAVIRPELO_SetDecMode(TAVIRPELO_DECINFO* decInfo, int mode) {
   return 1;
 }
 
-int TAVIRPELO_GetErrorCode(void) { return gTavirError; }
+int TAVIRPELO_GetErrorCode(void) {
+  return error_code(ErrorWord::kObject);
+}
 
 int PELOJ_GetVersion(void) { return kDecoderVersion; }
 
 int PELOJ_SetCallback(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_PROGRESSFN function, intptr_t argument) {
   if (decInfo == nullptr) return 0;
   TAVIRPELO_OsFree(decInfo->pCallback);
-  decInfo->pCallback = pelo::os_new<TAVIRPELO_CALLBACK>().release();
+  decInfo->pCallback = os_new<TAVIRPELO_CALLBACK>().release();
   if (decInfo->pCallback == nullptr) return 0;
   *decInfo->pCallback = {argument, function};
   return 1;

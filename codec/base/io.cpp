@@ -6,6 +6,7 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "codec/base/errors.h"
 #include "codec/base/checked.h"
 #include "codec/base/os_memory.h"
 #include "tavirpelo/decinfo.h"
@@ -20,7 +21,7 @@ namespace {
 constexpr int kDefaultReadSize = 4096;  // bytes
 
 bool refuse(int error) {
-  gTAVIRPELO_Error = error;
+  record_error(ErrorWord::kDecoding, error);
   return false;
 }
 
@@ -74,7 +75,7 @@ bool open_kind(TAVIRPELO_IO& io, void* source, int size) {
 OsPtr<TAVIRPELO_IO> new_io(int kind) {
   auto io = os_new<TAVIRPELO_IO>();
   if (io == nullptr) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_MEMORY;
+    record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_MEMORY);
     return io;
   }
   io->readSize = kDefaultReadSize;

@@ -1,4 +1,5 @@
 // Detection by the first bytes, and what the parser learns from each format's header.
+#include "codec/base/errors.h"
 #include "codec/decode/format_detect.h"
 
 #include <cstring>
@@ -13,7 +14,7 @@ namespace {
 constexpr uint32_t kMaxWbmpSide = 5000;
 
 int unreadable() {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_HEADER;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_HEADER);
   return TAVIRPELO_FORMAT_UNKNOWN;
 }
 
@@ -154,15 +155,15 @@ int PELO_Parse(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, TAVIRPELO_HINFO
 }
 
 int TAVIRPELO_Parser(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_HINFO* hinfo) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_NULL;
+    record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NULL);
     return TAVIRPELO_FORMAT_UNKNOWN;
   }
   if (hinfo != nullptr) *hinfo = {};
   BufferedSource source;
   if (!source.open(decInfo->pIO)) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_MEMORY;
+    record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_MEMORY);
     return TAVIRPELO_FORMAT_UNKNOWN;
   }
   if (TAVIRPELO_Seek_IO(decInfo->pIO, 0, SEEK_SET) < 0) return TAVIRPELO_FORMAT_UNKNOWN;
@@ -191,7 +192,7 @@ int parse_once(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_HINFO* record) {
 }
 
 int refuse(int code) {
-  debug_PeloCodecError = code;
+  record_error(ErrorWord::kCodec, code);
   return TAVIRPELO_FORMAT_UNKNOWN;
 }
 

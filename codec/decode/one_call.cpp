@@ -1,4 +1,5 @@
 // One-call decoding of a file or a byte buffer into a raw image.
+#include "codec/base/errors.h"
 #include "tavirpelo/decode.h"
 #include "tavirpelo/parse.h"
 
@@ -50,7 +51,7 @@ int decode(Decode decoder, const Source& source, TAVIRPELO_RAWINFO& raw, uint32_
 }
 
 bool refuse(int code) {
-  debug_PeloCodecError = code;
+  pelo::record_error(pelo::ErrorWord::kCodec, code);
   return false;
 }
 

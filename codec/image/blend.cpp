@@ -1,6 +1,7 @@
 // Pixels over pixels: blending by alpha, and copying under a mask.
 #include <cstring>
 
+#include "codec/base/errors.h"
 #include "codec/base/byte_order.h"
 #include "codec/pixel/blend.h"
 #include "tavirpelo/raw.h"
@@ -38,7 +39,7 @@ void blend_rows(const uint8_t* src, uint8_t* dst, ptrdiff_t width, ptrdiff_t hei
 }
 
 int refuse(int code) {
-  debug_PeloCodecError = code;
+  record_error(ErrorWord::kCodec, code);
   return 0;
 }
 

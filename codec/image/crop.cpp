@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <climits>
 
+#include "codec/base/errors.h"
 #include "codec/base/geometry.h"
 #include "codec/base/os_memory.h"
 #include "tavirpelo/decode.h"
@@ -15,7 +16,7 @@ namespace {
 constexpr int64_t kHeadroom = 200000;  // bytes left to the decoder beside the picture
 
 int fail(int code) {
-  gTAVIRPELO_Error = code;
+  record_error(ErrorWord::kDecoding, code);
   return 0;
 }
 
@@ -97,7 +98,7 @@ Plan plan_decode(const TAVIRPELO_CROPRECT& rect, Size region) {
 
 int TAVIRPELO_Crop(const void* src, const TAVIRPELO_CROPRECT* rect, void* dst, int dstWidth,
                    int dstHeight, uint32_t option) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (src == nullptr || dst == nullptr || rect == nullptr) return fail(TAVIRPELO_ERROR_NULL);
   if (dstWidth < 1 || dstHeight < 1) return 0;
   if (!inside(*rect)) return fail(TAVIRPELO_ERROR_NULL);
@@ -125,7 +126,7 @@ int TAVIRPELO_CropDecoding(const char* path, void* outBuffer, int width, int hei
 
 int TAVIRPELO_CropFromImage(const char* path, TAVIRPELO_CROPRECT* rect, void* dst, int dstWidth,
                             int dstHeight, uint32_t option, int memoryLimit) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (path == nullptr || rect == nullptr || dst == nullptr || dstWidth < 1 || dstHeight < 1) {
     return fail(TAVIRPELO_ERROR_NULL);
   }

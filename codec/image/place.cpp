@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "codec/base/errors.h"
 #include "codec/image/scale.h"
 #include "codec/image/resample.h"
 #include "tavirpelo/raw.h"
@@ -92,7 +93,7 @@ const Format* find_format(int code) {
 }
 
 int refuse(int code) {
-  debug_PeloCodecError = code;
+  record_error(ErrorWord::kCodec, code);
   return 0;
 }
 

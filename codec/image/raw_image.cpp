@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "codec/base/errors.h"
 #include "codec/base/byte_order.h"
 #include "codec/base/os_memory.h"
 #include "codec/pixel/fill.h"
@@ -37,7 +38,7 @@ void fill_planes(TAVIRPELO_RAWINFO& raw) {
 
 int fill(TAVIRPELO_RAWINFO* raw, uint16_t word, uint8_t r, uint8_t g, uint8_t b) {
   if (raw == nullptr || raw->pData == nullptr) {
-    debug_PeloCodecError = TAVIRPELO_CODEC_ARGUMENT;
+    pelo::record_error(pelo::ErrorWord::kCodec, TAVIRPELO_CODEC_ARGUMENT);
     return 0;
   }
   uint8_t pixel[4] = {};
@@ -74,17 +75,17 @@ int fill(TAVIRPELO_RAWINFO* raw, uint16_t word, uint8_t r, uint8_t g, uint8_t b)
 
 TAVIRPELO_RAWINFO* TAVIRPELO_CreateRawInfo(int width, int height, int format) {
   if (width < 1 || height < 1) {
-    debug_PeloCodecError = TAVIRPELO_CODEC_SIZE;
+    pelo::record_error(pelo::ErrorWord::kCodec, TAVIRPELO_CODEC_SIZE);
     return nullptr;
   }
   if (width > kMaxSide || height > kMaxSide) return nullptr;
   if (!has_layout(format)) {
-    debug_PeloCodecError = TAVIRPELO_CODEC_RAW_FORMAT;
+    pelo::record_error(pelo::ErrorWord::kCodec, TAVIRPELO_CODEC_RAW_FORMAT);
     format = TAVIRPELO_RGB565;
   }
   auto raw = pelo::os_new<TAVIRPELO_RAWINFO>();
   if (!raw) {
-    debug_PeloCodecError = TAVIRPELO_CODEC_ARGUMENT;
+    pelo::record_error(pelo::ErrorWord::kCodec, TAVIRPELO_CODEC_ARGUMENT);
     return nullptr;
   }
   pelo::OsBuffer<uint8_t> pixels;

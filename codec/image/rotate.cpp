@@ -3,6 +3,7 @@
 #include <cmath>
 #include <cstring>
 
+#include "codec/base/errors.h"
 #include "tavirpelo/raw.h"
 
 namespace {
@@ -61,7 +62,7 @@ int elo_codec_rotation(const TAVIRPELO_RAWINFO* raw, void* dst, int degrees) {
 
 int TAVIRPELO_CODEC_Rotation(const TAVIRPELO_RAWINFO* raw, void* dst, int degrees) {
   if (dst == nullptr || raw == nullptr || raw->pData == nullptr) {
-    debug_PeloCodecError = TAVIRPELO_CODEC_ARGUMENT;
+    pelo::record_error(pelo::ErrorWord::kCodec, TAVIRPELO_CODEC_ARGUMENT);
     return 0;
   }
   return elo_codec_rotation(raw, dst, degrees);

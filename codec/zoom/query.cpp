@@ -1,4 +1,5 @@
 // Questions about a zoom, and its settings.
+#include "codec/base/errors.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/layout.h"
 #include "codec/zoom/session.h"
@@ -70,7 +71,7 @@ int TAVIRPELO_SetZoomScale(TAVIRPELO_DECINFO* decInfo, int scale) {
 // A picture that lies on its side takes the same part of a square, so the display's height, and with it
 // the rotation, does not matter. While a zoom is active its task may be reading the source.
 int TAVIRPELO_GetZoomMemRequirement(TAVIRPELO_DECINFO* decInfo, int displayWidth, int) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) return fail(kControlMessages.noObject, TAVIRPELO_ERROR_NULL);
   if (!zoomable(decInfo->outFormat)) return -1;
   int step = step_of(displayWidth);

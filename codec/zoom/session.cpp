@@ -1,14 +1,14 @@
 // Finding an object's picture and zoom, and ending the zoom.
+#include "codec/base/errors.h"
 #include "codec/zoom/session.h"
 
-#include "codec/base/zoom_state.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/zoom/task.h"
 
 namespace pelo::zoom {
 
 TAVIRPELO_ZOOMINFO* begin(TAVIRPELO_DECINFO* decInfo, const Messages& messages) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   const bool missing = decInfo == nullptr;
   if (missing || decInfo->pZoomInfo == nullptr) {
     fail(missing ? messages.noObject : messages.noZoom, TAVIRPELO_ERROR_NULL);
@@ -32,26 +32,28 @@ void end_task(TAVIRPELO_ZOOMINFO& zoom) {
   zoom.taskId = -1;
 }
 
-void end_zoom(TAVIRPELO_DECINFO& decInfo) {
-  release_zoom_state(decInfo);
-  decInfo.option = decInfo.userOption;
-  decInfo.CheckFn = TAVIRPELO_CheckFn;
-}
-
-}  // namespace pelo::zoom
-
-void pelo::release_zoom_state(TAVIRPELO_DECINFO& decInfo) {
+void release_state(TAVIRPELO_DECINFO& decInfo) {
   TAVIRPELO_ZOOMINFO* zoom = decInfo.pZoomInfo;
   if (zoom == nullptr) return;
-  zoom::end_task(*zoom);
+  end_task(*zoom);
   TAVIRPELO_OsFree(zoom->pZoomImage);
   TAVIRPELO_OsFree(zoom->pZoomedImage);
   TAVIRPELO_OsFree(zoom);
   decInfo.pZoomInfo = nullptr;
 }
 
+void end_zoom(TAVIRPELO_DECINFO& decInfo) {
+  release_state(decInfo);
+  decInfo.option = decInfo.userOption;
+  decInfo.CheckFn = TAVIRPELO_CheckFn;
+}
+
+}  // namespace pelo::zoom
+
+using namespace pelo;
+
 int TAVIRPELO_StopZoom(TAVIRPELO_DECINFO* decInfo) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) {
     return pelo::zoom::fail("TAVIRPELO_StopZoom : TAVIRPELO_DECINFO is null!", TAVIRPELO_ERROR_NULL);
   }

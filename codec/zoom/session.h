@@ -2,20 +2,25 @@
 // messages.
 #pragma once
 
+#include "codec/base/errors.h"
 #include "codec/base/geometry.h"
 #include "tavirpelo/zoom.h"
 
 namespace pelo::zoom {
 
-// Sets gTAVIRPELO_Error; 0.
+// Answers 0 with the decoding word set.
 inline int fail(int code) {
-  gTAVIRPELO_Error = code;
+  record_error(ErrorWord::kDecoding, code);
   return 0;
 }
 
-// Hands a text to the message hook; 0.
-inline int fail(const char* message, int code = gTAVIRPELO_Error) {
+// Hands a text to the message hook; 0. Without a code the word keeps what a function below left in it.
+inline int fail(const char* message) {
   TAVIRPELO_PrintMessage(message);
+  return 0;
+}
+inline int fail(const char* message, int code) {
+  fail(message);
   return fail(code);
 }
 
@@ -54,6 +59,9 @@ struct Display {
 
 // Ends the decode task, if any, and waits for it.
 void end_task(TAVIRPELO_ZOOMINFO& zoom);
+
+// Frees the object's zoom state and both buffers, if any, and clears pZoomInfo.
+void release_state(TAVIRPELO_DECINFO& decInfo);
 
 // Ends a zoom: the state goes, the object gets its own option word and progress function back.
 void end_zoom(TAVIRPELO_DECINFO& decInfo);

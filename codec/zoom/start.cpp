@@ -1,6 +1,8 @@
 // Starting a zoom: state and buffers, then the first view from a decode or from the caller's preview.
 #include <algorithm>
 
+#include "codec/base/dec_info.h"
+#include "codec/base/errors.h"
 #include "codec/base/checked.h"
 #include "codec/base/os_memory.h"
 #include "codec/pixel/packers.h"
@@ -53,6 +55,7 @@ int attach(TAVIRPELO_DECINFO& decInfo, const Wishes& wishes) {
   zoom->taskId = -1;
   zoom->pZoomImage = image.release();
   zoom->pZoomedImage = zoomed.release();
+  set_zoom_release(release_state);
   decInfo.pZoomInfo = zoom.release();
   return 1;
 }
@@ -113,7 +116,7 @@ struct Start {
 };
 
 int start_zoom(TAVIRPELO_DECINFO* decInfo, const Start& start, bool withZoomedImage) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo != nullptr && !start.display.usable()) return fail(TAVIRPELO_ERROR_NULL);
   const Size display = start.display.size;
   if (!PELO_InitZoom(decInfo, display.width, display.height, start.budget, start.zoomFactor,
@@ -140,7 +143,7 @@ int start_zoom(TAVIRPELO_DECINFO* decInfo, const Start& start, bool withZoomedIm
 
 int PELO_InitZoom(TAVIRPELO_DECINFO* decInfo, int displayWidth, int displayHeight, int budget,
                   int zoomFactor, int withZoomedImage) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) {
     return fail("PELO_InitZoom : TAVIRPELO_DECINFO is null!", TAVIRPELO_ERROR_NULL);
   }

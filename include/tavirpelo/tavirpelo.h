@@ -5,6 +5,7 @@
 #include "tavirpelo/decinfo.h"
 #include "tavirpelo/decode.h"
 #include "tavirpelo/encode.h"
+#include "tavirpelo/error.h"
 #include "tavirpelo/exif.h"
 #include "tavirpelo/io.h"
 #include "tavirpelo/parse.h"
