@@ -19,25 +19,6 @@ struct DestroyDecInfo {
 };
 using DecInfo = std::unique_ptr<TAVIRPELO_DECINFO, DestroyDecInfo>;
 
-using Decode = int (*)(TAVIRPELO_DECINFO*, void*, int, int);
-
-// The decoders of drawable formats; any other code cannot be drawn.
-Decode decoder_of(int format) {
-  switch (format) {
-    case TAVIRPELO_FORMAT_JPEG:
-      return TAVIRPELO_DecodeJPEG;
-    case TAVIRPELO_FORMAT_BMP:
-      return TAVIRPELOI_DecodeBMP;
-    case TAVIRPELO_FORMAT_PNG:
-      return TAVIRPELOI_DecodePNG;
-    case TAVIRPELO_FORMAT_GIF:
-    case TAVIRPELO_FORMAT_ANIMATED_GIF:
-      return TAVIRPELOI_DecodeGIF;
-    default:
-      return nullptr;
-  }
-}
-
 // Bytes of the pixel array; 0 for a size that no Java array holds.
 size_t pixel_bytes(int width, int height) {
   if (width < 1 || height < 1) return 0;
@@ -53,9 +34,11 @@ int draw(int ioType, void* source, int size, void* pixels, int width, int height
   const DecInfo decInfo(TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_BGRA8888, 0));
   if (!decInfo) return 0;
   TAVIRPELO_HINFO header;
-  const Decode decode = decoder_of(TAVIRPELO_Parser(decInfo.get(), &header));
+  const int format = TAVIRPELO_Parser(decInfo.get(), &header);
   vss_memset(pixels, 0, bytes);  // transparent around a fitted picture
-  return decode != nullptr && decode(decInfo.get(), pixels, width, height) != 0;
+  // Wireless bitmaps are not drawn: their decoder writes no pixels with alpha.
+  return format != TAVIRPELO_FORMAT_WBMP &&
+         TAVIRPELO_DecodeParsed(decInfo.get(), pixels, width, height) != 0;
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 #include "tavirpelo/io.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <climits>
 #include <cstddef>
 #include <cstdint>
@@ -20,24 +21,46 @@ namespace {
 
 constexpr int kDefaultReadSize = 4096;  // bytes
 
-bool refuse(int error) {
+bool refuse_with(int error) {
   record_error(ErrorWord::kDecoding, error);
   return false;
 }
 
+// What the system said of a file that did not open.
+Reason reason_of_open(int systemError) {
+  switch (systemError) {
+    case ENOENT:
+    case ENOTDIR:
+      return Reason::kNotFound;
+    case EACCES:
+    case EPERM:
+      return Reason::kPermission;
+    case EISDIR:
+    case EINVAL:
+      return Reason::kNotAFile;
+    default:
+      return Reason::kCannotOpen;
+  }
+}
+
 bool open_path(TAVIRPELO_IO& io, const char* path, int size) {
+  errno = 0;
   FILE* stream = TAVIRPELO_OpenFile(path);
-  if (stream == TAVIRPELO_INVALID_FILE) return refuse(TAVIRPELO_ERROR_OPEN);
+  if (stream == TAVIRPELO_INVALID_FILE) {
+    refuse(reason_of_open(errno), "opening the source");
+    return refuse_with(TAVIRPELO_ERROR_OPEN);
+  }
   io.hFile = stream;
   io.size = size;
   if (size > 0) return true;
   io.size = TAVIRPELO_Seek_IO(&io, 0, SEEK_END);
+  if (io.size == 0) return refuse(Reason::kEmpty, "opening the source");
   return io.size > 0 && TAVIRPELO_Seek_IO(&io, 0, SEEK_SET) == 0;
 }
 
 bool open_memory(TAVIRPELO_IO& io, void* block, int size) {
-  if (size < 1) return refuse(TAVIRPELO_ERROR_EMPTY_MEMORY);
-  if (block == nullptr) return refuse(TAVIRPELO_ERROR_NULL);
+  if (size < 1) return refuse_with(TAVIRPELO_ERROR_EMPTY_MEMORY);
+  if (block == nullptr) return refuse_with(TAVIRPELO_ERROR_NULL);
   io.pSource = block;
   io.size = size;
   return true;
@@ -51,10 +74,10 @@ bool plausible_handle(const FILE* handle) {
 }
 
 bool open_handle(TAVIRPELO_IO& io, FILE* handle, int size) {
-  if (!plausible_handle(handle)) return refuse(TAVIRPELO_ERROR_OPEN);
+  if (!plausible_handle(handle)) return refuse_with(TAVIRPELO_ERROR_OPEN);
   io.hFile = handle;
   io.base = TAVIRPELO_SeekFile(handle, 0, SEEK_CUR);
-  if (io.base < 0) return refuse(TAVIRPELO_ERROR_OPEN);  // cannot seek, and nothing else is offered
+  if (io.base < 0) return refuse_with(TAVIRPELO_ERROR_OPEN);  // cannot seek, and nothing else is offered
   io.size = size;
   return size > 0;
 }
@@ -68,7 +91,7 @@ bool open_kind(TAVIRPELO_IO& io, void* source, int size) {
     case TAVIRPELO_IO_HANDLE:
       return open_handle(io, static_cast<FILE*>(source), size);
     default:
-      return refuse(TAVIRPELO_ERROR_IO_KIND);
+      return refuse_with(TAVIRPELO_ERROR_IO_KIND);
   }
 }
 

@@ -68,6 +68,11 @@ TAVIRPELO_API int elo_dec_agif_from_file(const char* path, TAVIRPELO_RAWINFO* ra
 TAVIRPELO_API int elo_dec_agif_from_buffer(void* buffer, int length, TAVIRPELO_RAWINFO* raw,
                                            uint32_t option, TAVIRPELO_DECINFO** handle);
 
+/* Decodes by the decoder of decInfo->imageFormat, which TAVIRPELO_Parser has found: the whole picture, of an
+ * animation its first image, into width x height pixels of decInfo->outFormat. 1, or 0 as that decoder says;
+ * also for a null object and for an unknown format. */
+TAVIRPELO_API int TAVIRPELO_DecodeParsed(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+
 /* ---- JPEG in bands ----
  * A picture of any size, stretched to exactly width x height, decoded a band of rows at a time: memory
  * holds one row of blocks and the caller's band. The rows equal those of TAVIRPELO_DecodeJPEG with

@@ -1,4 +1,5 @@
-"""The shared library exports exactly what the headers declare with TAVIRPELO_API.
+"""The shared library exports exactly what the headers declare with TAVIRPELO_API, and runs nothing when it is
+loaded.
 
 The headers go through the preprocessor first, since some declare a family through a macro.
 """
@@ -9,7 +10,7 @@ import subprocess
 import sys
 
 parser = argparse.ArgumentParser()
-for option in ("compiler", "nm", "source", "library"):
+for option in ("compiler", "nm", "source", "library", "objects"):
     parser.add_argument("--" + option, required=True)
 arguments = parser.parse_args()
 root = pathlib.Path(arguments.source)
@@ -47,4 +48,11 @@ for title, names in (("exported, but declared in no header", exported - interfac
     for name in sorted(names):
         print(f"{title}: {name}")
 print(f"{len(exported)} names exported, {len(public)} of them public")
-sys.exit(exported - {"JNI_OnLoad"} != interface)
+
+# Both compilers gather a file's initialisers in a function of this name.
+initialised = [file for file in sorted(pathlib.Path(arguments.objects).rglob("*.o"))
+               if "_GLOBAL__sub_I_" in subprocess.run([arguments.nm, file], capture_output=True, check=True,
+                                                      text=True).stdout]
+for file in initialised:
+    print(f"has an initialiser that runs at load: {file.relative_to(arguments.objects)}")
+sys.exit(exported - {"JNI_OnLoad"} != interface or initialised != [])

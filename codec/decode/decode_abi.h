@@ -1,4 +1,4 @@
-// Format detection by signature, and the GIF and WBMP header scans.
+// Given names of the decode room that no public header has.
 #pragma once
 
 #include "codec/base/buffered_source.h"

@@ -1,0 +1,48 @@
+// What a picture format is to the rooms above it: how its files begin, what their heads tell, and the
+// ways in which they are decoded. codec/decode/formats.cpp has a line for each; a further format is a
+// folder and a line.
+#pragma once
+
+#include <cstdint>
+
+#include "codec/base/buffered_source.h"
+#include "codec/base/errors.h"
+#include "tavirpelo/parse.h"
+
+namespace pelo {
+
+constexpr uint32_t kSniffBytes = 8;  // what a format is recognised by
+
+struct Format {
+  // True for the first kSniffBytes bytes of its files; bytes behind a shorter source's end are zeros.
+  bool (*sniff)(const uint8_t* head);
+
+  // Reads the head behind sniff(), from a source at its start: the object's image size and what `hinfo`
+  // (may be null) has of this format. The format's code, or 0 when the source is none after all.
+  int (*parse)(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+
+  // Decodes the whole picture, of an animation its first image; 1 or 0.
+  int (*decode)(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+
+  int code, animatedCode;  // what parse() answers; animatedCode 0: the format has no animations
+};
+
+// ---- what the parsers share ----
+
+// Notes a picture's size and its number of images; gives back the format's code.
+inline int found(TAVIRPELO_DECINFO& decInfo, TAVIRPELO_HINFO* hinfo, int code, uint32_t width,
+                 uint32_t height) {
+  decInfo.imageWidth = static_cast<int>(width);
+  decInfo.imageHeight = static_cast<int>(height);
+  if (hinfo != nullptr) hinfo->frameCount = 1;
+  return code;
+}
+
+// A head that the source does not hold whole: 0.
+inline int cut_head(const char* stage) {
+  refuse(Reason::kTruncated, stage);
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_HEADER);
+  return TAVIRPELO_FORMAT_UNKNOWN;
+}
+
+}  // namespace pelo

@@ -1,0 +1,11 @@
+// The head of a JPEG file as format detection reads it.
+#pragma once
+
+#include "codec/formats/format.h"
+
+namespace pelo::jpeg {
+
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+
+}  // namespace pelo::jpeg
