@@ -1,0 +1,86 @@
+// Averages of two by two samples, by which pictures are resized: output k of T along an axis draws on the inputs
+// floor((S/4 + k * S) / T) and floor((3*S/4 + k * S) / T) of S, a quarter and three quarters of the way through
+// its span; of the four crossings the mean is taken.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "codec/base/axis_stepper.h"
+#include "codec/base/os_memory.h"
+
+namespace pelo {
+
+// What is added to k * S before the division by T.
+struct Phases {
+  int64_t first, second;
+};
+constexpr Phases quarter_phases(int64_t inputs) {
+  return {inputs / 4, 3 * inputs / 4};
+}
+
+// The two inputs of each output along an axis, from output `from` on.
+class QuarterPoints {
+ public:
+  QuarterPoints(int64_t inputs, int64_t outputs, Phases phases, int64_t from = 0)
+      : first_(inputs, outputs, phases.first + from * inputs),
+        second_(inputs, outputs, phases.second + from * inputs) {}
+  QuarterPoints(int64_t inputs, int64_t outputs)
+      : QuarterPoints(inputs, outputs, quarter_phases(inputs)) {}
+
+  int64_t first() const { return first_.position(); }
+  int64_t second() const { return second_.position(); }
+  void advance() {
+    first_.advance();
+    second_.advance();
+  }
+
+ private:
+  AxisStepper first_, second_;
+};
+
+// One output row while it is gathered: opened by the input row with its quarter point, closed by the row with
+// its three-quarter point, which may be the same row. The column table is made once.
+//
+// Lanes says how a sample is packed: Word holds the sum of four, and word(row, column) is one sample of an input
+// row of type Row. Column is wide enough for an input column.
+template <class Lanes, class Column>
+class QuadSampler {
+ public:
+  using Word = typename Lanes::Word;
+  using Row = typename Lanes::Row;
+
+  // For rows of `inputs` samples to `outputs` words, both at least 1; false when memory is short.
+  [[nodiscard]] bool prepare(int64_t inputs, int64_t outputs) {
+    const auto count = static_cast<size_t>(outputs);
+    if (!columns_.allocate(2 * count) || !words_.allocate(count)) return false;
+    QuarterPoints points(inputs, outputs);
+    for (size_t k = 0; k < count; ++k, points.advance()) {
+      columns_[2 * k] = static_cast<Column>(points.first());
+      columns_[2 * k + 1] = static_cast<Column>(points.second());
+    }
+    return true;
+  }
+
+  void open(const Row& row) { take<false>(row); }
+  void close(const Row& row) { take<true>(row); }
+
+  const Word* words() const { return words_.data(); }
+
+ private:
+  template <bool Add>
+  void take(const Row& row) {
+    const Column* __restrict columns = columns_.data();
+    Word* __restrict words = words_.data();
+    const size_t count = words_.size();
+    for (size_t k = 0; k < count; ++k) {
+      const Word sum = Lanes::word(row, columns[2 * k]) + Lanes::word(row, columns[2 * k + 1]);
+      words[k] = Add ? words[k] + sum : sum;
+    }
+  }
+
+  OsBuffer<Column> columns_;  // pairs
+  OsBuffer<Word> words_;
+};
+
+}  // namespace pelo
