@@ -1,13 +1,13 @@
 // Pixels over pixels: blending by alpha, and copying under a mask.
+#include "codec/pixel/blend.h"
+
 #include <cstring>
 
-#include "codec/base/errors.h"
 #include "codec/base/byte_order.h"
-#include "codec/pixel/blend.h"
-#include "tavirpelo/raw.h"
+#include "codec/base/errors.h"
+#include "codec/image/image.h"
 
-using namespace pelo;
-
+namespace pelo {
 namespace {
 
 // A source pixel over a destination pixel.
@@ -38,38 +38,37 @@ void blend_rows(const uint8_t* src, uint8_t* dst, ptrdiff_t width, ptrdiff_t hei
   }
 }
 
-int refuse(int code) {
+int refuse_with(int code) {
   record_error(ErrorWord::kCodec, code);
   return 0;
 }
 
 }  // namespace
 
-int TAVIRPELO_CODEC_Blend(const void* src, void* dst, int srcWidth, int srcHeight, int dstWidth,
-                          int dstHeight, int x, int y, int format) {
-  if (src == nullptr || dst == nullptr) return refuse(TAVIRPELO_CODEC_ARGUMENT);
+int blend(const void* src, void* dst, Size source, Size target, int x, int y, int format) {
+  if (src == nullptr || dst == nullptr) return refuse_with(TAVIRPELO_CODEC_ARGUMENT);
   if (format != TAVIRPELO_ARGB8888 && format != TAVIRPELO_RGB565A8)
-    return refuse(TAVIRPELO_CODEC_FORMAT);
-  const bool inside = x >= 0 && y >= 0 && srcWidth > 0 && srcHeight > 0 && dstWidth > 0 &&
-                      dstHeight > 0 && int64_t{x} + srcWidth <= dstWidth &&
-                      int64_t{y} + srcHeight <= dstHeight;
-  if (!inside) return refuse(TAVIRPELO_CODEC_SIZE);
-  const auto blend = format == TAVIRPELO_RGB565A8 ? blend_rows<Rgb565A8> : blend_rows<ColourAlpha>;
-  blend(static_cast<const uint8_t*>(src), static_cast<uint8_t*>(dst), srcWidth, srcHeight, dstWidth, x,
-        y);
+    return refuse_with(TAVIRPELO_CODEC_FORMAT);
+  const bool inside = x >= 0 && y >= 0 && source.width > 0 && source.height > 0 && target.width > 0 &&
+                      target.height > 0 && int64_t{x} + source.width <= target.width &&
+                      int64_t{y} + source.height <= target.height;
+  if (!inside) return refuse_with(TAVIRPELO_CODEC_SIZE);
+  const auto rows = format == TAVIRPELO_RGB565A8 ? blend_rows<Rgb565A8> : blend_rows<ColourAlpha>;
+  rows(static_cast<const uint8_t*>(src), static_cast<uint8_t*>(dst), source.width, source.height,
+       target.width, x, y);
   return 1;
 }
 
-int Tavir_Clipping(const void* src, void* dst, const uint8_t* mask, int strideBytes, int width,
-                   int height) {
-  if (src == nullptr || dst == nullptr || mask == nullptr) return 1;
+void copy_masked(const void* src, void* dst, const uint8_t* mask, int strideBytes, Size size) {
+  if (src == nullptr || dst == nullptr || mask == nullptr) return;
   const auto* in = static_cast<const uint8_t*>(src);
   auto* out = static_cast<uint8_t*>(dst);
-  for (ptrdiff_t y = 0; y < height; ++y) {
-    for (ptrdiff_t x = 0; x < width; ++x) {
-      if (mask[y * width + x] != 0)
+  for (ptrdiff_t y = 0; y < size.height; ++y) {
+    for (ptrdiff_t x = 0; x < size.width; ++x) {
+      if (mask[y * size.width + x] != 0)
         std::memcpy(out + y * strideBytes + 4 * x, in + y * strideBytes + 4 * x, 4);
     }
   }
-  return 1;
 }
+
+}  // namespace pelo

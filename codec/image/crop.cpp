@@ -5,6 +5,7 @@
 #include <climits>
 
 #include "codec/base/errors.h"
+#include "codec/image/scale.h"
 
 namespace pelo {
 namespace {
@@ -42,7 +43,8 @@ void scale_into(const uint8_t* region, Size size, int stride, void* dst, Size bo
     const ptrdiff_t x = (box.width - out.width) >> 1, y = (box.height - out.height) >> 1;
     start += (x + y * box.width) * 2;
   }
-  PELO_Scale_ex(region, size.width, size.height, stride, start, out.width, out.height, box.width);
+  scale565({{region, size.width, size.height, ptrdiff_t{stride} * 2},
+            {start, out.width, out.height, ptrdiff_t{box.width} * 2}});
 }
 
 bool inside(const TAVIRPELO_CROPRECT& rect) {

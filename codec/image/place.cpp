@@ -4,12 +4,11 @@
 #include <cstring>
 
 #include "codec/base/errors.h"
-#include "codec/image/scale.h"
+#include "codec/image/image.h"
 #include "codec/image/resample.h"
-#include "tavirpelo/raw.h"
+#include "codec/image/scale.h"
 
-using namespace pelo;
-
+namespace pelo {
 namespace {
 
 enum Anchor { kCentre = 0, kLeftTop = 1, kRightTop = 2, kLeftBottom = 3, kRightBottom = 4 };
@@ -60,8 +59,8 @@ struct QuarterSamples {
 
 template <size_t Bytes>
 void add_average(const SourceArea& source, const TargetArea& target) {
-  resample_average<QuarterSamples<Bytes>>(source, target, average_phases(source.width),
-                                          average_phases(source.height), QuarterSamples<Bytes>::add);
+  resample_average<QuarterSamples<Bytes>>(source, target, quarter_phases(source.width),
+                                          quarter_phases(source.height), QuarterSamples<Bytes>::add);
 }
 
 template <size_t Bytes>
@@ -71,8 +70,8 @@ void pick_nearest(const SourceArea& source, const TargetArea& target) {
 }
 
 void average565(const SourceArea& source, const TargetArea& target) {
-  resample_average<Word565>(source, target, average_phases(source.width), average_phases(source.height),
-                            PELO_WriteOutputBuf);
+  resample_average<Word565>(source, target, quarter_phases(source.width), quarter_phases(source.height),
+                            write_averages565);
 }
 
 using Kernel = void (*)(const SourceArea&, const TargetArea&);
@@ -92,23 +91,23 @@ const Format* find_format(int code) {
   return nullptr;
 }
 
-int refuse(int code) {
+int refuse_with(int code) {
   record_error(ErrorWord::kCodec, code);
   return 0;
 }
 
 }  // namespace
 
-int TAVIRPELO_CODEC_Scale(const void* src, void* dst, int srcWidth, int srcHeight, int srcStride,
-                          int dstWidth, int dstHeight, int dstStride, int scaledWidth, int scaledHeight,
-                          int format, int anchor, int quality) {
-  if (src == nullptr || dst == nullptr) return refuse(TAVIRPELO_CODEC_ARGUMENT);
+int scale_anchored(const ScaleRequest& request) {
+  const auto& [src, dst, srcWidth, srcHeight, srcStride, dstWidth, dstHeight, dstStride, scaledWidth,
+               scaledHeight, format, anchor, quality] = request;
+  if (src == nullptr || dst == nullptr) return refuse_with(TAVIRPELO_CODEC_ARGUMENT);
   for (const int size : {srcWidth, srcHeight, srcStride, dstWidth, dstHeight, dstStride}) {
-    if (size < 1) return refuse(TAVIRPELO_CODEC_ARGUMENT);
+    if (size < 1) return refuse_with(TAVIRPELO_CODEC_ARGUMENT);
   }
   const Format* layout = find_format(format);
   if (quality < 0 || quality > 1 || anchor < kCentre || anchor > kRightBottom || layout == nullptr) {
-    return refuse(TAVIRPELO_CODEC_FORMAT);
+    return refuse_with(TAVIRPELO_CODEC_FORMAT);
   }
   if (scaledWidth < 1 || scaledHeight < 1) return 0;
 
@@ -128,3 +127,5 @@ int TAVIRPELO_CODEC_Scale(const void* src, void* dst, int srcWidth, int srcHeigh
   layout->byQuality[quality](source, target);
   return 1;
 }
+
+}  // namespace pelo

@@ -1,7 +1,8 @@
 // Resampling of packed pixels between two areas of memory: the one loop under every scaling operation.
 //
-// Output j of T along an axis draws on input floor((q + j * S) / T) of S: q = S/2 for the nearest
-// sample, S/4 and 3*S/4 for the two of an average.
+// Nearest samples stand under the middle of each output's span; averages take the two by two of
+// codec/pixel/quad_sampler.h. Scaling must not fail for want of memory, so positions and sums are kept
+// for a run of columns at a time.
 #pragma once
 
 #include <algorithm>
@@ -10,6 +11,7 @@
 #include <utility>
 
 #include "codec/base/axis_stepper.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo {
 
@@ -24,14 +26,6 @@ struct TargetArea {
   int width, height;
   ptrdiff_t stride;
 };
-
-// Where the samples of an average stand, as inputs a third of the way apart: q of each.
-struct Phases {
-  int first, second;
-};
-constexpr Phases average_phases(int inputs) {
-  return {inputs / 4, static_cast<int>(int64_t{3} * inputs / 4)};
-}
 
 constexpr int kResampleRun = 256;  // output columns whose sample positions are kept at a time
 
@@ -78,24 +72,22 @@ class RowSums {
 template <class Pixel, class Finish>
 void resample_average(const SourceArea& source, const TargetArea& target, Phases across, Phases down,
                       Finish finish) {
-  AxisStepper first(source.width, target.width, across.first);
-  AxisStepper second(source.width, target.width, across.second);
+  QuarterPoints columns(source.width, target.width, across);
   for (int begin = 0; begin < target.width; begin += kResampleRun) {
     const int count = std::min(kResampleRun, target.width - begin);
     ptrdiff_t a[kResampleRun], b[kResampleRun];
-    for (int i = 0; i < count; ++i, first.advance(), second.advance()) {
-      a[i] = static_cast<ptrdiff_t>(first.position()) * Pixel::kBytes;
-      b[i] = static_cast<ptrdiff_t>(second.position()) * Pixel::kBytes;
+    for (int i = 0; i < count; ++i, columns.advance()) {
+      a[i] = static_cast<ptrdiff_t>(columns.first()) * Pixel::kBytes;
+      b[i] = static_cast<ptrdiff_t>(columns.second()) * Pixel::kBytes;
     }
-    AxisStepper upper(source.height, target.height, down.first);
-    AxisStepper lower(source.height, target.height, down.second);
+    QuarterPoints rows(source.height, target.height, down);
     RowSums<Pixel> sums[2];
     RowSums<Pixel>*top = &sums[0], *bottom = &sums[1];
-    for (int y = 0; y < target.height; ++y, upper.advance(), lower.advance()) {
-      const auto topRow = static_cast<ptrdiff_t>(upper.position());
+    for (int y = 0; y < target.height; ++y, rows.advance()) {
+      const auto topRow = static_cast<ptrdiff_t>(rows.first());
       if (bottom->row() == topRow) std::swap(top, bottom);
       top->take(source, topRow, a, b, count);
-      bottom->take(source, static_cast<ptrdiff_t>(lower.position()), a, b, count);
+      bottom->take(source, static_cast<ptrdiff_t>(rows.second()), a, b, count);
       uint32_t words[kResampleRun];
       for (int i = 0; i < count; ++i) words[i] = (*top)[i] + (*bottom)[i];
       finish(words, target.first + y * target.stride + begin * Pixel::kBytes, count);

@@ -3,9 +3,9 @@
 #include <cmath>
 #include <cstring>
 
-#include "codec/base/errors.h"
-#include "tavirpelo/raw.h"
+#include "codec/image/image.h"
 
+namespace pelo {
 namespace {
 
 constexpr double kPi = 3.1415926535;  // as many digits as the positions are defined with
@@ -26,7 +26,7 @@ Walk walk_of(double width, double height, int degrees) {
 }
 
 template <size_t Bytes>
-void rotate(const TAVIRPELO_RAWINFO& raw, uint8_t* out, int degrees) {
+void rotate_pixels(const TAVIRPELO_RAWINFO& raw, uint8_t* out, int degrees) {
   const auto* in = static_cast<const uint8_t*>(raw.pData);
   const Walk walk = walk_of(raw.width, raw.height, degrees);
   const int64_t width = raw.width, height = raw.height;
@@ -42,28 +42,21 @@ void rotate(const TAVIRPELO_RAWINFO& raw, uint8_t* out, int degrees) {
 
 }  // namespace
 
-int elo_codec_rotation(const TAVIRPELO_RAWINFO* raw, void* dst, int degrees) {
+void rotate(const TAVIRPELO_RAWINFO& raw, void* dst, int degrees) {
   auto* out = static_cast<uint8_t*>(dst);
-  switch (raw->format) {
+  switch (raw.format) {
     case TAVIRPELO_RGB565:
-      rotate<2>(*raw, out, degrees);
+      rotate_pixels<2>(raw, out, degrees);
       break;
     case TAVIRPELO_RGB888:
-      rotate<3>(*raw, out, degrees);
+      rotate_pixels<3>(raw, out, degrees);
       break;
     case TAVIRPELO_RGBA8888:
-      rotate<4>(*raw, out, degrees);
+      rotate_pixels<4>(raw, out, degrees);
       break;
     default:
       break;
   }
-  return 1;
 }
 
-int TAVIRPELO_CODEC_Rotation(const TAVIRPELO_RAWINFO* raw, void* dst, int degrees) {
-  if (dst == nullptr || raw == nullptr || raw->pData == nullptr) {
-    pelo::record_error(pelo::ErrorWord::kCodec, TAVIRPELO_CODEC_ARGUMENT);
-    return 0;
-  }
-  return elo_codec_rotation(raw, dst, degrees);
-}
+}  // namespace pelo

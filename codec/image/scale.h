@@ -1,22 +1,33 @@
-// Packing of finished accumulator words into rows of pixels; the scaling functions themselves are public
-// (tavirpelo/raw.h).
+// The scaling family on RGB565 and RGB888 pictures, and how the averages are packed.
 #pragma once
 
 #include <cstddef>
 #include <cstdint>
 
 #include "codec/base/byte_order.h"
+#include "codec/image/resample.h"
 #include "codec/pixel/lanes.h"
-#include "tavirpelo/api.h"
+
+namespace pelo {
+
+// Areas without pixels, or of no size, are left alone.
+struct Scaling {
+  SourceArea source;
+  TargetArea target;
+};
+
+void scale565(const Scaling& s);  // averages; enlarges when a side grows, else reduces
+void enlarge565(const Scaling& s);
+void reduce565(const Scaling& s);
+void scale888(const Scaling& s);  // averages
+void pick565(const Scaling& s);   // nearest samples
 
 // `count` words, each the sum of four RGB565 pixels (red from bit 23, green from bit 12, blue from bit
 // 3), to the average pixels.
-TAVIRPELO_API void PELO_WriteOutputBuf(const uint32_t* words, void* output, int count);
+void write_averages565(const uint32_t* words, uint8_t* out, int count);
 
 // The same of RGB888 pixels in 10-bit lanes (red from bit 20, green from 10, blue from 0).
-TAVIRPELO_API void PELO_WriteRGB888OutputBuf(const uint32_t* words, void* output, int count);
-
-namespace pelo {
+void write_averages888(const uint32_t* words, uint8_t* out, int count);
 
 // How a pixel becomes a word whose lanes hold the sum of four.
 struct Word565 {

@@ -1,6 +1,6 @@
-// Averages of two by two samples, by which pictures are resized: output k of T along an axis draws on the inputs
-// floor((S/4 + k * S) / T) and floor((3*S/4 + k * S) / T) of S, a quarter and three quarters of the way through
-// its span; of the four crossings the mean is taken.
+// Averages of two by two samples, by which pictures are resized: output k of T along an axis draws on
+// the inputs floor((S/4 + k * S) / T) and floor((3*S/4 + k * S) / T) of S, a quarter and three quarters
+// of the way through its span; of the four crossings the mean is taken.
 #pragma once
 
 #include <cstddef>
@@ -39,11 +39,11 @@ class QuarterPoints {
   AxisStepper first_, second_;
 };
 
-// One output row while it is gathered: opened by the input row with its quarter point, closed by the row with
-// its three-quarter point, which may be the same row. The column table is made once.
+// One output row while it is gathered: opened by the input row with its quarter point, closed by the row
+// with its three-quarter point, which may be the same row. The column table is made once.
 //
-// Lanes says how a sample is packed: Word holds the sum of four, and word(row, column) is one sample of an input
-// row of type Row. Column is wide enough for an input column.
+// Lanes says how a sample is packed: Word holds the sum of four, and word(row, column) is one sample of
+// an input row of type Row. Column is wide enough for an input column.
 template <class Lanes, class Column>
 class QuadSampler {
  public:

@@ -3,10 +3,10 @@
 #include <algorithm>
 
 #include "codec/base/byte_order.h"
+#include "codec/image/scale.h"
 #include "codec/pixel/fill.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/view.h"
-#include "tavirpelo/raw.h"
 
 namespace pelo::zoom {
 namespace {
@@ -38,11 +38,14 @@ void fill_display(void* display, int width, int height, const uint8_t* pixel, si
 }  // namespace
 
 void scale_to(const Pixels& source, void* target, Size size, int stride, int format, Quality quality) {
-  const auto scaler = format == TAVIRPELO_RGB888     ? PELO_RGB888Scale_ex
-                      : quality == Quality::kNearest ? PELO_FastScale_ex
-                                                     : PELO_Scale_ex;
-  scaler(source.first, source.size.width, source.size.height, source.stride, target, size.width,
-         size.height, stride);
+  const ptrdiff_t bytes = bytes_per_pixel(format);
+  const Scaling scaling{{static_cast<const uint8_t*>(source.first), source.size.width,
+                         source.size.height, source.stride * bytes},
+                        {static_cast<uint8_t*>(target), size.width, size.height, stride * bytes}};
+  const auto scale = format == TAVIRPELO_RGB888     ? scale888
+                     : quality == Quality::kNearest ? pick565
+                                                    : scale565;
+  scale(scaling);
 }
 
 void fill(const Display& display, int format, uint32_t colour) {
