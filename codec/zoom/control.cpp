@@ -4,10 +4,9 @@
 #include "codec/zoom/draw.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/view.h"
+#include "codec/zoom/zoom.h"
 
-using namespace pelo;
-using namespace pelo::zoom;
-
+namespace pelo::zoom {
 namespace {
 
 // Finds the zoom, takes a step, step(zoom), and draws the view.
@@ -39,15 +38,13 @@ int control_view(TAVIRPELO_ZOOMINFO& zoom, Size display, int control) {
 
 }  // namespace
 
-int TAVIRPELO_ControlZoom(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height,
-                          int control) {
+int control(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int control) {
   return act(decInfo, {display, {width, height}}, kControlMessages, [=](TAVIRPELO_ZOOMINFO& zoom) {
     return control_view(zoom, {width, height}, control);
   });
 }
 
-int PELO_ZoomRatioEx(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int ratio,
-                     int fast) {
+int zoom_ratio(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int ratio, int fast) {
   return act(
       decInfo, {display, {width, height}}, kRatioMessages,
       [=](TAVIRPELO_ZOOMINFO& zoom) {
@@ -56,17 +53,7 @@ int PELO_ZoomRatioEx(TAVIRPELO_DECINFO* decInfo, void* display, int width, int h
       fast != 0 ? Quality::kNearest : Quality::kAverage);
 }
 
-int TAVIRPELO_ZoomRatio(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int ratio) {
-  return PELO_ZoomRatioEx(decInfo, display, width, height, ratio, 0);
-}
-
-int TAVIRPELO_FastZoomRatio(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height,
-                            int ratio) {
-  return PELO_ZoomRatioEx(decInfo, display, width, height, ratio, 1);
-}
-
-int PELO_PanPositionEx(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int x, int y,
-                       int fast) {
+int pan(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int x, int y, int fast) {
   return act(
       decInfo, {display, {width, height}}, kControlMessages,
       [=](TAVIRPELO_ZOOMINFO& zoom) {
@@ -76,18 +63,7 @@ int PELO_PanPositionEx(TAVIRPELO_DECINFO* decInfo, void* display, int width, int
       fast != 0 ? Quality::kNearest : Quality::kAverage);
 }
 
-int TAVIRPELO_PanPosition(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int x,
-                          int y) {
-  return PELO_PanPositionEx(decInfo, display, width, height, x, y, 0);
-}
-
-int TAVIRPELO_FastPanPosition(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int x,
-                              int y) {
-  return PELO_PanPositionEx(decInfo, display, width, height, x, y, 1);
-}
-
-int TAVIRPELO_JumpZoom(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height,
-                       const int target[3]) {
+int jump_to(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, const int target[3]) {
   return act(decInfo, {display, {width, height}}, kJumpMessages, [=](TAVIRPELO_ZOOMINFO& zoom) {
     if (target == nullptr) return fail(TAVIRPELO_ERROR_NULL);
     jump(zoom, {width, height}, target[0], target[1], target[2]);
@@ -95,15 +71,15 @@ int TAVIRPELO_JumpZoom(TAVIRPELO_DECINFO* decInfo, void* display, int width, int
   });
 }
 
-int TAVIRPELO_SetDisplayOnPosition(TAVIRPELO_DECINFO* decInfo, void* display, int, int width, int height,
-                                   int dx, int dy) {
+int shift_display(TAVIRPELO_DECINFO* decInfo, void* display, int, int width, int height, int dx,
+                  int dy) {
   return act(decInfo, {display, {width, height}}, kControlMessages, [=](TAVIRPELO_ZOOMINFO& zoom) {
     return refresh_view(zoom, int64_t{zoom.viewX} + dx, int64_t{zoom.viewY} + dy);
   });
 }
 
-int TAVIRPELO_SetMapOnPosition(TAVIRPELO_DECINFO* decInfo, void* display, const int mapSize[2],
-                               int width, int height, int x, int y) {
+int centre_on_map(TAVIRPELO_DECINFO* decInfo, void* display, const int mapSize[2], int width, int height,
+                  int x, int y) {
   return act(decInfo, {display, {width, height}}, kControlMessages, [=](TAVIRPELO_ZOOMINFO& zoom) {
     if (mapSize == nullptr || mapSize[0] < 1 || mapSize[1] < 1) return fail(TAVIRPELO_ERROR_NULL);
     Position source;
@@ -114,3 +90,5 @@ int TAVIRPELO_SetMapOnPosition(TAVIRPELO_DECINFO* decInfo, void* display, const 
     return result;
   });
 }
+
+}  // namespace pelo::zoom

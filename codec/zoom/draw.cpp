@@ -7,6 +7,7 @@
 #include "codec/pixel/fill.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/view.h"
+#include "codec/zoom/zoom.h"
 
 namespace pelo::zoom {
 namespace {
@@ -72,27 +73,25 @@ void draw(const TAVIRPELO_ZOOMINFO& zoom, const Display& display, Quality qualit
   }
 }
 
-}  // namespace pelo::zoom
-
-using namespace pelo::zoom;
-
-int PELO_MakeDisplay(const TAVIRPELO_ZOOMINFO* zoom, void* display, int width, int height, int fast) {
+int make_display(const TAVIRPELO_ZOOMINFO* zoom, void* display, int width, int height, int fast) {
   return draw_view(zoom, {display, {width, height}}, TAVIRPELO_RGB565,
                    fast != 0 ? Quality::kNearest : Quality::kAverage);
 }
 
-int PELO_MakeRGB888Display(const TAVIRPELO_ZOOMINFO* zoom, void* display, int width, int height) {
+int make_rgb888_display(const TAVIRPELO_ZOOMINFO* zoom, void* display, int width, int height) {
   return draw_view(zoom, {display, {width, height}}, TAVIRPELO_RGB888, Quality::kAverage);
 }
 
-void PELO_SetOutBuff(void* display, int width, int height, uint32_t colour) {
+void fill565(void* display, int width, int height, uint32_t colour) {
   uint8_t pixel[2];
   pelo::store_le16(pixel, colour);
   fill_display(display, width, height, pixel, sizeof pixel);
 }
 
-void PELO_SetRGB888OutBuff(void* display, int width, int height, uint32_t colour) {
+void fill888(void* display, int width, int height, uint32_t colour) {
   const uint8_t pixel[3] = {static_cast<uint8_t>(colour >> 16), static_cast<uint8_t>(colour >> 8),
                             static_cast<uint8_t>(colour)};
   fill_display(display, width, height, pixel, sizeof pixel);
 }
+
+}  // namespace pelo::zoom

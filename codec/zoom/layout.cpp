@@ -5,6 +5,7 @@
 #include <cstdlib>
 
 #include "codec/base/dec_ratio.h"
+#include "codec/zoom/zoom.h"
 
 namespace pelo::zoom {
 namespace {
@@ -88,12 +89,12 @@ int64_t memory_requirement(Size picture, int64_t side, int bytes) {
   return int64_t{fitted.width} * fitted.height * bytes + kDecoderBytes;
 }
 
-}  // namespace pelo::zoom
-
-void PELO_CheckInvalidSize(TAVIRPELO_ZOOMINFO* zoom) {
+void raise_empty_sides(TAVIRPELO_ZOOMINFO* zoom) {
   if (zoom == nullptr) return;
   for (int32_t* side : {&zoom->imageWidth, &zoom->imageHeight, &zoom->zoomedWidth, &zoom->zoomedHeight,
                         &zoom->viewWidth, &zoom->viewHeight}) {
     if (*side == 0) *side = 1;
   }
 }
+
+}  // namespace pelo::zoom

@@ -4,10 +4,9 @@
 #include "codec/zoom/layout.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/view.h"
+#include "codec/zoom/zoom.h"
 
-using namespace pelo;
-using namespace pelo::zoom;
-
+namespace pelo::zoom {
 namespace {
 
 constexpr int kStepsAround = 40;  // zoom steps that a memory requirement adds to the display's width
@@ -24,7 +23,7 @@ int answer(TAVIRPELO_DECINFO* decInfo, int* result, Value value) {
 
 }  // namespace
 
-int TAVIRPELO_GetMapOnArea(TAVIRPELO_DECINFO* decInfo, int mapWidth, int mapHeight, int area[6]) {
+int map_area(TAVIRPELO_DECINFO* decInfo, int mapWidth, int mapHeight, int area[6]) {
   const TAVIRPELO_ZOOMINFO* zoom = begin(decInfo, kControlMessages);
   if (zoom == nullptr) return 0;
   if (area == nullptr || mapWidth < 1 || mapHeight < 1) return fail(TAVIRPELO_ERROR_NULL);
@@ -38,7 +37,7 @@ int TAVIRPELO_GetMapOnArea(TAVIRPELO_DECINFO* decInfo, int mapWidth, int mapHeig
   return 1;
 }
 
-int TAVIRPELO_GetZoomStatus(TAVIRPELO_DECINFO* decInfo, int* x, int* y, int* ratio) {
+int status(TAVIRPELO_DECINFO* decInfo, int* x, int* y, int* ratio) {
   const TAVIRPELO_ZOOMINFO* zoom = begin(decInfo, kControlMessages);
   if (zoom == nullptr) return 0;
   if (x != nullptr) *x = zoom->viewX;
@@ -47,20 +46,20 @@ int TAVIRPELO_GetZoomStatus(TAVIRPELO_DECINFO* decInfo, int* x, int* y, int* rat
   return 1;
 }
 
-int TAVIRPELO_GetMaxZoomLevel(TAVIRPELO_DECINFO* decInfo, int* level) {
+int top_level(TAVIRPELO_DECINFO* decInfo, int* level) {
   return answer(decInfo, level, max_level);
 }
 
-int TAVIRPELO_GetMaxZoomRatio(TAVIRPELO_DECINFO* decInfo, int* ratio) {
+int top_ratio(TAVIRPELO_DECINFO* decInfo, int* ratio) {
   return answer(decInfo, ratio, max_ratio);
 }
 
-void* TAVIRPELO_GetZoomBuffer(TAVIRPELO_DECINFO* decInfo) {
+void* buffer(TAVIRPELO_DECINFO* decInfo) {
   const TAVIRPELO_ZOOMINFO* zoom = begin(decInfo, kControlMessages);
   return zoom == nullptr ? nullptr : zoom->pZoomImage;
 }
 
-int TAVIRPELO_SetZoomScale(TAVIRPELO_DECINFO* decInfo, int scale) {
+int set_scale(TAVIRPELO_DECINFO* decInfo, int scale) {
   TAVIRPELO_ZOOMINFO* zoom = begin(decInfo, kControlMessages);
   if (zoom == nullptr) return 0;
   if (scale < 1) return fail("TAVIRPELO_SetZoomScale : invalid set!");
@@ -70,7 +69,7 @@ int TAVIRPELO_SetZoomScale(TAVIRPELO_DECINFO* decInfo, int scale) {
 
 // A picture that lies on its side takes the same part of a square, so the display's height, and with it
 // the rotation, does not matter. While a zoom is active its task may be reading the source.
-int TAVIRPELO_GetZoomMemRequirement(TAVIRPELO_DECINFO* decInfo, int displayWidth, int) {
+int needed_memory(TAVIRPELO_DECINFO* decInfo, int displayWidth, int) {
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) return fail(kControlMessages.noObject, TAVIRPELO_ERROR_NULL);
   if (!zoomable(decInfo->outFormat)) return -1;
@@ -85,3 +84,5 @@ int TAVIRPELO_GetZoomMemRequirement(TAVIRPELO_DECINFO* decInfo, int displayWidth
   const int64_t side = displayWidth + kStepsAround * int64_t{step};
   return static_cast<int>(memory_requirement(picture, side, bytes_per_pixel(decInfo->outFormat)));
 }
+
+}  // namespace pelo::zoom

@@ -2,9 +2,9 @@
 #include "codec/zoom/draw.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/task.h"
+#include "codec/zoom/zoom.h"
 
-using namespace pelo::zoom;
-
+namespace pelo::zoom {
 namespace {
 
 // One polling state serves every zoom of the process.
@@ -21,7 +21,7 @@ void wait_for_decode(TAVIRPELO_ZOOMINFO& zoom) {
 
 }  // namespace
 
-int TAVIRPELO_RefreshZoom(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height) {
+int refresh(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height) {
   TAVIRPELO_ZOOMINFO* zoom = begin(decInfo, kRefreshMessages);
   if (zoom == nullptr) return 0;
   const Display target{display, {width, height}};
@@ -42,3 +42,5 @@ int TAVIRPELO_RefreshZoom(TAVIRPELO_DECINFO* decInfo, void* display, int width, 
   }
   return 1;
 }
+
+}  // namespace pelo::zoom

@@ -1,9 +1,10 @@
 // Finding an object's picture and zoom, and ending the zoom.
-#include "codec/base/errors.h"
 #include "codec/zoom/session.h"
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/zoom/task.h"
+#include "codec/zoom/zoom.h"
 
 namespace pelo::zoom {
 
@@ -48,11 +49,7 @@ void end_zoom(TAVIRPELO_DECINFO& decInfo) {
   decInfo.CheckFn = TAVIRPELO_CheckFn;
 }
 
-}  // namespace pelo::zoom
-
-using namespace pelo;
-
-int TAVIRPELO_StopZoom(TAVIRPELO_DECINFO* decInfo) {
+int stop(TAVIRPELO_DECINFO* decInfo) {
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) {
     return pelo::zoom::fail("TAVIRPELO_StopZoom : TAVIRPELO_DECINFO is null!", TAVIRPELO_ERROR_NULL);
@@ -61,3 +58,5 @@ int TAVIRPELO_StopZoom(TAVIRPELO_DECINFO* decInfo) {
   pelo::zoom::end_zoom(*decInfo);
   return 1;
 }
+
+}  // namespace pelo::zoom

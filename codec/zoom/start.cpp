@@ -1,19 +1,19 @@
 // Starting a zoom: state and buffers, then the first view from a decode or from the caller's preview.
 #include <algorithm>
 
+#include "codec/base/checked.h"
 #include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
-#include "codec/base/checked.h"
 #include "codec/base/os_memory.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/draw.h"
 #include "codec/zoom/layout.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/task.h"
+#include "codec/zoom/zoom.h"
 #include "tavirpelo/decode.h"
 
-using namespace pelo;
-using namespace pelo::zoom;
+namespace pelo::zoom {
 
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_ZOOMINFO) == 30 * 4);
 static_assert(sizeof(void*) != 4 || offsetof(TAVIRPELO_ZOOMINFO, pZoomImage) == 19 * 4);
@@ -119,8 +119,7 @@ int start_zoom(TAVIRPELO_DECINFO* decInfo, const Start& start, bool withZoomedIm
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo != nullptr && !start.display.usable()) return fail(TAVIRPELO_ERROR_NULL);
   const Size display = start.display.size;
-  if (!PELO_InitZoom(decInfo, display.width, display.height, start.budget, start.zoomFactor,
-                     withZoomedImage)) {
+  if (!init(decInfo, display.width, display.height, start.budget, start.zoomFactor, withZoomedImage)) {
     return fail("TAVIRPELO_StartZoom : PELO_InitZoom Fail");
   }
   TAVIRPELO_ZOOMINFO& zoom = *decInfo->pZoomInfo;
@@ -141,8 +140,8 @@ int start_zoom(TAVIRPELO_DECINFO* decInfo, const Start& start, bool withZoomedIm
 
 }  // namespace
 
-int PELO_InitZoom(TAVIRPELO_DECINFO* decInfo, int displayWidth, int displayHeight, int budget,
-                  int zoomFactor, int withZoomedImage) {
+int init(TAVIRPELO_DECINFO* decInfo, int displayWidth, int displayHeight, int budget, int zoomFactor,
+         int withZoomedImage) {
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) {
     return fail("PELO_InitZoom : TAVIRPELO_DECINFO is null!", TAVIRPELO_ERROR_NULL);
@@ -158,9 +157,9 @@ int PELO_InitZoom(TAVIRPELO_DECINFO* decInfo, int displayWidth, int displayHeigh
   return 0;
 }
 
-int TAVIRPELO_StartZoom(TAVIRPELO_DECINFO* decInfo, const void* preview, int previewWidth,
-                        int previewHeight, void* display, int displayWidth, int displayHeight,
-                        uint32_t background, int budget, int zoomFactor, int taskPriority) {
+int start(TAVIRPELO_DECINFO* decInfo, const void* preview, int previewWidth, int previewHeight,
+          void* display, int displayWidth, int displayHeight, uint32_t background, int budget,
+          int zoomFactor, int taskPriority) {
   return start_zoom(decInfo,
                     {{preview, {previewWidth, previewHeight}},
                      {display, {displayWidth, displayHeight}},
@@ -171,10 +170,9 @@ int TAVIRPELO_StartZoom(TAVIRPELO_DECINFO* decInfo, const void* preview, int pre
                     false);
 }
 
-int TAVIRPELO_StartZoomWithZoomImage(TAVIRPELO_DECINFO* decInfo, const void* preview, int previewWidth,
-                                     int previewHeight, void* display, int displayWidth,
-                                     int displayHeight, uint32_t background, int budget, int zoomFactor,
-                                     int taskPriority) {
+int start_with_image(TAVIRPELO_DECINFO* decInfo, const void* preview, int previewWidth,
+                     int previewHeight, void* display, int displayWidth, int displayHeight,
+                     uint32_t background, int budget, int zoomFactor, int taskPriority) {
   return start_zoom(decInfo,
                     {{preview, {previewWidth, previewHeight}},
                      {display, {displayWidth, displayHeight}},
@@ -184,3 +182,5 @@ int TAVIRPELO_StartZoomWithZoomImage(TAVIRPELO_DECINFO* decInfo, const void* pre
                      taskPriority},
                     true);
 }
+
+}  // namespace pelo::zoom

@@ -1,6 +1,7 @@
 // The decode task, and a task layer for a platform without tasks.
 #include "codec/zoom/task.h"
 
+#include "codec/zoom/zoom.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::zoom {
@@ -26,11 +27,7 @@ void decode(const TAVIRPELO_TASKMESSAGE& message) {
 TaskLayer taskLayer{TAVIRPELO_CreateTask,     TAVIRPELO_StartTask,   TAVIRPELO_SendMessage,
                     TAVIRPELO_ReceiveMessage, TAVIRPELO_DestroyTask, TAVIRPELO_OsSleep};
 
-}  // namespace pelo::zoom
-
-using namespace pelo::zoom;
-
-void PELO_AsyncDecodeJPEG(void) {
+void run_task(void) {
   for (;;) {
     TAVIRPELO_TASKMESSAGE message{};
     taskLayer.receive(kForever, &message);
@@ -39,18 +36,20 @@ void PELO_AsyncDecodeJPEG(void) {
   }
 }
 
-int TAVIRPELO_CreateTask(int, TAVIRPELO_TASKFN) {
+int create_task(int, TAVIRPELO_TASKFN) {
   return -1;
 }
-int TAVIRPELO_StartTask(int) {
+int start_task(int) {
   return 0;
 }
-int TAVIRPELO_SendMessage(int, const TAVIRPELO_TASKMESSAGE*) {
+int send_message(int, const TAVIRPELO_TASKMESSAGE*) {
   return 0;
 }
-int TAVIRPELO_ReceiveMessage(int, TAVIRPELO_TASKMESSAGE*) {
+int receive_message(int, TAVIRPELO_TASKMESSAGE*) {
   return 0;
 }
-int TAVIRPELO_DestroyTask(int) {
+int destroy_task(int) {
   return 0;
 }
+
+}  // namespace pelo::zoom

@@ -3,10 +3,9 @@
 #include "codec/zoom/draw.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/view.h"
+#include "codec/zoom/zoom.h"
 
-using namespace pelo;
-using namespace pelo::zoom;
-
+namespace pelo::zoom {
 namespace {
 
 // choose(zoom) picks the quality.
@@ -40,23 +39,22 @@ void copy_view(const TAVIRPELO_ZOOMINFO& zoom, const Display& display) {
 
 }  // namespace
 
-int TAVIRPELO_MakeZoomImageLowQuality(TAVIRPELO_DECINFO* decInfo) {
+int render_low(TAVIRPELO_DECINFO* decInfo) {
   return render(decInfo, [](const TAVIRPELO_ZOOMINFO&) { return Quality::kNearest; });
 }
 
-int TAVIRPELO_MakeZoomImageMediumQuality(TAVIRPELO_DECINFO* decInfo) {
+int render_medium(TAVIRPELO_DECINFO* decInfo) {
   return render(decInfo, [](const TAVIRPELO_ZOOMINFO& zoom) {
     const bool muchSmaller = int64_t{3} * zoom.zoomedWidth < int64_t{2} * zoom.imageWidth;
     return muchSmaller ? Quality::kAverage : Quality::kNearest;
   });
 }
 
-int TAVIRPELO_MakeZoomImageHighQuality(TAVIRPELO_DECINFO* decInfo) {
+int render_high(TAVIRPELO_DECINFO* decInfo) {
   return render(decInfo, [](const TAVIRPELO_ZOOMINFO&) { return Quality::kAverage; });
 }
 
-int TAVIRPELO_PanWithZoomImage(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int x,
-                               int y) {
+int pan_rendered(TAVIRPELO_DECINFO* decInfo, void* display, int width, int height, int x, int y) {
   TAVIRPELO_ZOOMINFO* zoom = begin(decInfo, kJumpMessages);
   if (zoom == nullptr) return 0;
   const Display target{display, {width, height}};
@@ -66,3 +64,5 @@ int TAVIRPELO_PanWithZoomImage(TAVIRPELO_DECINFO* decInfo, void* display, int wi
   copy_view(*zoom, target);
   return 1;
 }
+
+}  // namespace pelo::zoom
