@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "codec/formats/jpeg/encoder/encoder_abi.h"
 #include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
 #include "tests/support/jpeg_segments.h"

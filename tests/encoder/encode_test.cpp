@@ -1,4 +1,5 @@
 // The encoder's streams: layout, sizes, growth, edges, and agreement with an independent decoder.
+#include "codec/formats/jpeg/encoder/encoder_abi.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"

@@ -2,8 +2,7 @@
 
 #include "codec/formats/jpeg/encoder/encoder.h"
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 // Room for a stuffed word and what one call adds to it.
@@ -16,7 +15,7 @@ bool close_writer(ELO_ENCODER& encoder, const BitWriter& writer, const SmallBloc
 
 }  // namespace
 
-int __elo_jpeg_enc_write_bits(ELO_ENCODER* encoder, uint32_t code, int length) {
+int write_bits(ELO_ENCODER* encoder, uint32_t code, int length) {
   if (length < 0 || length > 16) return 0;
   SmallBlock block;
   BitWriter writer(encoder->entropy.pending, block.data());
@@ -24,8 +23,8 @@ int __elo_jpeg_enc_write_bits(ELO_ENCODER* encoder, uint32_t code, int length) {
   return close_writer(*encoder, writer, block);
 }
 
-int __elo_jpeg_enc_finish_compression(ELO_ENCODER* encoder) {
-  if (!__elo_jpeg_enc_write_bits(encoder, 0x7F, 7)) return 0;
+int flush_bits(ELO_ENCODER* encoder) {
+  if (!write_bits(encoder, 0x7F, 7)) return 0;
   SmallBlock block;
   BitWriter writer(encoder->entropy.pending, block.data());
   writer.flush_bytes();
@@ -33,3 +32,5 @@ int __elo_jpeg_enc_finish_compression(ELO_ENCODER* encoder) {
   encoder->entropy = {};
   return written;
 }
+
+}  // namespace pelo::jpeg

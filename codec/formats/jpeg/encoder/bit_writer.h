@@ -78,10 +78,10 @@ struct BitWriter {
   }
 };
 
-}  // namespace pelo::jpeg
-
 // Writes the low `length` (0 to 16) bits of `code`; 1, or 0 when the destination cannot take them.
-TAVIRPELO_API int __elo_jpeg_enc_write_bits(ELO_ENCODER* encoder, uint32_t code, int length);
+int write_bits(ELO_ENCODER* encoder, uint32_t code, int length);
 
 // Ends the entropy-coded data: completes the last byte with 1-bits. Nothing pending: writes nothing.
-TAVIRPELO_API int __elo_jpeg_enc_finish_compression(ELO_ENCODER* encoder);
+int flush_bits(ELO_ENCODER* encoder);
+
+}  // namespace pelo::jpeg

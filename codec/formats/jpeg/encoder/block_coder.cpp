@@ -4,8 +4,7 @@
 
 #include "codec/formats/jpeg/encoder/encoder.h"
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 constexpr uint32_t kEndOfBlock = 0x00;
@@ -86,7 +85,7 @@ void code_block(BitWriter& writer, const CoefficientBlock& block, int32_t& lastD
 
 }  // namespace
 
-int __elo_jpeg_enc_encode_1mcu_blk(ELO_ENCODER* encoder, const CoefficientBlock* blocks) {
+int code_mcu(ELO_ENCODER* encoder, const CoefficientBlock* blocks) {
   if (!keep_margin(*encoder->destination, 128 * encoder->mcuBlocks, kDestinationStep)) return 0;
   std::array<uint8_t, kMaxMcuBytes> bytes;
   BitWriter writer(encoder->entropy.pending, bytes.data());
@@ -99,3 +98,5 @@ int __elo_jpeg_enc_encode_1mcu_blk(ELO_ENCODER* encoder, const CoefficientBlock*
   encoder->entropy.pending = writer.pending();
   return append(*encoder->destination, bytes.data(), static_cast<size_t>(writer.next - bytes.data()));
 }
+
+}  // namespace pelo::jpeg

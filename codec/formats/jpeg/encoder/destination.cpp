@@ -1,27 +1,27 @@
 #include "codec/formats/jpeg/encoder/destination.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <climits>
 
 #include "codec/base/checked.h"
+#include "codec/base/errors.h"
 #include "tavirpelo/io.h"
 
-uint8_t* elo_jpeg_enc_realloc(uint8_t* old, int oldSize, int extra) {
+namespace pelo::jpeg {
+
+uint8_t* grow_block(uint8_t* old, int oldSize, int extra) {
   if (oldSize < 0 || extra < 1 || oldSize > INT_MAX - extra) return nullptr;
   const auto size = static_cast<size_t>(oldSize) + static_cast<size_t>(extra);
   return static_cast<uint8_t*>(TAVIRPELO_OsRealloc(old, size));
 }
 
-void elo_SetError(int) {}
-
-namespace pelo::jpeg {
 namespace {
 
 bool grow(ELO_DESTINATION& destination, int extra) {
-  uint8_t* block = elo_jpeg_enc_realloc(destination.buffer, destination.capacity, extra);
+  uint8_t* block = grow_block(destination.buffer, destination.capacity, extra);
   if (block == nullptr) {
-    elo_SetError(kErrorMemory);
-    return false;
+    return refuse(Reason::kNoMemory, "encoder output");
   }
   destination.buffer = block;
   destination.capacity += extra;
@@ -32,8 +32,10 @@ bool flush(ELO_DESTINATION& destination) {
   const auto count = static_cast<size_t>(destination.used);
   const auto total = checked_int(int64_t{destination.total} + destination.used);
   if (!total || destination.file == nullptr) return false;
+  errno = 0;
   if (count != 0 && TAVIRPELO_OsFwrite(destination.buffer, 1, count, destination.file) != count) {
-    return false;
+    const bool full = errno == ENOSPC || errno == EDQUOT || errno == EFBIG;
+    return refuse(full ? Reason::kDiskFull : Reason::kNotWritable, "encoder output");
   }
   destination.total = *total;
   destination.used = 0;

@@ -6,22 +6,13 @@
 
 #include "tavirpelo/encode.h"
 
-// The block moved into one `extra` bytes larger; null, with the old block untouched, when memory is
-// short or the new size exceeds an int.
-TAVIRPELO_API uint8_t* elo_jpeg_enc_realloc(uint8_t* old, int oldSize, int extra);
-
-// Takes the reason of a failure; keeps none.
-TAVIRPELO_API void elo_SetError(int code);
-
 namespace pelo::jpeg {
 
-constexpr int kDestinationStep = 4096;  // growth of a memory block, size of a file's working buffer
+// The block moved into one `extra` bytes larger; null, with the old block untouched, when memory is
+// short or the new size exceeds an int.
+uint8_t* grow_block(uint8_t* old, int oldSize, int extra);
 
-// Reasons given to elo_SetError.
-constexpr int kErrorMemory = 3;
-constexpr int kErrorFormat = 6;
-constexpr int kErrorSampling = 7;
-constexpr int kErrorSize = 14;
+constexpr int kDestinationStep = 4096;  // growth of a memory block, size of a file's working buffer
 
 // Appends `count` bytes, growing or flushing as often as needed: the only way into the buffer.
 [[nodiscard]] bool append(ELO_DESTINATION& destination, const uint8_t* bytes, size_t count);

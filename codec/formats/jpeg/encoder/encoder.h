@@ -84,58 +84,73 @@ struct ELO_ENCODER {
 
 // ---- the steps ----
 
+namespace pelo::jpeg {
+
 // A new state for an image of these sides and format, writing to `destination`, which must outlive it.
 // Without parameters: 4:2:0 (or grey) at the quality of the options. Null on failure.
-TAVIRPELO_API ELO_ENCODER* __elo_jpeg_enc_initiaize(const TAVIRPELO_RAWINFO* image,
-                                                    ELO_DESTINATION* destination,
-                                                    const TAVIRPELO_ENCOPTION* options,
-                                                    const pelo::jpeg::CodingParameters* parameters);
+ELO_ENCODER* make_encoder(const TAVIRPELO_RAWINFO* image, ELO_DESTINATION* destination,
+                          const TAVIRPELO_ENCOPTION* options,
+                          const pelo::jpeg::CodingParameters* parameters);
+
+}  // namespace pelo::jpeg
 
 // The steps below return 1, or 0 when the destination fails.
 
+namespace pelo::jpeg {
+
 // Everything before the entropy-coded data.
-TAVIRPELO_API int __elo_jpeg_enc_make_header(ELO_ENCODER* encoder);
+int write_headers(ELO_ENCODER* encoder);
 
 // Encodes the next MCU row of the image.
-TAVIRPELO_API int __elo_jpeg_enc_process_image_data(ELO_ENCODER* encoder);
+int encode_next_row(ELO_ENCODER* encoder);
 
 // Fills the sample rows of the next MCU row from planes that start at its first row and are packed
 // (component width samples a row); columns and rows beyond the image repeat the last ones.
-TAVIRPELO_API void __elo_jpeg_enc_get_raw_data(ELO_ENCODER* encoder, const uint8_t* const* planes);
+void take_planes(ELO_ENCODER* encoder, const uint8_t* const* planes);
 
 // Transforms and codes the MCU row in the sample buffers, and moves on to the next.
-TAVIRPELO_API int __elo_jpeg_enc_compress_data(ELO_ENCODER* encoder);
+int code_row(ELO_ENCODER* encoder);
 
 // One block of 8 x 8 samples, `stride` bytes from row to row, to quantised coefficients.
-TAVIRPELO_API void __elo_jpeg_enc_do_forward_dct(const uint8_t* samples, ptrdiff_t stride,
-                                                 const pelo::jpeg::QuantiseTable* table,
-                                                 int32_t* coefficients);
+void transform_and_quantise(const uint8_t* samples, ptrdiff_t stride,
+                            const pelo::jpeg::QuantiseTable* table, int32_t* coefficients);
 
 // Codes one MCU of encoder->mcuBlocks blocks. Values beyond what baseline codes can express (AC
 // -1023..1023, DC -1024..1023) are clamped; zig-zag position 63 is never coded.
-TAVIRPELO_API int __elo_jpeg_enc_encode_1mcu_blk(ELO_ENCODER* encoder,
-                                                 const pelo::jpeg::CoefficientBlock* blocks);
+int code_mcu(ELO_ENCODER* encoder, const pelo::jpeg::CoefficientBlock* blocks);
 
 // EOI, and the end of the destination.
-TAVIRPELO_API int __elo_jpeg_enc_make_end_mark(ELO_ENCODER* encoder);
+int write_end_mark(ELO_ENCODER* encoder);
 
 // Frees what the state holds, and a file destination's working buffer; the state itself stays.
-TAVIRPELO_API void __elo_jpeg_enc_release_mem(ELO_ENCODER* encoder);
+void release_buffers(ELO_ENCODER* encoder);
+
+}  // namespace pelo::jpeg
 
 // ---- data that arrives in bands ----
 
+namespace pelo::jpeg {
+
 // Starts an encoding and writes the headers. The image's pixels are not read. Null on failure, with the
 // destination still the caller's.
-TAVIRPELO_API ELO_ENCODER* elo_jpeg_enc_mcu_init(const TAVIRPELO_RAWINFO* image,
-                                                 ELO_DESTINATION* destination,
-                                                 const TAVIRPELO_ENCOPTION* options,
-                                                 const pelo::jpeg::CodingParameters* parameters);
+ELO_ENCODER* begin_bands(const TAVIRPELO_RAWINFO* image, ELO_DESTINATION* destination,
+                         const TAVIRPELO_ENCOPTION* options,
+                         const pelo::jpeg::CodingParameters* parameters);
 
 // Encodes one MCU row from a band of planar 4:2:0 rows: 16 rows of Y, then 8 of Cb at 16 * width bytes
 // and 8 of Cr behind them, chroma rows of (width + 1) / 2. Rows of the last band that lie below the
 // image are not read. Stores the new row position (pixels, the height at the end) unless null; 1 or 0.
-TAVIRPELO_API int elo_jpeg_enc_muc_process(ELO_ENCODER* encoder, const uint8_t* band, int* position);
+int encode_band(ELO_ENCODER* encoder, const uint8_t* band, int* position);
 
 // Ends the image, reports the working buffer and the bytes produced (either may be null), and frees the
 // state. 1 or 0.
-TAVIRPELO_API int elo_jpeg_enc_mcu_finish(ELO_ENCODER* encoder, uint8_t** buffer, int* size);
+int finish_bands(ELO_ENCODER* encoder, uint8_t** buffer, int* size);
+
+// ---- whole images ----
+
+// As elo_enc_jpeg_to_buffer_ex and elo_enc_jpeg_to_file_ex (tavirpelo/encode.h).
+int encode_to_buffer(const TAVIRPELO_RAWINFO* image, uint8_t** buffer, int* size,
+                     const TAVIRPELO_ENCOPTION* options);
+int encode_to_file(const TAVIRPELO_RAWINFO* image, const char* path, const TAVIRPELO_ENCOPTION* options);
+
+}  // namespace pelo::jpeg

@@ -5,8 +5,7 @@
 
 #include "codec/formats/jpeg/encoder/encoder.h"
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 using Plane = std::array<int16_t, 64>;
@@ -86,8 +85,8 @@ inline void quantise(const Plane& plane, const QuantiseTable& table, int32_t* __
 
 }  // namespace
 
-void __elo_jpeg_enc_do_forward_dct(const uint8_t* samples, ptrdiff_t stride, const QuantiseTable* table,
-                                   int32_t* coefficients) {
+void transform_and_quantise(const uint8_t* samples, ptrdiff_t stride, const QuantiseTable* table,
+                            int32_t* coefficients) {
   alignas(16) Plane plane;
   for (size_t y = 0; y < 8; ++y, samples += stride) {
     for (size_t x = 0; x < 8; ++x) plane[x * 8 + y] = samples[x];
@@ -97,3 +96,5 @@ void __elo_jpeg_enc_do_forward_dct(const uint8_t* samples, ptrdiff_t stride, con
   transform_columns(plane, 0);
   quantise(plane, *table, coefficients);
 }
+
+}  // namespace pelo::jpeg

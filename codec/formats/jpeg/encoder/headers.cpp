@@ -4,8 +4,7 @@
 #include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 enum Marker : uint8_t {
@@ -145,13 +144,15 @@ bool write_sos(ELO_ENCODER& encoder) {
 
 }  // namespace
 
-int __elo_jpeg_enc_make_header(ELO_ENCODER* encoder) {
+int write_headers(ELO_ENCODER* encoder) {
   return write_bare(*encoder, kSoi) && write_app0(*encoder) && write_app1(*encoder) &&
          write_quant_tables(*encoder) && write_sof0(*encoder) && write_huffman_tables(*encoder) &&
          write_dri(*encoder) && write_sos(*encoder);
 }
 
-int __elo_jpeg_enc_make_end_mark(ELO_ENCODER* encoder) {
+int write_end_mark(ELO_ENCODER* encoder) {
   return keep_margin(*encoder->destination, 10, 10) && write_bare(*encoder, kEoi) &&
          finish(*encoder->destination);
 }
+
+}  // namespace pelo::jpeg

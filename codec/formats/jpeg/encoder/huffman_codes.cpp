@@ -2,9 +2,9 @@
 
 #include "codec/formats/jpeg/encoder/encoder.h"
 
-using namespace pelo::jpeg;
+namespace pelo::jpeg {
 
-void __elo_jpeg_enc_prepare_derived_tbl(const HuffmanSpec* spec, HuffmanCodes* codes) {
+void derive_codes(const HuffmanSpec* spec, HuffmanCodes* codes) {
   *codes = {};
   uint32_t code = 0;
   size_t next = 0;
@@ -17,11 +17,13 @@ void __elo_jpeg_enc_prepare_derived_tbl(const HuffmanSpec* spec, HuffmanCodes* c
   }
 }
 
-void __elo_jpeg_enc_prepare_huffman_code(ELO_ENCODER* encoder) {
+void prepare_codes(ELO_ENCODER* encoder) {
   encoder->dcSpecs = {&kDcLuminance, &kDcChrominance};
   encoder->acSpecs = {&kAcLuminance, &kAcChrominance};
   for (size_t i = 0; i < 2; ++i) {
-    __elo_jpeg_enc_prepare_derived_tbl(encoder->dcSpecs[i], &encoder->dcCodes[i]);
-    __elo_jpeg_enc_prepare_derived_tbl(encoder->acSpecs[i], &encoder->acCodes[i]);
+    derive_codes(encoder->dcSpecs[i], &encoder->dcCodes[i]);
+    derive_codes(encoder->acSpecs[i], &encoder->acCodes[i]);
   }
 }
+
+}  // namespace pelo::jpeg

@@ -19,11 +19,10 @@ struct SymbolCode {
 };
 using HuffmanCodes = std::array<SymbolCode, 256>;
 
-}  // namespace pelo::jpeg
-
 // Installs the Annex K tables and derives their codes.
-TAVIRPELO_API void __elo_jpeg_enc_prepare_huffman_code(ELO_ENCODER* encoder);
+void prepare_codes(ELO_ENCODER* encoder);
 
 // Derives the codes of one table.
-TAVIRPELO_API void __elo_jpeg_enc_prepare_derived_tbl(const pelo::jpeg::HuffmanSpec* spec,
-                                                      pelo::jpeg::HuffmanCodes* codes);
+void derive_codes(const pelo::jpeg::HuffmanSpec* spec, pelo::jpeg::HuffmanCodes* codes);
+
+}  // namespace pelo::jpeg

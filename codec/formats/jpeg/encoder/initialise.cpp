@@ -2,10 +2,10 @@
 #include <algorithm>
 
 #include "codec/base/checked.h"
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 using pelo::ceil_div;
@@ -93,24 +93,23 @@ bool allocate_samples(ELO_ENCODER& encoder) {
   return true;
 }
 
-ELO_ENCODER* refuse(int code) {
-  elo_SetError(code);
-  return nullptr;
-}
-
 }  // namespace
 
-ELO_ENCODER* __elo_jpeg_enc_initiaize(const TAVIRPELO_RAWINFO* image, ELO_DESTINATION* destination,
-                                      const TAVIRPELO_ENCOPTION* options,
-                                      const CodingParameters* parameters) {
-  if (!accepted_size(*image)) return refuse(kErrorSize);
+ELO_ENCODER* make_encoder(const TAVIRPELO_RAWINFO* image, ELO_DESTINATION* destination,
+                          const TAVIRPELO_ENCOPTION* options, const CodingParameters* parameters) {
+  if (!accepted_size(*image)) {
+    refuse(image->width == 0 || image->height == 0 ? Reason::kZeroSize : Reason::kArgument,
+           "JPEG encoder", "4999 pixels a side are the most");
+    return nullptr;
+  }
   const CodingParameters* defaults = default_parameters(image->format);
-  if (defaults == nullptr) return refuse(kErrorFormat);
+  if (defaults == nullptr) return refuse(Reason::kOutputFormat, "JPEG encoder"), nullptr;
   const CodingParameters& coding = parameters != nullptr ? *parameters : *defaults;
-  if (!accepted_sampling(coding)) return refuse(kErrorSampling);
+  if (!accepted_sampling(coding))
+    return refuse(Reason::kArgument, "JPEG encoder", "sampling factors"), nullptr;
 
   OsPtr<ELO_ENCODER> encoder = pelo::os_new<ELO_ENCODER>();
-  if (encoder == nullptr) return refuse(kErrorMemory);
+  if (encoder == nullptr) return refuse(Reason::kNoMemory, "JPEG encoder"), nullptr;
   encoder->width = static_cast<int>(image->width);
   encoder->height = static_cast<int>(image->height);
   encoder->format = image->format;
@@ -119,20 +118,20 @@ ELO_ENCODER* __elo_jpeg_enc_initiaize(const TAVIRPELO_RAWINFO* image, ELO_DESTIN
   encoder->app1 = options->app1;
   encoder->restartPerRow = coding.restartPerRow;
   set_components(*encoder, coding);
-  if (!allocate_samples(*encoder)) return refuse(kErrorMemory);
+  if (!allocate_samples(*encoder)) return refuse(Reason::kNoMemory, "JPEG encoder"), nullptr;
 
   if (parameters == nullptr) {
-    __elo_jpeg_enc_set_quality(encoder.get(), options->quality);
+    set_quality(encoder.get(), options->quality);
   } else {
     for (int i = 0; i < kQuantTables; ++i) {
-      __elo_jpeg_enc_set_quant_table(encoder.get(), i, coding.quant[static_cast<size_t>(i)].data());
+      set_quant_table(encoder.get(), i, coding.quant[static_cast<size_t>(i)].data());
     }
   }
-  __elo_jpeg_enc_prepare_huffman_code(encoder.get());
+  prepare_codes(encoder.get());
   return encoder.release();
 }
 
-void __elo_jpeg_enc_release_mem(ELO_ENCODER* encoder) {
+void release_buffers(ELO_ENCODER* encoder) {
   for (EncoderComponent& component : encoder->components) component.samples.reset();
   if (encoder->destination->kind == ELO_TO_FILE) {
     const int total = encoder->destination->total;
@@ -140,3 +139,5 @@ void __elo_jpeg_enc_release_mem(ELO_ENCODER* encoder) {
     encoder->destination->total = total;
   }
 }
+
+}  // namespace pelo::jpeg

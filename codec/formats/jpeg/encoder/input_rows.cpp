@@ -5,8 +5,6 @@
 
 #include "codec/base/byte_order.h"
 
-using namespace pelo::jpeg;
-
 namespace pelo::jpeg {
 namespace {
 
@@ -103,7 +101,7 @@ void read_planes(ELO_ENCODER& encoder) {
     planes[i] = plane + static_cast<ptrdiff_t>(first) * component.width;
     plane += static_cast<ptrdiff_t>(component.height) * component.width;
   }
-  __elo_jpeg_enc_get_raw_data(&encoder, planes.data());
+  take_planes(&encoder, planes.data());
 }
 
 }  // namespace
@@ -132,9 +130,7 @@ bool read_input_rows(ELO_ENCODER& encoder) {
   }
 }
 
-}  // namespace pelo::jpeg
-
-void __elo_jpeg_enc_get_raw_data(ELO_ENCODER* encoder, const uint8_t* const* planes) {
+void take_planes(ELO_ENCODER* encoder, const uint8_t* const* planes) {
   for (size_t i = 0; i < static_cast<size_t>(encoder->componentCount); ++i) {
     EncoderComponent& component = encoder->components[i];
     const auto width = static_cast<size_t>(component.width);
@@ -145,3 +141,5 @@ void __elo_jpeg_enc_get_raw_data(ELO_ENCODER* encoder, const uint8_t* const* pla
     pad(component, rows);
   }
 }
+
+}  // namespace pelo::jpeg

@@ -2,8 +2,7 @@
 #include "codec/formats/jpeg/encoder/encoder.h"
 #include "codec/formats/jpeg/encoder/input_rows.h"
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 // A block outside the image: no detail, and the DC of a neighbour, which costs the fewest bits.
@@ -27,8 +26,8 @@ CoefficientBlock* make_blocks(ELO_ENCODER& encoder, EncoderComponent& component,
       } else if (column >= component.blocksWide) {
         make_dummy(*out, *(out - 1));
       } else {
-        __elo_jpeg_enc_do_forward_dct(component.row(8 * y) + 8 * column, component.stride(), &table,
-                                      out->data());
+        transform_and_quantise(component.row(8 * y) + 8 * column, component.stride(), &table,
+                               out->data());
       }
     }
   }
@@ -37,20 +36,21 @@ CoefficientBlock* make_blocks(ELO_ENCODER& encoder, EncoderComponent& component,
 
 }  // namespace
 
-int __elo_jpeg_enc_compress_data(ELO_ENCODER* encoder) {
+int code_row(ELO_ENCODER* encoder) {
   alignas(16) std::array<CoefficientBlock, kEncoderMcuBlocks> blocks;
   for (int mcu = 0; mcu < encoder->mcusAcross; ++mcu) {
     CoefficientBlock* next = blocks.data();
     for (size_t i = 0; i < static_cast<size_t>(encoder->componentCount); ++i) {
       next = make_blocks(*encoder, encoder->components[i], mcu, next);
     }
-    if (!__elo_jpeg_enc_encode_1mcu_blk(encoder, blocks.data())) return 0;
+    if (!code_mcu(encoder, blocks.data())) return 0;
   }
   encoder->row += encoder->mcu_height();
   return 1;
 }
 
-int __elo_jpeg_enc_process_image_data(ELO_ENCODER* encoder) {
-  return encoder->row < encoder->height && read_input_rows(*encoder) &&
-         __elo_jpeg_enc_compress_data(encoder);
+int encode_next_row(ELO_ENCODER* encoder) {
+  return encoder->row < encoder->height && read_input_rows(*encoder) && code_row(encoder);
 }
+
+}  // namespace pelo::jpeg

@@ -4,8 +4,7 @@
 
 #include "codec/formats/jpeg/encoder/encoder.h"
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 std::array<uint8_t, 64> scaled(const std::array<uint8_t, 64>& base, int percent) {
@@ -18,14 +17,14 @@ std::array<uint8_t, 64> scaled(const std::array<uint8_t, 64>& base, int percent)
 
 }  // namespace
 
-void __elo_jpeg_enc_set_quality(ELO_ENCODER* encoder, int quality) {
+void set_quality(ELO_ENCODER* encoder, int quality) {
   const int q = std::clamp(quality, 1, 100);
   const int percent = q < 50 ? 5000 / q : 200 - 2 * q;
-  __elo_jpeg_enc_set_quant_table(encoder, 0, scaled(kLuminanceQuant, percent).data());
-  __elo_jpeg_enc_set_quant_table(encoder, 1, scaled(kChrominanceQuant, percent).data());
+  set_quant_table(encoder, 0, scaled(kLuminanceQuant, percent).data());
+  set_quant_table(encoder, 1, scaled(kChrominanceQuant, percent).data());
 }
 
-void __elo_jpeg_enc_set_quant_table(ELO_ENCODER* encoder, int number, const uint8_t* values) {
+void set_quant_table(ELO_ENCODER* encoder, int number, const uint8_t* values) {
   if (number < 0 || number >= kQuantTables) return;
   QuantiseTable& table = encoder->quant[static_cast<size_t>(number)];
   for (size_t i = 0; i < 64; ++i) {
@@ -39,3 +38,5 @@ void __elo_jpeg_enc_set_quant_table(ELO_ENCODER* encoder, int number, const uint
     table.upper[i] = reciprocal >= 32768 ? -1 : 0;
   }
 }
+
+}  // namespace pelo::jpeg

@@ -20,12 +20,11 @@ struct QuantiseTable {
   alignas(16) std::array<int16_t, 64> upper;
 };
 
-}  // namespace pelo::jpeg
-
 // Installs tables 0 and 1 for a quality, clamped to 1..100: the Annex K tables scaled to
 // 5000 / quality percent below 50, 200 - 2 * quality from there.
-TAVIRPELO_API void __elo_jpeg_enc_set_quality(ELO_ENCODER* encoder, int quality);
+void set_quality(ELO_ENCODER* encoder, int quality);
 
 // Installs the 64 values (natural order) of table `number` (0 to 3).
-TAVIRPELO_API void __elo_jpeg_enc_set_quant_table(ELO_ENCODER* encoder, int number,
-                                                  const uint8_t* values);
+void set_quant_table(ELO_ENCODER* encoder, int number, const uint8_t* values);
+
+}  // namespace pelo::jpeg

@@ -79,13 +79,13 @@ bool code_again(const Job& job, CoefficientSource& source, const TransformParame
   const TAVIRPELO_RAWINFO image = planar(jd.imageWidth, jd.imageHeight);
   const TAVIRPELO_ENCOPTION options{100, job.segment(), 0};
   restart(destination);
-  ELO_ENCODER* encoder = elo_jpeg_enc_mcu_init(&image, &destination, &options, &parameters.coding);
+  ELO_ENCODER* encoder = begin_bands(&image, &destination, &options, &parameters.coding);
   if (encoder == nullptr) return false;
   const auto control = source.progressive() ? __elo_prog_bits_control : __elo_bits_control;
   const bool sameGrid =
       encoder->mcusAcross == source.grid().across && encoder->mcusDown == source.grid().down;
   const bool coded = sameGrid && control(&source, &parameters, encoder);
-  const bool finished = elo_jpeg_enc_mcu_finish(encoder, nullptr, nullptr);
+  const bool finished = finish_bands(encoder, nullptr, nullptr);
   return coded && finished;
 }
 
@@ -133,7 +133,7 @@ bool code_bands(PELOJ_JDINFO* decoder, ELO_ENCODER* encoder, Band& band, int hei
   for (int row = 0; row < height; row += 16) {
     band.clear();
     if (!__elo_jpeg_dec_line_process(decoder, band.planes, std::min(16, height - row))) return false;
-    if (!elo_jpeg_enc_muc_process(encoder, band.bytes.data(), nullptr)) {
+    if (!encode_band(encoder, band.bytes.data(), nullptr)) {
       __elo_jpeg_dec_line_finish(decoder);
       return false;
     }
@@ -212,13 +212,13 @@ int __elo_resize_jpeg_image(void* source, int size, int kind, int width, int hei
   const TAVIRPELO_RAWINFO image = planar(width, height);
   const TAVIRPELO_ENCOPTION options{50, app1, 0};
   ELO_ENCODER* encoder =
-      planar_source(*decoder) ? elo_jpeg_enc_mcu_init(&image, destination, &options, nullptr) : nullptr;
+      planar_source(*decoder) ? begin_bands(&image, destination, &options, nullptr) : nullptr;
   if (encoder == nullptr) {
     __elo_jpeg_dec_line_finish(decoder);
     return 0;
   }
   const bool coded = code_bands(decoder, encoder, band, height);
-  const bool finished = elo_jpeg_enc_mcu_finish(encoder, nullptr, nullptr);
+  const bool finished = finish_bands(encoder, nullptr, nullptr);
   return coded && finished;
 }
 

@@ -65,7 +65,7 @@ bool Rotation::start_encoder(Size picture, ELO_DESTINATION* destination) {
   image.height = static_cast<uint32_t>(picture.height);
   image.format = TAVIRPELO_YUV420;
   const TAVIRPELO_ENCOPTION options{100, nullptr, 0};
-  encoder_ = elo_jpeg_enc_mcu_init(&image, destination, &options, &parameters_.coding);
+  encoder_ = begin_bands(&image, destination, &options, &parameters_.coding);
   if (encoder_ == nullptr) return false;
   const McuGrid& grid = source_.grid();
   const Size mcus = operation_->transposes ? Size{grid.down, grid.across} : Size{grid.across, grid.down};
@@ -103,7 +103,7 @@ int Rotation::run(bool inSteps) {
 bool Rotation::end() {
   if (encoder_ == nullptr) return true;
   const bool joined = __elo_jpeg_enc_col_encoder_finish(&columns_);
-  const bool finished = elo_jpeg_enc_mcu_finish(std::exchange(encoder_, nullptr), nullptr, nullptr);
+  const bool finished = finish_bands(std::exchange(encoder_, nullptr), nullptr, nullptr);
   columns_.encoder = nullptr;
   return joined && finished;
 }

@@ -48,7 +48,7 @@ bool reserve(ELO_DESTINATION& destination, int64_t bytes) {
   if (destination.kind != ELO_TO_MEMORY || missing <= 0) return true;
   if (missing > INT_MAX) return false;
   uint8_t* grown =
-      elo_jpeg_enc_realloc(destination.buffer, destination.capacity, static_cast<int>(missing));
+      grow_block(destination.buffer, destination.capacity, static_cast<int>(missing));
   if (grown == nullptr) return false;
   destination.buffer = grown;
   destination.capacity += static_cast<int>(missing);
@@ -59,7 +59,7 @@ bool reserve(ELO_DESTINATION& destination, int64_t bytes) {
 
 int __elo_jpeg_enc_entroy_encoder(ELO_ENCODER* encoder, const CoefficientBlock* row) {
   for (int mcu = 0; mcu < encoder->mcusAcross; ++mcu, row += encoder->mcuBlocks) {
-    if (!__elo_jpeg_enc_encode_1mcu_blk(encoder, row)) return 0;
+    if (!code_mcu(encoder, row)) return 0;
   }
   encoder->row += encoder->mcu_height();
   return 1;
@@ -84,7 +84,7 @@ int __elo_jpeg_enc_col_entroy_encoder(ColumnEncoder* columns, const CoefficientB
   ELO_ENCODER& encoder = *columns->encoder;
   for (size_t i = 0; i < columns->streams.size(); ++i, column += encoder.mcuBlocks) {
     const UseStream use(encoder, columns->streams[i]);
-    if (!__elo_jpeg_enc_encode_1mcu_blk(&encoder, column)) return 0;
+    if (!code_mcu(&encoder, column)) return 0;
   }
   columns->column += encoder.mcu_width();
   return 1;
@@ -96,7 +96,7 @@ int __elo_jpeg_enc_col_encoder_finish(ColumnEncoder* columns) {
   int64_t total = 0;
   for (size_t i = 0; i < columns->streams.size(); ++i) {
     const UseStream use(encoder, columns->streams[i]);
-    if (!__elo_jpeg_enc_finish_compression(&encoder)) return 0;
+    if (!flush_bits(&encoder)) return 0;
     total += columns->streams[i].destination.used + 2;
   }
   if (!reserve(*encoder.destination, total + 2)) return 0;
