@@ -1,8 +1,11 @@
 // Music: whole files against a builder of the test's own, and every failing file call.
 #include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <fstream>
 #include <numeric>
 #include <optional>
 
@@ -91,8 +94,11 @@ TEST_F(MusicEntry, RefusalsLeaveShowAndFileAlone) {
   const State state(show);
   tune(0);
   const std::string missing = source.path() + ".none", folder = testing::TempDir();
+  const TempFile pipe(".pipe"), link(".link");
+  ASSERT_EQ(0, mkfifo(pipe.c_str(), 0600));
+  ASSERT_EQ(0, symlink(pipe.c_str(), link.c_str()));
   for (const char* path : {static_cast<const char*>(nullptr), "", missing.c_str(), folder.c_str(),
-                           "/dev/null", source.c_str()}) {
+                           "/dev/null", pipe.c_str(), link.c_str(), source.c_str()}) {
     EXPECT_EQ(0, show.AddMusic(path));
   }
   EXPECT_EQ(0, show.AddMusic(std::string(256, 'a').c_str()));
