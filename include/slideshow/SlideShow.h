@@ -17,7 +17,7 @@ struct subfileInfo {
   char name[256] = {};         // the application's name for it; always terminated, may be empty
   char path[256] = {};         // source file; empty for pictures added from a byte buffer
   int flag = 0;                // 0 to 255, from the add or insert; 1 from the public operations
-  FILE* sourceFile = nullptr;  // source file, open while the picture is being added
+  FILE* sourceFile = nullptr;  // always null: the codec opens the source itself
   int reserved = 0;
   int width = 0;  // pixels: of the stored JPEG in file mode, of the source in memory mode
   int height = 0;
