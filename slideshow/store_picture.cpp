@@ -20,9 +20,9 @@ bool usable(const PictureSource& source) {
 bool write_picture(SlideShow& show, DataShift& shift, int position, const uint8_t* jpeg) {
   const bool last = position == show.subfileCount - 1;
   plan_data_up(shift, show, position + 1, show.subfiles[position].size);
-  return shift.forth(show, INT64_MAX, 1) && show.writeVssHeader("r+b") == 1 &&
-         show.writeEndMark() == 1 && show.writeSubfile(position, jpeg) == 1 &&
-         (last || show.writeSubfileHeader() == 1) && show.writeEndMark() == 1;
+  return shift.forth(show, 1) && show.writeVssHeader("r+b") == 1 && show.writeEndMark() == 1 &&
+         show.writeSubfile(position, jpeg) == 1 && (last || show.writeSubfileHeader() == 1) &&
+         show.writeEndMark() == 1;
 }
 
 bool store_in_file(SlideShow& show, const subfileInfo& entry, const uint8_t* jpeg, int position) {
