@@ -1,4 +1,5 @@
-// Cropping and scaling of RGB565 pictures, and cropping straight from a JPEG file within a memory limit.
+// RGB565 regions brought into a box. Of a JPEG file no more pixels are decoded than the box needs, so
+// that a caller can say how much memory there is.
 #include <algorithm>
 #include <climits>
 
