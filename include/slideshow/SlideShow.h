@@ -143,9 +143,9 @@ class SlideShow : public SlideShowFields {
   // ---- music ----
 
   // Takes in a music file (1 byte to 2 GiB): file mode copies it in front of everything else, memory
-  // mode notes its path and size. Memory for a picture's data or 131,072 bytes is needed, whichever is
-  // more. 1, or 0 with the file put back as said above: music is there already, path not 1 to 255 bytes,
-  // no file, an empty one, no memory, container not writable or too large.
+  // mode notes its path and size. Needs memory for the longest picture's data or 131,072 bytes,
+  // whichever is more, and 16 KB. 1, or 0 with the file put back as said above: music is there already,
+  // path not 1 to 255 bytes, no file, an empty one, no memory, container not writable or too large.
   int AddMusic(const char* musicPath);
 
   // Takes the music out again. 1, or 0 as for RemoveSubfile: the music may be damaged when a step fails
