@@ -46,7 +46,7 @@ bool plan(SlideShow& show, Table& kept, DataShift& shift) {
     const subfileInfo& entry = show.subfiles[i];
     if ((entry.state & kMarked) != 0) continue;
     read_stored(session, entry, kept.entries[kept.count++]);
-    if (entry.offset != end) shift.add(entry.offset, end, entry.size);
+    if (entry.offset != end) shift.add(entry.offset, end, entry.size, entry.size);
     end += entry.size;
   }
   return session.close();
@@ -60,7 +60,7 @@ bool compact(SlideShow& show) {
   DataShift shift;
   if (!undo.remember(show, true, kEndMarkSize) || !plan(show, table, shift)) return false;
 
-  if (shift.forth(show, INT64_MAX, kTries)) {
+  if (shift.forth(show, kTries)) {
     exchange(show, table);
     if (finish_file(show, data_end(show))) return true;
     exchange(show, table);

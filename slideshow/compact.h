@@ -9,7 +9,8 @@ namespace pelo::slideshow {
 // file says of it is ignored.
 constexpr int kMarked = 1;
 
-// File mode. False with show and container as they were; see SlideShow::RemoveSubfile.
+// File mode. False with the show as it was, and what that leaves of the container; see
+// SlideShow::RemoveSubfile.
 [[nodiscard]] bool compact(SlideShow& show);
 
 }  // namespace pelo::slideshow

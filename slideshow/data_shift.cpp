@@ -7,21 +7,21 @@
 
 namespace pelo::slideshow {
 
-void DataShift::add(int64_t from, int64_t to, int64_t size) {
-  runs_[runCount_++] = {from, to, size};
+void DataShift::add(int64_t from, int64_t to, int64_t size, int64_t piece) {
+  runs_[runCount_++] = {from, to, size, std::min(piece, size)};
 }
 
 int64_t DataShift::piece_size() const {
-  return std::min(piece_, runs_[run_].size - done_);
+  return std::min(runs_[run_].piece, runs_[run_].size - done_);
 }
 
-bool DataShift::forth(SlideShow& show, int64_t piece, int tries) {
-  if (moved_all()) return true;
-  int64_t largest = 0;
-  for (int i = 0; i < runCount_; ++i) largest = std::max(largest, runs_[i].size);
-  piece_ = std::min(piece, largest);
-  buffer_ = vss_bytes(piece_);
+bool DataShift::forth(SlideShow& show, int tries, int64_t spare) {
+  if (moved_all() && spare == 0) return true;
+  int64_t room = spare;
+  for (int i = 0; i < runCount_; ++i) room = std::max(room, runs_[i].piece);
+  buffer_ = vss_bytes(room);
   if (buffer_ == nullptr) return false;
+  if (moved_all()) return true;
 
   for (int failures = 0; failures < tries; ++failures) {
     ContainerSession session(show, "r+b");
@@ -64,7 +64,8 @@ bool DataShift::step_back() {
     if (run_ == 0) return false;
     done_ = runs_[--run_].size;
   }
-  done_ = (done_ - 1) / piece_ * piece_;
+  const int64_t piece = runs_[run_].piece;
+  done_ = (done_ - 1) / piece * piece;
   return true;
 }
 

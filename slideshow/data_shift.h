@@ -12,14 +12,18 @@ class ContainerSession;
 
 class DataShift {
  public:
-  // Plans one more run, one a picture at the most. In the order of add() no run's new place may cover a
-  // run that is still to be moved; a run that overlaps its own new place and is longer than a piece must
-  // move down.
-  void add(int64_t from, int64_t to, int64_t size);
+  // Plans one more run, one a picture and one other at the most. It moves `piece` bytes at a time. In
+  // the order of add() no run's new place may cover a run that is still to be moved; a run that overlaps
+  // its own new place and is longer than a piece must move down.
+  void add(int64_t from, int64_t to, int64_t size, int64_t piece);
 
-  // Moves the runs, at most `piece` bytes at a time through one buffer of that size. Each step is tried
-  // `tries` times before the whole is given up. True when all arrived; without memory nothing moves.
-  [[nodiscard]] bool forth(SlideShow& show, int64_t piece, int tries);
+  // Moves the runs through one buffer, which holds the largest piece and at least `spare` bytes. Each
+  // step is tried `tries` times before the whole is given up. True when all arrived; without memory
+  // nothing moves.
+  [[nodiscard]] bool forth(SlideShow& show, int tries, int64_t spare = 0);
+
+  // After forth() was true: its buffer, free for other use.
+  uint8_t* spare() { return buffer_.get(); }
 
   // Undoes forth(), however far it came, as long as the file was not cut since. Needs no memory; each
   // piece is tried twice, even when another failed.
@@ -30,6 +34,7 @@ class DataShift {
     int64_t from;
     int64_t to;
     int64_t size;
+    int64_t piece;
   };
 
   bool moved_all() const { return run_ == runCount_; }
@@ -38,12 +43,11 @@ class DataShift {
   bool step_back();
   bool return_piece(SlideShow& show);
 
-  Run runs_[SlideShow::kMaxFileSubfiles] = {};
+  Run runs_[SlideShow::kMaxFileSubfiles + 1] = {};
   int runCount_ = 0;
-  int64_t piece_ = 0;  // bytes
-  VssBytes buffer_;    // room for a piece
-  int run_ = 0;        // the next piece belongs to this run
-  int64_t done_ = 0;   // bytes of it that have moved
+  VssBytes buffer_;
+  int run_ = 0;       // the next piece belongs to this run
+  int64_t done_ = 0;  // bytes of it that have moved
   // buffer_ holds the only whole copy of the next piece: its write was begun, and the new place may
   // overlap the old one.
   bool held_ = false;

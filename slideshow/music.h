@@ -19,11 +19,10 @@ struct Music {
 void exchange_music(SlideShow& show, Music& music);
 
 // File mode, and the show has no music: puts music.size bytes of `source`, which stands at its start, in
-// front of everything else. False with show and container as they were.
+// front of everything else. False with the show as it was and the container put back.
 [[nodiscard]] bool put_music(SlideShow& show, FILE* source, Music music);
 
-// File mode, and the show has music. False with show and container as they were, but see
-// SlideShow::RemoveMusic.
+// File mode, and the show has music. False as for put_music, but see SlideShow::RemoveMusic.
 [[nodiscard]] bool take_music(SlideShow& show);
 
 }  // namespace pelo::slideshow

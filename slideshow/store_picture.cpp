@@ -10,35 +10,8 @@
 namespace pelo::slideshow {
 namespace {
 
-// Keeps a source file open while its picture is read.
-class OpenSource {
- public:
-  OpenSource(subfileInfo& entry, const PictureSource& source) : entry_(entry) {
-    if (source.path == nullptr) {
-      good_ = source.data != nullptr;
-    } else if (usable_path(source.path)) {
-      entry.sourceFile = vss_fopen(source.path, "rb");
-      good_ = entry.sourceFile != nullptr;
-    }
-  }
-  ~OpenSource() {
-    if (entry_.sourceFile != nullptr) (void)vss_fclose(entry_.sourceFile);
-    entry_.sourceFile = nullptr;
-  }
-  OpenSource(const OpenSource&) = delete;
-  OpenSource& operator=(const OpenSource&) = delete;
-
-  bool good() const { return good_; }
-
- private:
-  subfileInfo& entry_;
-  bool good_ = false;
-};
-
-bool read_picture(const SlideShow& show, const PictureSource& source, const char* name, char flag,
-                  subfileInfo& entry, JpegBytes& jpeg) {
-  const OpenSource open(entry, source);
-  return open.good() && make_picture(show, source, name, flag, entry, jpeg);
+bool usable(const PictureSource& source) {
+  return source.path != nullptr ? usable_path(source.path) : source.data != nullptr;
 }
 
 // The container's side, once the table holds the new picture. The mark behind the header keeps the
@@ -47,9 +20,9 @@ bool read_picture(const SlideShow& show, const PictureSource& source, const char
 bool write_picture(SlideShow& show, DataShift& shift, int position, const uint8_t* jpeg) {
   const bool last = position == show.subfileCount - 1;
   plan_data_up(shift, show, position + 1, show.subfiles[position].size);
-  return shift.forth(show, INT64_MAX, 1) && show.writeVssHeader("r+b") == 1 &&
-         show.writeEndMark() == 1 && show.writeSubfile(position, jpeg) == 1 &&
-         (last || show.writeSubfileHeader() == 1) && show.writeEndMark() == 1;
+  return shift.forth(show, 1) && show.writeVssHeader("r+b") == 1 && show.writeEndMark() == 1 &&
+         show.writeSubfile(position, jpeg) == 1 && (last || show.writeSubfileHeader() == 1) &&
+         show.writeEndMark() == 1;
 }
 
 bool store_in_file(SlideShow& show, const subfileInfo& entry, const uint8_t* jpeg, int position) {
@@ -72,7 +45,8 @@ int store_picture(SlideShow& show, const PictureSource& source, const char* name
                   char flag) {
   subfileInfo entry;
   JpegBytes jpeg;
-  if (!has_room(show) || !read_picture(show, source, name, flag, entry, jpeg)) return 0;
+  if (!has_room(show) || !usable(source) || !make_picture(show, source, name, flag, entry, jpeg))
+    return 0;
   if (show.mode == SlideShow::kFileMode) return store_in_file(show, entry, jpeg.get(), position) ? 1 : 0;
   insert_entry(show, position, entry);
   return 1;

@@ -6,7 +6,7 @@
 
 namespace pelo::slideshow {
 
-// 0 <= position <= subfileCount. 1, or 0 with show and container as they were.
+// 0 <= position <= subfileCount. 1, or 0 with the show as it was and the container put back.
 [[nodiscard]] int store_picture(SlideShow& show, const PictureSource& source, const char* name,
                                 int position, char flag);
 

@@ -59,7 +59,8 @@ void erase_entry(SlideShow& show, int position) {
 void plan_data_up(DataShift& shift, const SlideShow& show, int first, int64_t distance) {
   for (int i = show.subfileCount - 1; i >= first; --i) {
     const int64_t to = int64_t{show.subfiles[i].offset} + kSubfileHeaderSize;
-    shift.add(to - distance, to, int64_t{show.subfiles[i].size} - kSubfileHeaderSize);
+    const int64_t size = int64_t{show.subfiles[i].size} - kSubfileHeaderSize;
+    shift.add(to - distance, to, size, size);
   }
 }
 

@@ -16,7 +16,8 @@ int vss_fflush(FILE* stream);
 int vss_fclose(FILE* stream);
 int vss_unlink(const char* path);
 
-// The codec's allocator: either side may free what the other allocated. Null for size 0.
+// One allocator with the codec, whose encoder replaces the buffer that the store hands it. Null for size
+// 0.
 void* vss_malloc(size_t size);
 void vss_free(void* pointer);
 void* vss_realloc(void* pointer, size_t size);

@@ -1,7 +1,14 @@
 // The OS layer: the only place where the codec meets the platform's memory, files and threads.
+
+// On 32-bit systems as well a file with a large inode number can be asked what it is.
+#define _FILE_OFFSET_BITS 64
+
+#include <fcntl.h>
 #include <pthread.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
+#include <cerrno>
 #include <climits>
 #include <cstdio>
 #include <cstdlib>
@@ -16,6 +23,36 @@ namespace {
 
 bool usable(const FILE* stream) {
   return stream != nullptr && stream != TAVIRPELO_INVALID_FILE;
+}
+
+bool reads_only(const char* mode) {
+  return mode[0] == 'r' && std::strchr(mode, '+') == nullptr;
+}
+
+// Says in errno why not.
+bool regular(const struct stat& status) {
+  if (S_ISREG(status.st_mode)) return true;
+  errno = S_ISDIR(status.st_mode) ? EISDIR : ESPIPE;
+  return false;
+}
+
+// Only what has a length and can be read at any place is a source. Directories open, but their reads
+// fail; a pipe makes the opening wait for a writer, a device may act on it and need not end. What takes
+// the file's place after the first look is opened without waiting, and found out by the second.
+FILE* open_regular(const char* path, const char* mode) {
+  struct stat status;
+  if (stat(path, &status) != 0 || !regular(status)) return nullptr;
+  const int descriptor = open(path, O_RDONLY | O_NONBLOCK | O_NOCTTY);
+  if (descriptor < 0) return nullptr;
+  const bool sound =
+      fstat(descriptor, &status) == 0 && regular(status) && fcntl(descriptor, F_SETFL, 0) == 0;
+  FILE* stream = sound ? fdopen(descriptor, mode) : nullptr;
+  if (stream == nullptr) {
+    const int reason = errno;
+    (void)close(descriptor);
+    errno = reason;
+  }
+  return stream;
 }
 
 }  // namespace
@@ -49,10 +86,7 @@ void* TAVIRPELO_OsMemset(void* destination, int value, size_t size) {
 
 FILE* TAVIRPELO_OsFopen(const char* path, const char* mode) {
   if (path == nullptr) return nullptr;
-  // Opening a directory for reading succeeds on some systems; only its reads fail.
-  struct stat status;
-  if (lstat(path, &status) == 0 && S_ISDIR(status.st_mode)) return nullptr;
-  return std::fopen(path, mode);
+  return reads_only(mode) ? open_regular(path, mode) : std::fopen(path, mode);
 }
 
 size_t TAVIRPELO_OsFread(void* buffer, size_t size, size_t count, FILE* stream) {

@@ -5,8 +5,12 @@
 // and closes it before it returns, so no stream stays open between calls. A show in memory mode has no
 // file: it notes up to 1024 pictures, which are decoded from their source each time.
 //
-// One caller at a time; no locks, no logging. A file that an operation fails to change is put back as it
-// was, and so is the object; only what was to be removed may be damaged then, see RemoveSubfile.
+// One caller at a time; no locks, no logging.
+//
+// An addition, insertion or removal that answers 0 leaves the object as it was, and puts the file back
+// as it was; only what was to be removed may be damaged, see RemoveSubfile. The way back writes to the
+// same storage. It repeats a step that fails; when that fails again too, the file may be neither the old
+// one nor the new one, and may not open.
 #ifndef SLIDESHOW_SLIDESHOW_H
 #define SLIDESHOW_SLIDESHOW_H
 
@@ -17,7 +21,7 @@ struct subfileInfo {
   char name[256] = {};         // the application's name for it; always terminated, may be empty
   char path[256] = {};         // source file; empty for pictures added from a byte buffer
   int flag = 0;                // 0 to 255, from the add or insert; 1 from the public operations
-  FILE* sourceFile = nullptr;  // source file, open while the picture is being added
+  FILE* sourceFile = nullptr;  // always null: the codec opens the source itself
   int reserved = 0;
   int width = 0;  // pixels: of the stored JPEG in file mode, of the source in memory mode
   int height = 0;
@@ -131,20 +135,21 @@ class SlideShow : public SlideShowFields {
 
   // Takes the marked pictures out of the file: moves the others together, rewrites the headers and cuts
   // the file. The rest keeps its order, its indices begin at 0; each gets the name, path and state that
-  // its header in the file holds. 1, or 0 with file and object as they were. A step that fails once is
-  // repeated; when it fails again after pictures have moved, only the marked ones, which are all still
-  // listed and marked, may have lost their data.
+  // its header in the file holds. 1, or 0 with the object as it was, all marks included, and the file
+  // put back as said above. A step that fails once is repeated; when it fails again after pictures have
+  // moved, the marked ones may have lost their data, even where the way back succeeds.
   int RemoveSubfile();
 
   // ---- music ----
 
   // Takes in a music file (1 byte to 2 GiB): file mode copies it in front of everything else, memory
-  // mode notes its path and size. 1, or 0 with file and object as they were: music is there already,
-  // path not 1 to 255 bytes, file missing or empty, no memory, container not writable or too large.
+  // mode notes its path and size. Needs memory for the longest picture's data or 131,072 bytes,
+  // whichever is more, and 16 KB. 1, or 0 with the file put back as said above: music is there already,
+  // path not 1 to 255 bytes, no file, an empty one, no memory, container not writable or too large.
   int AddMusic(const char* musicPath);
 
-  // Takes the music out again. 1, or 0 with file and object as they were; as with RemoveSubfile the
-  // music may be damaged when a step fails twice. 0 also when there is none.
+  // Takes the music out again. 1, or 0 as for RemoveSubfile: the music may be damaged when a step fails
+  // twice. 0 also when there is none.
   int RemoveMusic();
 
   // Copies the path of the music with its terminator (`buffer` holds 256 bytes) and returns its length;

@@ -88,7 +88,8 @@ TAVIRPELO_API void* TAVIRPELO_OsMemset(void* destination, int value, size_t size
 
 /* ---- OS layer: files ---- */
 
-/* fopen, but null for a null path or a directory. */
+/* fopen, but null for a null path, and for reading alone from regular files only: directories, pipes and
+ * devices are refused at once, behind links too. */
 TAVIRPELO_API FILE* TAVIRPELO_OsFopen(const char* path, const char* mode);
 TAVIRPELO_API size_t TAVIRPELO_OsFread(void* buffer, size_t size, size_t count, FILE* stream);
 TAVIRPELO_API size_t TAVIRPELO_OsFwrite(const void* buffer, size_t size, size_t count, FILE* stream);

@@ -5,9 +5,9 @@
 
 #include "tavirpelo/encode.h"
 
-/* A turn that is done in steps. Zeroed by the caller before the first call. */
+/* A turn that is done in steps. */
 typedef struct ELO_TRANSFORMSTATE {
-  int started;
+  int started;   /* 0 before the first call; the rest may be anything then */
   int resume;    /* the next call goes on */
   void* context; /* what is kept between calls */
 } ELO_TRANSFORMSTATE;
@@ -34,7 +34,8 @@ TAVIRPELO_API int elo_abort_rotate_jpeg(ELO_TRANSFORMSTATE* state);
  *
  * To a buffer: *buffer comes from TAVIRPELO_OsMalloc and holds *outSize bytes; on success both describe the
  * JPEG, on failure the buffer is released and both are zero. A missing argument: debug_PeloCodecError 15 and
- * nothing is released. To a file: a failure leaves it empty. */
+ * nothing is released. To a file, which may be the source: it is opened when the JPEG stands whole in memory,
+ * so that no failure but one of writing changes it. */
 TAVIRPELO_API int TAVIRPELO_ReEncodeJpegToBuffer(void* source, int size, int kind, uint8_t** buffer,
                                                  int* outSize, int target);
 TAVIRPELO_API int TAVIRPELO_ReEncodeJpegToFile(void* source, int size, int kind, const char* path,

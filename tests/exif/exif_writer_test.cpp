@@ -21,7 +21,7 @@ ELO_EXIFCONTENT full_content(const Bytes& thumbnail) {
 
 Bytes write_tiff(const ELO_EXIFCONTENT& content) {
   Bytes tiff(70000, 0xEE);
-  tiff.resize(__elo_CreateExif(tiff.data(), &content, 70000));
+  tiff.resize(__elo_CreateExif(tiff.data(), &content));
   return tiff;
 }
 
@@ -72,7 +72,7 @@ TEST(ExifWriter, NeverLeavesItsBuffer) {
   for (size_t capacity = 0; capacity < needed; ++capacity)
     EXPECT_EQ(0u, write_segment(content, capacity).size());
   EXPECT_EQ(needed, write_segment(content, needed).size());
-  EXPECT_EQ(0u, __elo_CreateExif(nullptr, &content, 1000));
+  EXPECT_EQ(0u, __elo_CreateExif(nullptr, &content));
 
   // A segment's length has 16 bits.
   ELO_EXIFCONTENT large{};
@@ -80,8 +80,10 @@ TEST(ExifWriter, NeverLeavesItsBuffer) {
   large.thumbnail = block.data();
   large.thumbnailLength = 65535 + 2 - 10 - 126 - 106;
   EXPECT_EQ(65537u, write_segment(large).size());
+  EXPECT_EQ(65527u, write_tiff(large).size());
   ++large.thumbnailLength;
   EXPECT_EQ(0u, write_segment(large).size());
+  EXPECT_EQ(0u, write_tiff(large).size());
   large.thumbnailLength = UINT32_MAX;
   EXPECT_EQ(0u, write_tiff(large).size());
 }

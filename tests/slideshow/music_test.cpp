@@ -1,8 +1,11 @@
 // Music: whole files against a builder of the test's own, and every failing file call.
 #include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <fstream>
 #include <numeric>
 #include <optional>
 
@@ -31,25 +34,23 @@ class MusicEntry : public StoredShow {
   // Every picture header tells the state in memory.
   ContainerImage written() const {
     ContainerImage after = image;
+    after.staleMarks = 0;
     for (auto& picture : after.pictures) picture.state = 2;
     after.pictures[1].state = 3;
     return after;
   }
-  // The file with that music. Of the old end mark stays what the data, now longer, does not reach.
+  // The file with that music. Of the old end marks stays what the data, now longer, does not reach.
   Bytes with(const Bytes& music) const {
     ContainerImage after = written();
     after.music = music;
     after.musicPath = source.path();
     Bytes bytes = after.bytes();
-    if (music.size() < kMarkBytes) {
-      const Bytes before = image.bytes();
-      bytes.insert(bytes.end() - kMarkBytes,
-                   before.end() - static_cast<ptrdiff_t>(kMarkBytes - music.size()), before.end());
-    }
+    const Bytes before = image.bytes();
+    const size_t end = std::min(bytes.size() - kMarkBytes, before.size());
+    bytes.insert(bytes.end() - kMarkBytes, before.begin() + static_cast<ptrdiff_t>(end), before.end());
     return bytes;
   }
-  // The same without it: the old end mark stays in front of the new one, and what was left of one
-  // before.
+  // The same without it: whatever followed the pictures follows them still, and a mark is added.
   Bytes without(const Bytes& with, size_t size) const {
     Bytes bytes = written().bytes();
     bytes.resize(bytes.size() - kMarkBytes);
@@ -91,8 +92,11 @@ TEST_F(MusicEntry, RefusalsLeaveShowAndFileAlone) {
   const State state(show);
   tune(0);
   const std::string missing = source.path() + ".none", folder = testing::TempDir();
+  const TempFile pipe(".pipe"), link(".link");
+  ASSERT_EQ(0, mkfifo(pipe.c_str(), 0600));
+  ASSERT_EQ(0, symlink(pipe.c_str(), link.c_str()));
   for (const char* path : {static_cast<const char*>(nullptr), "", missing.c_str(), folder.c_str(),
-                           "/dev/null", source.c_str()}) {
+                           "/dev/null", pipe.c_str(), link.c_str(), source.c_str()}) {
     EXPECT_EQ(0, show.AddMusic(path));
   }
   EXPECT_EQ(0, show.AddMusic(std::string(256, 'a').c_str()));
@@ -149,7 +153,8 @@ TEST_F(MusicEntry, IsOnlyNotedInMemory) {
 // that fails twice may cost the music but no picture.
 TEST_F(MusicEntry, GoesInAndOutDespiteAFailingCall) {
   for (const long count : {1, 2, 3}) {
-    for (const size_t size : {size_t{5}, size_t{1000}, size_t{140000}}) {
+    for (const size_t size : {size_t{5}, size_t{1000}, size_t{9000}, size_t{140000}}) {
+      image.staleMarks = size == 9000 ? 500 : 0;  // more than is copied into memory
       const Bytes bare = image.bytes(), full = with(tune(size)), after = without(full, size);
       std::optional<State> state;
       const auto prepare = [&](const Bytes& bytes) {
@@ -181,6 +186,27 @@ TEST_F(MusicEntry, GoesInAndOutDespiteAFailingCall) {
       EXPECT_EQ(after, file.read());
     }
   }
+}
+
+// What stands behind the pictures is kept for the way back, but not in memory.
+TEST_F(MusicEntry, HoldsNoCopyOfALongFile) {
+  constexpr off_t kLong = 32 << 20;
+  const Bytes bytes = image.bytes();
+  ASSERT_EQ(0, truncate(file.c_str(), kLong));
+  std::ofstream(file.path(), std::ios::app)
+      .write(reinterpret_cast<const char*>(bytes.data() + bytes.size() - kMarkBytes), kMarkBytes);
+  ASSERT_EQ(1, show.OpenShow(file.c_str(), 1, 1));
+  tune(1);
+  ASSERT_EQ(0, truncate(source.c_str(), kLong));
+  const auto peak = [] {
+    rusage usage{};
+    getrusage(RUSAGE_SELF, &usage);
+    return usage.ru_maxrss;  // KiB
+  };
+  const long before = peak();
+  ASSERT_EQ(1, show.AddMusic(source.c_str()));
+  EXPECT_LT(peak() - before, 8 << 10);
+  EXPECT_EQ(3u, reopened(file).size());
 }
 
 TEST_F(MusicEntry, NeedsItsMemory) {

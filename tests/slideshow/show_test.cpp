@@ -1,5 +1,6 @@
 // Shows in use: creating, adding, inserting, drawing, in a file and in memory.
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <climits>
@@ -110,7 +111,10 @@ TEST(Show, EditsKeepOrderAndLimits) {
   EXPECT_EQ(0, show.AddImageToBuffer(text.data(), 0, "x"));
   EXPECT_EQ(0, show.AddImageToBuffer(nullptr, 10, "x"));
   const std::string folder = testing::TempDir();
-  for (const char* path : {static_cast<const char*>(nullptr), "", folder.c_str()}) {
+  const TempFile pipe(".pipe");
+  ASSERT_EQ(0, mkfifo(pipe.c_str(), 0600));
+  for (const char* path :
+       {static_cast<const char*>(nullptr), "", folder.c_str(), pipe.c_str(), "/dev/zero"}) {
     EXPECT_EQ(0, show.AddImageToFile(path, "x"));
   }
   EXPECT_EQ(0, add_sample(show, 1000, 2, "too thin to show"));

@@ -263,12 +263,16 @@ class PeloTest(ToolTest):
         text.write_text("not a picture")
         empty = self.folder / "empty.jpg"
         empty.touch()
+        pipe = self.folder / "pipe"
+        os.mkfifo(pipe)
         for command, rest in (("info", ()), ("exif", ()), ("decode", ("-",))):
             self.pelo(command, self.folder / "absent.jpg", *rest, expect=CANNOT_OPEN)
             self.pelo(command, self.folder, *rest, expect=CANNOT_OPEN)
             self.pelo(command, empty, *rest, expect=CANNOT_OPEN)
+            self.pelo(command, pipe, *rest, expect=CANNOT_OPEN)
             self.pelo(command, text, *rest, expect=REFUSED)
-        self.pelo("encode", self.folder / "absent.ppm", "-", expect=CANNOT_OPEN)
+        for path in (self.folder / "absent.ppm", "/dev/zero"):
+            self.pelo("encode", path, "-", expect=CANNOT_OPEN)
         headless = self.folder / "headless.jpg"
         headless.write_bytes(self.photo.read_bytes().replace(b"\xff\xc4", b"\xff\xfe"))  # no Huffman tables
         self.pelo("decode", headless, "-", expect=REFUSED)

@@ -1,5 +1,6 @@
 """vss from the outside: what it prints and writes, what it refuses, and its exit codes."""
 import json
+import os
 import pathlib
 import resource
 import shutil
@@ -141,7 +142,6 @@ class VssTest(ToolTest):
         self.assertEqual(self.vss("music", "get", self.show, "-"), tune.read_bytes())
         self.vss("music", "get", self.show, self.show, expect=REFUSED)
         self.vss("music", "remove", self.show)
-        # The old end mark stays in front of the new one.
         self.assertEqual(len(self.show.read_bytes()), len(before) + MARK)
         self.vss("compact", self.show)
         self.assertEqual(len(self.show.read_bytes()), len(before))
@@ -178,7 +178,10 @@ class VssTest(ToolTest):
         thin = self.picture("thin", 1000, 2)
         large = self.picture("large", 5008, 16)
         self.vss("add", self.show, text, thin, large, expect=REFUSED)
-        self.vss("add", self.show, self.folder / "absent.jpg", expect=CANNOT_OPEN)
+        pipe = self.folder / "pipe"
+        os.mkfifo(pipe)
+        for path in (self.folder / "absent.jpg", pipe):
+            self.vss("add", self.show, path, expect=CANNOT_OPEN)
         self.vss("insert", self.show, 2, self.small, expect=REFUSED)
         self.vss("insert", self.show, -1, self.small, expect=REFUSED)
         self.vss("get", self.show, 1, self.folder / "out.jpg", expect=REFUSED)

@@ -70,6 +70,13 @@ TEST(ReEncode, FilesLikeBuffers) {
   EXPECT_EQ(fitted.jpeg, out.read());
   EXPECT_EQ(0, TAVIRPELO_ReEncodeJpegToFile(nullptr, 0, 0, out.c_str(), 3000));
   EXPECT_EQ(0, TAVIRPELO_ReEncodeJpegToFile(const_cast<char*>("no such file"), 0, 0, out.c_str(), 3000));
+  EXPECT_EQ(fitted.jpeg, out.read());
+  // Onto the source, too small a target first.
+  for (const int target : {327, 3000}) {
+    EXPECT_EQ(target == 3000,
+              TAVIRPELO_ReEncodeJpegToFile(const_cast<char*>(in.c_str()), 0, 0, in.c_str(), target));
+    EXPECT_EQ(target == 3000 ? fitted.jpeg : source, in.read());
+  }
 }
 
 TEST(ReEncode, WhatIsRefused) {

@@ -29,7 +29,8 @@ Turned turn(Bytes source, Size size, int angle, int flip, bool inSteps = false) 
   auto* buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(700));
   if (buffer == nullptr) return {0, {}};
   ELO_DESTINATION destination{ELO_TO_MEMORY, 700, 0, 0, nullptr, buffer};
-  ELO_TRANSFORMSTATE state{};
+  int stray = 0;  // an idle state's context may be anything
+  ELO_TRANSFORMSTATE state{0, 0, inSteps ? &stray : nullptr};
   Turned result{4, {}, 0};
   while (result.answer == 4) {
     result.answer = elo_rotate_jpeg(source.data(), static_cast<int>(source.size()), size.width,
@@ -95,6 +96,8 @@ TEST(Rotate, WhatIsRefused) {
   const Bytes zero = overwritten(source, find_marker(source, 0xDB) + 9, {0});  // a quantiser of nothing
   EXPECT_EQ(0, turn(zero, {40, 24}, 90, 0).answer);
   EXPECT_EQ(1, elo_abort_rotate_jpeg(nullptr));
+  ELO_TRANSFORMSTATE stray{0, 0, &idle};
+  EXPECT_EQ(1, elo_abort_rotate_jpeg(&stray));
 }
 
 TEST(Rotate, AbortedAnywhereEndsTheFile) {

@@ -5,6 +5,8 @@
 #include <cstdio>
 #include <cstring>
 
+#include "tavirpelo/io.h"
+
 namespace pelo_tool {
 namespace {
 
@@ -25,7 +27,7 @@ Exit cannot_read(const std::string& path) {
 }  // namespace
 
 Exit read_all(const std::string& path, std::vector<uint8_t>& bytes) {
-  File file(path == "-" ? stdin : std::fopen(path.c_str(), "rb"));
+  File file(path == "-" ? stdin : TAVIRPELO_OsFopen(path.c_str(), "rb"));
   if (!file) return cannot_read(path);
   uint8_t part[65536];
   while (size_t count = std::fread(part, 1, sizeof part, file.get())) {
@@ -43,7 +45,7 @@ Exit Input::open(const std::string& path) {
     info_.reset(TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, bytes_.data(),
                                         static_cast<int>(bytes_.size()), TAVIRPELO_RGB888, 0));
   } else {
-    File file(std::fopen(path.c_str(), "rb"));  // only to learn why a file does not open
+    File file(TAVIRPELO_OsFopen(path.c_str(), "rb"));  // only to learn why a file does not open
     if (!file) return cannot_read(path);
     info_.reset(TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_FILE, path_.data(), 0, TAVIRPELO_RGB888, 0));
   }

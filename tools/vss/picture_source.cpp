@@ -8,6 +8,7 @@
 #include <cstring>
 #include <filesystem>
 
+#include "tavirpelo/io.h"
 #include "tools/common/text.h"
 #include "tools/vss/picture.h"
 #include "tools/vss/show_file.h"
@@ -30,7 +31,7 @@ bool decodes(const SlideShow& show, const std::string& path, const TAVIRPELO_HIN
 }
 
 Exit check_source(const SlideShow& show, const std::string& path, TAVIRPELO_HINFO& header) {
-  std::FILE* stream = std::fopen(path.c_str(), "rb");
+  std::FILE* stream = TAVIRPELO_OsFopen(path.c_str(), "rb");
   if (!stream) return fail(Exit::kCannotOpen, "{}: {}", path, std::strerror(errno));
   std::fclose(stream);
   if (show.subfileCount >= SlideShow::kMaxFileSubfiles) {

@@ -2,6 +2,7 @@
 // segment that carries it.
 #include "codec/formats/jpeg/exif/exif_writer.h"
 
+#include <algorithm>
 #include <cstring>
 
 #include "codec/base/byte_order.h"
@@ -20,6 +21,10 @@ constexpr uint32_t kDpi = 72;
 constexpr uint32_t kInch = 2;
 constexpr uint32_t kCosited = 2;
 constexpr uint32_t kJpeg = 6;
+
+// A segment's length has 16 bits and counts all but the marker.
+constexpr uint32_t kSegmentHead = 4 + kExifIdentifierSize;
+constexpr uint32_t kMaxTiff = 0xFFFF + 2 - kSegmentHead;
 
 // Bytes from a directory's start to the values behind it: count, entries, offset of the next directory.
 constexpr uint32_t directory_size(uint32_t entries) {
@@ -88,6 +93,16 @@ uint32_t put_thumbnail_directory(uint8_t* base, uint32_t start, const ELO_EXIFCO
   return data + content.thumbnailLength;
 }
 
+// The whole structure; 0 when it exceeds `capacity`.
+uint32_t create_exif(uint8_t* tiff, const ELO_EXIFCONTENT& content, uint32_t capacity) {
+  if (exif_size(content) > capacity) return 0;
+  tiff[0] = tiff[1] = 'I';
+  __elo_WriteSHORT_LE(tiff + 2, 42);
+  __elo_WriteLONG_LE(tiff + 4, tiff::kHeaderSize);
+  const uint32_t end = put_image_directory(tiff, content);
+  return content.thumbnail == nullptr ? end : put_thumbnail_directory(tiff, end, content);
+}
+
 }  // namespace
 
 void __elo_WriteLONG_LE(uint8_t* dst, uint32_t value) {
@@ -130,28 +145,21 @@ uint8_t* __elo_WriteASCIITag(uint8_t* entry, uint8_t* base, uint32_t* position, 
   return put_entry(entry, tag, tiff::kAscii, size, offset);
 }
 
-uint32_t __elo_CreateExif(uint8_t* tiff, const ELO_EXIFCONTENT* content, uint32_t capacity) {
-  if (tiff == nullptr || content == nullptr || exif_size(*content) > capacity) return 0;
-  tiff[0] = tiff[1] = 'I';
-  __elo_WriteSHORT_LE(tiff + 2, 42);
-  __elo_WriteLONG_LE(tiff + 4, tiff::kHeaderSize);
-  const uint32_t end = put_image_directory(tiff, *content);
-  return content->thumbnail == nullptr ? end : put_thumbnail_directory(tiff, end, *content);
+uint32_t __elo_CreateExif(uint8_t* tiff, const ELO_EXIFCONTENT* content) {
+  return tiff == nullptr || content == nullptr ? 0 : create_exif(tiff, *content, kMaxTiff);
 }
 
 uint32_t pelo::jpeg::write_exif_segment(uint8_t* segment, const ELO_EXIFCONTENT& content,
                                         uint32_t capacity) {
-  constexpr uint32_t kHead = 4 + kExifIdentifierSize;
-  constexpr uint32_t kMaxTiff = 0xFFFF + 2 - kHead;  // the length counts all but the marker
-  if (capacity < kHead) return 0;
-  const uint32_t room = capacity - kHead < kMaxTiff ? capacity - kHead : kMaxTiff;
-  const uint32_t length = __elo_CreateExif(segment + kHead, &content, room);
+  if (capacity < kSegmentHead) return 0;
+  const uint32_t room = std::min(capacity - kSegmentHead, kMaxTiff);
+  const uint32_t length = create_exif(segment + kSegmentHead, content, room);
   if (length == 0) return 0;
   segment[0] = 0xFF;
   segment[1] = static_cast<uint8_t>(Marker::kApp1);
-  store_be16(segment + 2, length + kHead - 2);
+  store_be16(segment + 2, length + kSegmentHead - 2);
   std::memcpy(segment + 4, "Exif\0", kExifIdentifierSize);
-  return length + kHead;
+  return length + kSegmentHead;
 }
 
 int pelo_get_app1_mark(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_APP1* app1) {

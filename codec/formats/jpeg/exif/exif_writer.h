@@ -35,10 +35,9 @@ TAVIRPELO_API uint8_t* __elo_WriteRATIONALTag(uint8_t* entry, uint8_t* base, uin
 TAVIRPELO_API uint8_t* __elo_WriteASCIITag(uint8_t* entry, uint8_t* base, uint32_t* position,
                                            uint16_t tag, const char* text);
 
-// Writes IFD0, and IFD1 for a thumbnail, into `tiff`; returns the bytes written, 0 when they exceed
-// `capacity`.
-TAVIRPELO_API uint32_t __elo_CreateExif(uint8_t* tiff, const ELO_EXIFCONTENT* content,
-                                        uint32_t capacity);
+// Writes IFD0, and IFD1 for a thumbnail, into `tiff`, which has room for them; returns the bytes
+// written. 0, and nothing written, for more than the 65,527 that a segment carries.
+TAVIRPELO_API uint32_t __elo_CreateExif(uint8_t* tiff, const ELO_EXIFCONTENT* content);
 
 // Bytes of the segment that pelo_get_app1_mark writes.
 enum { PELO_APP1_SIZE = 136 };

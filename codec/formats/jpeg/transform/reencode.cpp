@@ -175,7 +175,10 @@ Outcome reduce(const Job& job, int ratio, ELO_DESTINATION& destination) {
   return outcome;
 }
 
-bool encode_within(Job& job, ELO_DESTINATION& destination) {
+bool encode_within(const Input& source, int target, ELO_DESTINATION& destination) {
+  Job job{};
+  job.source = source;
+  job.target = target;
   if (job.target < kGreyHeaders || !read_source(job)) return false;
   if (job.target < kGreyHeaders + job.app1.length) return false;
   const int ratio = __elo_get_outimage_scale_ratio(job.width, job.height, job.target);
@@ -186,6 +189,32 @@ bool encode_within(Job& job, ELO_DESTINATION& destination) {
     outcome = reduce(job, ratio, destination);
   }
   return outcome == Outcome::kFits;
+}
+
+// ---- to a file ----
+
+// Room for the target and some more; without memory it starts empty.
+ELO_DESTINATION working_memory(int target) {
+  const int64_t capacity =
+      std::clamp<int64_t>(int64_t{target} * 1200 / 1024, kDestinationStep, INT_MAX / 2);
+  ELO_DESTINATION work{ELO_TO_MEMORY, 0, 0, 0, nullptr, nullptr};
+  work.buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(static_cast<size_t>(capacity)));
+  if (work.buffer != nullptr) work.capacity = static_cast<int>(capacity);
+  return work;
+}
+
+bool write_out(const ELO_DESTINATION& work, FILE* file) {
+  const auto count = static_cast<size_t>(work.total);
+  return TAVIRPELO_OsFwrite(work.buffer, 1, count, file) == count;
+}
+
+// The file is opened last: it may be the source.
+bool write_out(const ELO_DESTINATION& work, const char* path) {
+  FILE* file = TAVIRPELO_OsFopen(path, "wb");
+  if (file == nullptr) return false;
+  const bool written = write_out(work, file);
+  const bool closed = TAVIRPELO_OsFclose(file) == 0;
+  return written && closed;
 }
 
 }  // namespace
@@ -224,18 +253,10 @@ int __elo_resize_jpeg_image(void* source, int size, int kind, int width, int hei
 
 int __elo_bits_contol_encode(void* source, int size, int kind, ELO_DESTINATION* destination,
                              int target) {
-  Job job{};
-  job.source = {kind, source, size};
-  job.target = target;
-  if (destination->kind == ELO_TO_MEMORY) return encode_within(job, *destination);
-  const int64_t capacity =
-      std::clamp<int64_t>(int64_t{target} * 1200 / 1024, kDestinationStep, INT_MAX / 2);
-  ELO_DESTINATION work{ELO_TO_MEMORY, 0, 0, 0, nullptr, nullptr};
-  work.buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(static_cast<size_t>(capacity)));
-  if (work.buffer != nullptr) work.capacity = static_cast<int>(capacity);
-  bool done = encode_within(job, work);
-  const auto count = static_cast<size_t>(work.total);
-  if (done) done = TAVIRPELO_OsFwrite(work.buffer, 1, count, destination->file) == count;
+  const Input input{kind, source, size};
+  if (destination->kind == ELO_TO_MEMORY) return encode_within(input, target, *destination);
+  ELO_DESTINATION work = working_memory(target);
+  const bool done = encode_within(input, target, work) && write_out(work, destination->file);
   destination->total = work.total;
   discard(work);
   return done;
@@ -253,12 +274,10 @@ int elo_re_encode_to_buffer(void* source, int size, int kind, uint8_t** buffer, 
 }
 
 int elo_re_encode_to_file(void* source, int size, int kind, const char* path, int target) {
-  FILE* file = TAVIRPELO_OsFopen(path, "wb");
-  if (file == nullptr) return 0;
-  ELO_DESTINATION destination{ELO_TO_FILE, 0, 0, 0, file, nullptr};
-  const int done = __elo_bits_contol_encode(source, size, kind, &destination, target);
-  const bool closed = TAVIRPELO_OsFclose(file) == 0;
-  return done && closed;
+  ELO_DESTINATION work = working_memory(target);
+  const bool done = encode_within({kind, source, size}, target, work) && write_out(work, path);
+  discard(work);
+  return done;
 }
 
 int TAVIRPELO_ReEncodeJpegToBuffer(void* source, int size, int kind, uint8_t** buffer, int* outSize,

@@ -124,6 +124,13 @@ int fail(ELO_DESTINATION& destination) {
   return kFailed;
 }
 
+// The turn that a state holds, which is then idle. What stands in an idle one is not looked at.
+OwnedRotation take(ELO_TRANSFORMSTATE& state) {
+  void* context = state.started != 0 ? state.context : nullptr;
+  state = {};
+  return OwnedRotation(static_cast<Rotation*>(context));
+}
+
 // Runs a new or a kept turn; the state keeps it when there is more to do.
 int proceed(OwnedRotation rotation, ELO_DESTINATION& destination, ELO_TRANSFORMSTATE* state) {
   const int result = rotation->run(state != nullptr);
@@ -150,12 +157,8 @@ int elo_rotate_jpeg(void* source, int size, int width, int height, ELO_DESTINATI
   const Operation* operation = find_operation(angle, flip != 0);
   if (destination == nullptr) return kFailed;
   if (operation == nullptr || source == nullptr) return fail(*destination);
-  if (state != nullptr && state->context != nullptr) {
-    OwnedRotation kept(static_cast<Rotation*>(state->context));
-    *state = {};
-    return proceed(std::move(kept), *destination, state);
-  }
-  OwnedRotation rotation = begin(source, size, {width, height}, destination, *operation);
+  OwnedRotation rotation = state != nullptr ? take(*state) : nullptr;
+  if (rotation == nullptr) rotation = begin(source, size, {width, height}, destination, *operation);
   if (rotation == nullptr) return fail(*destination);
   return proceed(std::move(rotation), *destination, state);
 }
@@ -166,8 +169,6 @@ void __elo_jpeg_abort_transform(void* context) {
 }
 
 int elo_abort_rotate_jpeg(ELO_TRANSFORMSTATE* state) {
-  if (state == nullptr) return 1;
-  __elo_jpeg_abort_transform(state->context);
-  *state = {};
+  if (state != nullptr) __elo_jpeg_abort_transform(take(*state).release());
   return 1;
 }

@@ -1,5 +1,5 @@
-// Where each row of MCUs of a baseline scan begins, so that its rows can be decoded from the last to the
-// first: entropy-coded data can only be read forwards.
+// Resuming a baseline scan at any row of MCUs. Where a row's codes begin, and what its DC values are
+// predicted from, follows from every code before it: one pass notes both for each row.
 #pragma once
 
 #include "codec/formats/jpeg/transform/coefficient_source.h"
