@@ -36,7 +36,7 @@ Reason reason_of_open(int systemError) {
     case EPERM:
       return Reason::kPermission;
     case EISDIR:
-    case EINVAL:
+    case ESPIPE:
       return Reason::kNotAFile;
     default:
       return Reason::kCannotOpen;
