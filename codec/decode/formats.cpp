@@ -97,20 +97,7 @@ int parse(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_HINFO* hinfo) {
     record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NULL);
     return TAVIRPELO_FORMAT_UNKNOWN;
   }
-  if (hinfo != nullptr) *hinfo = {};
-  BufferedSource source;
-  if (!source.open(decInfo->pIO)) {
-    record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_MEMORY);
-    return TAVIRPELO_FORMAT_UNKNOWN;
-  }
-  if (TAVIRPELO_Seek_IO(decInfo->pIO, 0, SEEK_SET) < 0) return TAVIRPELO_FORMAT_UNKNOWN;
-  decInfo->imageFormat = detect(*decInfo, *source.get(), hinfo);
-  if (hinfo != nullptr) {
-    hinfo->width = decInfo->imageWidth;
-    hinfo->height = decInfo->imageHeight;
-    hinfo->sourceSize = static_cast<int>(source->size);
-  }
-  return decInfo->imageFormat;
+  return parse_source(*decInfo, hinfo, detect);
 }
 
 }  // namespace pelo

@@ -27,6 +27,11 @@ struct Format {
   int code, animatedCode;  // what parse() answers; animatedCode 0: the format has no animations
 };
 
+// Reads a head from the start of the object's source by `detect`, as TAVIRPELO_Parser does of any
+// format's: sets imageFormat and the record's sizes.
+using Detect = int (*)(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+int parse_source(TAVIRPELO_DECINFO& decInfo, TAVIRPELO_HINFO* hinfo, Detect detect);
+
 // ---- what the parsers share ----
 
 // Notes a picture's size and its number of images; gives back the format's code.

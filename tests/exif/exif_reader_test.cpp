@@ -1,5 +1,6 @@
 // What the EXIF reader takes from a segment: every member, both byte orders, and which entries it
 // ignores.
+#include "codec/formats/jpeg/exif/exif_abi.h"
 #include "codec/formats/jpeg/exif/exif_reader.h"
 
 #include <memory>

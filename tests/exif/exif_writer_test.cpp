@@ -1,5 +1,6 @@
 // The EXIF writer: its bytes, its bounds, what the reader and an independent reader make of it, and the
 // way through the encoder.
+#include "codec/formats/jpeg/exif/exif_abi.h"
 #include "codec/formats/jpeg/exif/exif_writer.h"
 
 #include <gmock/gmock.h>

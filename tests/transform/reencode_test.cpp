@@ -1,5 +1,6 @@
 // Fitting into a number of bytes: never more than the target, from every kind of source, and the
 // arithmetic of gains, tables and scales.
+#include "codec/formats/jpeg/transform/transform_abi.h"
 #include "codec/formats/jpeg/transform/reencode.h"
 
 #include <cmath>

@@ -16,4 +16,10 @@ int parse_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO
                static_cast<uint32_t>(hinfo->height));
 }
 
+int detect(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo) {
+  if (PELOJ_CheckBuffer(&source, kSniffBytes) == 0) return cut_head("JPEG headers");
+  if (sniff(source.buffer + source.pos)) return parse_head(decInfo, source, hinfo);
+  return refuse(Reason::kUnknownFormat, "JPEG headers"), TAVIRPELO_FORMAT_UNKNOWN;
+}
+
 }  // namespace pelo::jpeg

@@ -2,7 +2,7 @@
 #include <climits>
 #include <cstring>
 
-#include "codec/formats/jpeg/exif/tiff.h"
+#include "codec/formats/jpeg/tiff.h"
 #include "codec/formats/jpeg/header_scan_segments.h"
 
 namespace pelo::jpeg {

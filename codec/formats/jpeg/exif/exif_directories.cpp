@@ -4,8 +4,7 @@
 
 #include "codec/formats/jpeg/exif/exif_members.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
+namespace pelo::jpeg {
 
 static_assert(sizeof(void*) != 4 ||
               (sizeof(TAVIRPELO_EXIFINFO) == 200 && offsetof(TAVIRPELO_EXIFINFO, make) == 20 &&
@@ -91,12 +90,11 @@ class SubDirectories {
   bool walk(const Field& field) {
     if (field.type != tiff::kLong || field.count != 1) return true;
     if (field.tag == kExifPointer) {
-      return std::exchange(exifWalked_, true) ||
-             PELOJ_ReadExifIFDInfo(&tiff_, field.number, &info_) == 0;
+      return std::exchange(exifWalked_, true) || read_exif_ifd(&tiff_, field.number, &info_) == 0;
     }
     if (std::exchange(gpsWalked_, true)) return true;
     if (info_.gps == nullptr) info_.gps = os_new<Gps>().release();
-    return info_.gps != nullptr && PELOJ_ReadGpsIFDInfo(&tiff_, field.number, info_.gps) == 0;
+    return info_.gps != nullptr && read_gps_ifd(&tiff_, field.number, info_.gps) == 0;
   }
 
  private:
@@ -115,7 +113,7 @@ uint32_t fill(const tiff::Structure& tiff, uint32_t offset, std::span<const Memb
 
 }  // namespace
 
-uint32_t PELOJ_Read0thIFDInfo(const tiff::Structure* tiff, uint32_t offset, TAVIRPELO_EXIFINFO* info) {
+uint32_t read_ifd0(const tiff::Structure* tiff, uint32_t offset, TAVIRPELO_EXIFINFO* info) {
   SubDirectories directories(*tiff, *info);
   return walk_directory(*tiff, offset, [&](const Field& field) {
     if (field.tag == kExifPointer || field.tag == kGpsPointer) return directories.walk(field);
@@ -123,10 +121,12 @@ uint32_t PELOJ_Read0thIFDInfo(const tiff::Structure* tiff, uint32_t offset, TAVI
   });
 }
 
-uint32_t PELOJ_ReadExifIFDInfo(const tiff::Structure* tiff, uint32_t offset, TAVIRPELO_EXIFINFO* info) {
+uint32_t read_exif_ifd(const tiff::Structure* tiff, uint32_t offset, TAVIRPELO_EXIFINFO* info) {
   return fill<Exif>(*tiff, offset, kExifMembers, *info);
 }
 
-uint32_t PELOJ_ReadGpsIFDInfo(const tiff::Structure* tiff, uint32_t offset, TAVIRPELO_GPSINFO* gps) {
+uint32_t read_gps_ifd(const tiff::Structure* tiff, uint32_t offset, TAVIRPELO_GPSINFO* gps) {
   return fill<Gps>(*tiff, offset, kGpsMembers, *gps);
 }
+
+}  // namespace pelo::jpeg

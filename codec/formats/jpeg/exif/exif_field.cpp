@@ -1,11 +1,11 @@
 // One entry of an EXIF directory: how long its value is, and where it stands.
 #include "codec/formats/jpeg/exif/exif_reader.h"
 
-using namespace pelo;
+namespace pelo::jpeg {
 
 // Bytes up to four stand in the entry. So does a single number; two SHORTs would too, but are not read.
 // Everything else, rationals always, stands at the offset that the entry holds.
-int PELOJ_ReadExifField(const tiff::Structure* tiff, const uint8_t* entry, PELOJ_EXIFFIELD* field) {
+int read_field(const tiff::Structure* tiff, const uint8_t* entry, PELOJ_EXIFFIELD* field) {
   const tiff::Entry head = tiff::parse_entry(entry, tiff->order);
   const uint32_t unit = tiff::type_size(head.type);
   if (unit == 0) return 0;
@@ -24,3 +24,5 @@ int PELOJ_ReadExifField(const tiff::Structure* tiff, const uint8_t* entry, PELOJ
   field->length = static_cast<uint32_t>(length);  // fits: four bytes or inside the structure
   return 1;
 }
+
+}  // namespace pelo::jpeg

@@ -7,13 +7,11 @@
 #include "codec/formats/jpeg/marker_codes.h"
 #include "platform/android_log.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 struct DestroyExif {
-  void operator()(TAVIRPELO_EXIFINFO* info) const { PELOJ_DestroyExifInfo(info); }
+  void operator()(TAVIRPELO_EXIFINFO* info) const { destroy_info(info); }
 };
 using ExifInfo = std::unique_ptr<TAVIRPELO_EXIFINFO, DestroyExif>;
 
@@ -24,14 +22,6 @@ ExifInfo new_exif_info() {
 TAVIRPELO_EXIFINFO* fail(const char* text) {
   log_error(text);
   return nullptr;
-}
-
-TAVIRPELO_EXIFINFO* create_from(int ioType, void* source, int size) {
-  TAVIRPELO_DECINFO* decInfo = TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_RGB565, 0);
-  if (decInfo == nullptr) return nullptr;
-  TAVIRPELO_EXIFINFO* info = PELOJ_CreatExifInfo(decInfo);
-  TAVIRPELO_DestroyDecInfo(decInfo);
-  return info;
 }
 
 void destroy_gps(TAVIRPELO_GPSINFO* gps) {
@@ -52,7 +42,7 @@ uint32_t segment_tiff_size(const uint8_t* segment, uint32_t size) {
 
 }  // namespace
 
-TAVIRPELO_EXIFINFO* PELOJ_CreatExifInfo(TAVIRPELO_DECINFO* decInfo) {
+TAVIRPELO_EXIFINFO* create_info(TAVIRPELO_DECINFO* decInfo) {
   if (decInfo == nullptr) return nullptr;
   ExifInfo info = new_exif_info();
   if (!info) return fail("PELOJ_CreatExifInfo : TAVIRPELO_EXIFINFO is null");
@@ -61,23 +51,31 @@ TAVIRPELO_EXIFINFO* PELOJ_CreatExifInfo(TAVIRPELO_DECINFO* decInfo) {
   if (TAVIRPELO_Seek_IO(decInfo->pIO, 0, SEEK_SET) < 0) {
     return fail("PELOJ_CreatExifInfo : seek fail");
   }
-  if (PELOJ_GetExifInfo(cursor.get(), info.get()) != PELOJ_OK) {
+  if (find_and_read(cursor.get(), info.get()) != PELOJ_OK) {
     return fail("PELOJ_CreatExifInfo : PELOJ_GetExifInfo fail");
   }
   return info.release();
 }
 
-TAVIRPELO_EXIFINFO* PELOJ_CreatExifInfoUseExifBuffer(const uint8_t* segment, int size) {
+TAVIRPELO_EXIFINFO* create_info_of_source(int ioType, void* source, int size) {
+  TAVIRPELO_DECINFO* decInfo = TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_RGB565, 0);
+  if (decInfo == nullptr) return nullptr;
+  TAVIRPELO_EXIFINFO* info = create_info(decInfo);
+  TAVIRPELO_DestroyDecInfo(decInfo);
+  return info;
+}
+
+TAVIRPELO_EXIFINFO* create_info_of_segment(const uint8_t* segment, int size) {
   if (segment == nullptr || size < 0) return nullptr;
   const uint32_t length = segment_tiff_size(segment, static_cast<uint32_t>(size));
   ExifInfo info = length == 0 ? nullptr : new_exif_info();
   if (!info) return nullptr;
   constexpr uint32_t kTiff = 4 + kExifIdentifierSize;
-  return PELOJ_ReadExifInfo(segment + kTiff, kTiff, length, info.get()) == PELOJ_OK ? info.release()
-                                                                                    : nullptr;
+  return read_structure(segment + kTiff, kTiff, length, info.get()) == PELOJ_OK ? info.release()
+                                                                                : nullptr;
 }
 
-int PELOJ_DestroyExifInfo(TAVIRPELO_EXIFINFO* info) {
+int destroy_info(TAVIRPELO_EXIFINFO* info) {
   if (info == nullptr) {
     log_error("PELOJ_DestroyExifInfo : TAVIRPELO_EXIFINFO is null");
     return 0;
@@ -92,26 +90,4 @@ int PELOJ_DestroyExifInfo(TAVIRPELO_EXIFINFO* info) {
   return 1;
 }
 
-TAVIRPELO_EXIFINFO* elo_create_jpeg_exifinfo_from_file(const char* path) {
-  return create_from(TAVIRPELO_IO_FILE, const_cast<char*>(path), 0);
-}
-
-TAVIRPELO_EXIFINFO* elo_create_jpeg_exifinfo_from_buffer(const void* buffer, int size) {
-  return create_from(TAVIRPELO_IO_MEMORY, const_cast<void*>(buffer), size);
-}
-
-int elo_destory_jpeg_exifinfo(TAVIRPELO_EXIFINFO* info) {
-  return PELOJ_DestroyExifInfo(info);
-}
-
-TAVIRPELO_EXIFINFO* TAVIRPELO_CreateJpegExifInfoFromFile(const char* path) {
-  return path == nullptr ? nullptr : elo_create_jpeg_exifinfo_from_file(path);
-}
-
-TAVIRPELO_EXIFINFO* TAVIRPELO_CreateJpegExifInfoFromBuffer(const void* buffer, int size) {
-  return buffer == nullptr || size == 0 ? nullptr : elo_create_jpeg_exifinfo_from_buffer(buffer, size);
-}
-
-int TAVIRPELO_DestroyJpegExifInfo(TAVIRPELO_EXIFINFO* info) {
-  return info == nullptr ? 0 : elo_destory_jpeg_exifinfo(info);
-}
+}  // namespace pelo::jpeg

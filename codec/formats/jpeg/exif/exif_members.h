@@ -110,7 +110,7 @@ uint32_t walk_directory(const tiff::Structure& tiff, uint32_t offset, Take take)
   if (!directory) return 0;
   for (uint32_t i = 0; i < directory->count; ++i) {
     Field field;
-    if (PELOJ_ReadExifField(&tiff, directory->entry(i), &field) == 0) continue;
+    if (read_field(&tiff, directory->entry(i), &field) == 0) continue;
     if (!take(field)) return 0;
   }
   return directory->next;

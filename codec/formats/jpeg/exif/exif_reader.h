@@ -2,7 +2,7 @@
 #pragma once
 
 #include "codec/base/buffered_source.h"
-#include "codec/formats/jpeg/exif/tiff.h"
+#include "codec/formats/jpeg/tiff.h"
 #include "tavirpelo/exif.h"
 
 // One entry of a directory and where its value stands.
@@ -15,34 +15,28 @@ typedef struct PELOJ_EXIFFIELD {
   const uint8_t* value;  // inside the structure; null for a single SHORT or LONG
 } PELOJ_EXIFFIELD;
 
+namespace pelo::jpeg {
+
 // Finds the EXIF segment from the source's position on, which must be at the SOI, and reads it. 200 once
 // it had a valid TIFF header; 201.
-TAVIRPELO_API int PELOJ_GetExifInfo(PELOJ_SOURCE* cursor, TAVIRPELO_EXIFINFO* info);
+int find_and_read(PELOJ_SOURCE* cursor, TAVIRPELO_EXIFINFO* info);
 
 // Reads `size` bytes of TIFF data whose header stands at `base` in its source. 200, or 201 for a bad
 // header.
-TAVIRPELO_API int PELOJ_ReadExifInfo(const uint8_t* tiff, uint32_t base, uint32_t size,
-                                     TAVIRPELO_EXIFINFO* info);
+int read_structure(const uint8_t* tiff, uint32_t base, uint32_t size, TAVIRPELO_EXIFINFO* info);
 
 // Take over the entries of a directory; return the offset of the next one, 0 when there is none, or when
 // the directory does not fit or memory ran out in it.
-TAVIRPELO_API uint32_t PELOJ_Read0thIFDInfo(const pelo::tiff::Structure* tiff, uint32_t offset,
-                                            TAVIRPELO_EXIFINFO* info);
-TAVIRPELO_API uint32_t PELOJ_ReadExifIFDInfo(const pelo::tiff::Structure* tiff, uint32_t offset,
-                                             TAVIRPELO_EXIFINFO* info);
-TAVIRPELO_API uint32_t PELOJ_ReadGpsIFDInfo(const pelo::tiff::Structure* tiff, uint32_t offset,
-                                            TAVIRPELO_GPSINFO* gps);
+uint32_t read_ifd0(const pelo::tiff::Structure* tiff, uint32_t offset, TAVIRPELO_EXIFINFO* info);
+uint32_t read_exif_ifd(const pelo::tiff::Structure* tiff, uint32_t offset, TAVIRPELO_EXIFINFO* info);
+uint32_t read_gps_ifd(const pelo::tiff::Structure* tiff, uint32_t offset, TAVIRPELO_GPSINFO* gps);
 
 // Reads the twelve bytes of an entry; 1, or 0 when it is to be ignored: no type, two SHORTs, or a value
 // outside the structure.
-TAVIRPELO_API int PELOJ_ReadExifField(const pelo::tiff::Structure* tiff, const uint8_t* entry,
-                                      PELOJ_EXIFFIELD* field);
+int read_field(const pelo::tiff::Structure* tiff, const uint8_t* entry, PELOJ_EXIFFIELD* field);
 
 // Size of the JPEG that begins at `data`. 200, or 201 with the results untouched.
-TAVIRPELO_API int PELOJ_GetJPEGResolution(const uint8_t* data, uint32_t size, uint32_t* width,
-                                          uint32_t* height);
-
-namespace pelo::jpeg {
+int jpeg_size(const uint8_t* data, uint32_t size, uint32_t* width, uint32_t* height);
 
 constexpr uint32_t kExifIdentifierSize = 6;  // "Exif", two zeros
 bool is_exif_identifier(const uint8_t* bytes);
@@ -50,5 +44,11 @@ bool is_exif_identifier(const uint8_t* bytes);
 // Takes over the entries of the thumbnail's directory.
 void read_thumbnail_directory(const tiff::Structure& tiff, uint32_t offset,
                               TAVIRPELO_EXIFTHUMBNAIL& thumbnail);
+
+// Behind the given names of the public headers, which say what they do.
+TAVIRPELO_EXIFINFO* create_info_of_source(int ioType, void* source, int size);
+TAVIRPELO_EXIFINFO* create_info(TAVIRPELO_DECINFO* decInfo);
+TAVIRPELO_EXIFINFO* create_info_of_segment(const uint8_t* segment, int size);
+int destroy_info(TAVIRPELO_EXIFINFO* info);
 
 }  // namespace pelo::jpeg

@@ -6,9 +6,7 @@
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 // Reads n bytes, more than the reader's window if need be.
@@ -56,11 +54,11 @@ bool find_exif(PELOJ_SOURCE& cursor, uint32_t& remaining) {
 
 }  // namespace
 
-bool pelo::jpeg::is_exif_identifier(const uint8_t* bytes) {
+bool is_exif_identifier(const uint8_t* bytes) {
   return std::memcmp(bytes, "Exif\0", kExifIdentifierSize) == 0;
 }
 
-int PELOJ_GetExifInfo(PELOJ_SOURCE* cursor, TAVIRPELO_EXIFINFO* info) {
+int find_and_read(PELOJ_SOURCE* cursor, TAVIRPELO_EXIFINFO* info) {
   constexpr uint8_t kStart[] = {0xFF, static_cast<uint8_t>(Marker::kSoi)};
   uint32_t remaining;
   if (!source_need(*cursor, 2) || std::memcmp(source_take(*cursor, 2), kStart, 2) != 0)
@@ -69,15 +67,17 @@ int PELOJ_GetExifInfo(PELOJ_SOURCE* cursor, TAVIRPELO_EXIFINFO* info) {
   const uint32_t base = source_offset(*cursor);
   OsBuffer<uint8_t> tiff;
   if (!tiff.allocate(remaining) || !read(*cursor, tiff.data(), remaining)) return PELOJ_FAIL;
-  return PELOJ_ReadExifInfo(tiff.data(), base, remaining, info);
+  return read_structure(tiff.data(), base, remaining, info);
 }
 
-int PELOJ_ReadExifInfo(const uint8_t* data, uint32_t base, uint32_t size, TAVIRPELO_EXIFINFO* info) {
+int read_structure(const uint8_t* data, uint32_t base, uint32_t size, TAVIRPELO_EXIFINFO* info) {
   if (size < tiff::kHeaderSize) return PELOJ_FAIL;
   const auto header = tiff::parse_header(data);
   if (!header || header->ifd0 >= size) return PELOJ_FAIL;
   const tiff::Structure tiff{data, size, header->order, base};
-  const uint32_t ifd1 = PELOJ_Read0thIFDInfo(&tiff, header->ifd0, info);
+  const uint32_t ifd1 = read_ifd0(&tiff, header->ifd0, info);
   if (ifd1 != 0) read_thumbnail_directory(tiff, ifd1, info->thumbnail);
   return PELOJ_OK;
 }
+
+}  // namespace pelo::jpeg

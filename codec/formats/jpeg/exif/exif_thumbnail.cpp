@@ -6,8 +6,7 @@
 #include "codec/formats/jpeg/exif/exif_members.h"
 #include "codec/formats/jpeg/header_scan.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
+namespace pelo::jpeg {
 
 static_assert(sizeof(TAVIRPELO_EXIFTHUMBNAIL) == 40 && offsetof(TAVIRPELO_EXIFTHUMBNAIL, length) == 20 &&
               offsetof(TAVIRPELO_EXIFTHUMBNAIL, offset) == 32);
@@ -29,8 +28,7 @@ bool store_offset(Thumbnail& thumbnail, const Field& field, const tiff::Structur
 
 bool store_jpeg_offset(Thumbnail& thumbnail, const Field& field, const tiff::Structure& tiff) {
   if (tiff.holds(field.number, 0)) {
-    PELOJ_GetJPEGResolution(tiff.data + field.number, tiff.size - field.number, &thumbnail.width,
-                            &thumbnail.height);
+    jpeg_size(tiff.data + field.number, tiff.size - field.number, &thumbnail.width, &thumbnail.height);
   }
   return store_offset(thumbnail, field, tiff);
 }
@@ -85,7 +83,7 @@ bool read_resolution(PELOJ_SOURCE& source, uint32_t& width, uint32_t& height) {
 
 }  // namespace
 
-int PELOJ_GetJPEGResolution(const uint8_t* data, uint32_t size, uint32_t* width, uint32_t* height) {
+int jpeg_size(const uint8_t* data, uint32_t size, uint32_t* width, uint32_t* height) {
   if (size < 2 || size > INT_MAX || data[0] != 0xFF || data[1] != static_cast<uint8_t>(Marker::kSoi)) {
     return PELOJ_FAIL;
   }
@@ -104,10 +102,12 @@ int PELOJ_GetJPEGResolution(const uint8_t* data, uint32_t size, uint32_t* width,
   return PELOJ_OK;
 }
 
-void pelo::jpeg::read_thumbnail_directory(const tiff::Structure& tiff, uint32_t offset,
+void read_thumbnail_directory(const tiff::Structure& tiff, uint32_t offset,
                                           TAVIRPELO_EXIFTHUMBNAIL& thumbnail) {
   walk_directory(tiff, offset, [&](const Field& field) {
     return store_field<Thumbnail>(kThumbnailMembers, thumbnail, field, tiff);
   });
   thumbnail.present = thumbnail.length != 0;
 }
+
+}  // namespace pelo::jpeg

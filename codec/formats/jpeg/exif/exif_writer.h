@@ -17,37 +17,41 @@ typedef struct ELO_EXIFCONTENT {
   const uint8_t* thumbnail;  // a JPEG; null: none
 } ELO_EXIFCONTENT;
 
+namespace pelo::jpeg {
+
 // Store 4 or 2 bytes, least significant first.
-TAVIRPELO_API void __elo_WriteLONG_LE(uint8_t* dst, uint32_t value);
-TAVIRPELO_API void __elo_WriteSHORT_LE(uint8_t* dst, uint32_t value);
+void write_le32(uint8_t* dst, uint32_t value);
+void write_le16(uint8_t* dst, uint32_t value);
 // Copies a text with its terminator; returns the bytes written.
-TAVIRPELO_API uint32_t __elo_WriteASCII_String(uint8_t* dst, const char* text);
+uint32_t write_text(uint8_t* dst, const char* text);
 
 // Each writes the twelve bytes of an entry and returns where the next one goes. Values that the entry
 // has no room for go to base + *position, which advances. Nothing is checked: the caller provides the
 // space.
-TAVIRPELO_API uint8_t* __elo_WriteSHORTTag(uint8_t* entry, uint16_t tag, uint32_t value);
-TAVIRPELO_API uint8_t* __elo_WriteLONGTag(uint8_t* entry, uint16_t tag, uint32_t value);
-TAVIRPELO_API uint8_t* __elo_WriteRATIONALTag(uint8_t* entry, uint8_t* base, uint32_t* position,
-                                              uint16_t tag, uint32_t numerator, uint32_t denominator);
+uint8_t* write_short_tag(uint8_t* entry, uint16_t tag, uint32_t value);
+uint8_t* write_long_tag(uint8_t* entry, uint16_t tag, uint32_t value);
+uint8_t* write_rational_tag(uint8_t* entry, uint8_t* base, uint32_t* position, uint16_t tag,
+                            uint32_t numerator, uint32_t denominator);
 // The text goes to the value area even when it is short, although TIFF has values of up to four bytes in
 // the entry: readers understand texts from four characters on. A null text: count 0, offset 0.
-TAVIRPELO_API uint8_t* __elo_WriteASCIITag(uint8_t* entry, uint8_t* base, uint32_t* position,
-                                           uint16_t tag, const char* text);
+uint8_t* write_ascii_tag(uint8_t* entry, uint8_t* base, uint32_t* position, uint16_t tag,
+                         const char* text);
 
 // Writes IFD0, and IFD1 for a thumbnail, into `tiff`, which has room for them; returns the bytes
 // written. 0, and nothing written, for more than the 65,527 that a segment carries.
-TAVIRPELO_API uint32_t __elo_CreateExif(uint8_t* tiff, const ELO_EXIFCONTENT* content);
+uint32_t create_exif(uint8_t* tiff, const ELO_EXIFCONTENT* content);
 
-// Bytes of the segment that pelo_get_app1_mark writes.
+}  // namespace pelo::jpeg
+
+// Bytes of the segment that make_app1 writes.
 enum { PELO_APP1_SIZE = 136 };
+
+namespace pelo::jpeg {
 
 // Writes an APP1 segment that carries the orientation of the source's EXIF to app1->data, which holds at
 // least PELO_APP1_SIZE writable bytes, and its length to app1->length. 1, or 0 when the source has no
 // readable EXIF. The source is left anywhere.
-TAVIRPELO_API int pelo_get_app1_mark(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_APP1* app1);
-
-namespace pelo::jpeg {
+int make_app1(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_APP1* app1);
 
 // Writes a complete APP1 segment; returns its bytes, 0 when they exceed `capacity` or a segment's
 // 65,535.

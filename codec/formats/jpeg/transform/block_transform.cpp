@@ -20,11 +20,13 @@ void transform_block(const CoefficientBlock* __restrict in, CoefficientBlock* __
   }
 }
 
-constexpr Operation kOperations[] = {
-    {0, true, false, true, false, __elo_flip_h},       {180, true, true, false, false, __elo_flip_v},
-    {180, false, true, true, false, __elo_rotate_180}, {90, false, true, false, true, __elo_rotate_90},
-    {90, true, true, true, true, __elo_ro90_f},        {270, false, false, true, true, __elo_rotate_270},
-    {270, true, false, false, true, __elo_ro270_f}};
+constexpr Operation kOperations[] = {{0, true, false, true, false, flip_across},
+                                     {180, true, true, false, false, flip_down},
+                                     {180, false, true, true, false, rotate_block_180},
+                                     {90, false, true, false, true, rotate_block_90},
+                                     {90, true, true, true, true, rotate_block_90_flipped},
+                                     {270, false, false, true, true, rotate_block_270},
+                                     {270, true, false, false, true, rotate_block_270_flipped}};
 
 }  // namespace
 
@@ -50,28 +52,26 @@ void transform_mcu(const Operation& operation, const McuGrid& grid, const Coeffi
   }
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-void __elo_flip_h(const CoefficientBlock* in, CoefficientBlock* out) {
+void flip_across(const CoefficientBlock* in, CoefficientBlock* out) {
   transform_block<false, true, false>(in, out);
 }
-void __elo_flip_v(const CoefficientBlock* in, CoefficientBlock* out) {
+void flip_down(const CoefficientBlock* in, CoefficientBlock* out) {
   transform_block<true, false, false>(in, out);
 }
-void __elo_rotate_180(const CoefficientBlock* in, CoefficientBlock* out) {
+void rotate_block_180(const CoefficientBlock* in, CoefficientBlock* out) {
   transform_block<true, true, false>(in, out);
 }
-void __elo_rotate_90(const CoefficientBlock* in, CoefficientBlock* out) {
+void rotate_block_90(const CoefficientBlock* in, CoefficientBlock* out) {
   transform_block<true, false, true>(in, out);
 }
-void __elo_rotate_270(const CoefficientBlock* in, CoefficientBlock* out) {
+void rotate_block_270(const CoefficientBlock* in, CoefficientBlock* out) {
   transform_block<false, true, true>(in, out);
 }
-void __elo_ro90_f(const CoefficientBlock* in, CoefficientBlock* out) {
+void rotate_block_90_flipped(const CoefficientBlock* in, CoefficientBlock* out) {
   transform_block<true, true, true>(in, out);
 }
-void __elo_ro270_f(const CoefficientBlock* in, CoefficientBlock* out) {
+void rotate_block_270_flipped(const CoefficientBlock* in, CoefficientBlock* out) {
   transform_block<false, false, true>(in, out);
 }
+
+}  // namespace pelo::jpeg

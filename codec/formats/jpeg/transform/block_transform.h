@@ -26,20 +26,13 @@ const Operation* find_operation(int angle, bool flip);
 void transform_mcu(const Operation& operation, const McuGrid& grid, const CoefficientBlock* in,
                    CoefficientBlock* out);
 
-}  // namespace pelo::jpeg
-
 // One block; `in` and `out` are different. ro90_f and ro270_f are the turns with mirroring.
-TAVIRPELO_API void __elo_flip_h(const pelo::jpeg::CoefficientBlock* in,
-                                pelo::jpeg::CoefficientBlock* out);
-TAVIRPELO_API void __elo_flip_v(const pelo::jpeg::CoefficientBlock* in,
-                                pelo::jpeg::CoefficientBlock* out);
-TAVIRPELO_API void __elo_rotate_90(const pelo::jpeg::CoefficientBlock* in,
-                                   pelo::jpeg::CoefficientBlock* out);
-TAVIRPELO_API void __elo_rotate_180(const pelo::jpeg::CoefficientBlock* in,
-                                    pelo::jpeg::CoefficientBlock* out);
-TAVIRPELO_API void __elo_rotate_270(const pelo::jpeg::CoefficientBlock* in,
-                                    pelo::jpeg::CoefficientBlock* out);
-TAVIRPELO_API void __elo_ro90_f(const pelo::jpeg::CoefficientBlock* in,
-                                pelo::jpeg::CoefficientBlock* out);
-TAVIRPELO_API void __elo_ro270_f(const pelo::jpeg::CoefficientBlock* in,
-                                 pelo::jpeg::CoefficientBlock* out);
+void flip_across(const pelo::jpeg::CoefficientBlock* in, pelo::jpeg::CoefficientBlock* out);
+void flip_down(const pelo::jpeg::CoefficientBlock* in, pelo::jpeg::CoefficientBlock* out);
+void rotate_block_90(const pelo::jpeg::CoefficientBlock* in, pelo::jpeg::CoefficientBlock* out);
+void rotate_block_180(const pelo::jpeg::CoefficientBlock* in, pelo::jpeg::CoefficientBlock* out);
+void rotate_block_270(const pelo::jpeg::CoefficientBlock* in, pelo::jpeg::CoefficientBlock* out);
+void rotate_block_90_flipped(const pelo::jpeg::CoefficientBlock* in, pelo::jpeg::CoefficientBlock* out);
+void rotate_block_270_flipped(const pelo::jpeg::CoefficientBlock* in, pelo::jpeg::CoefficientBlock* out);
+
+}  // namespace pelo::jpeg

@@ -3,8 +3,7 @@
 #include <algorithm>
 #include <utility>
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 // A table is kept once, under its number.
@@ -19,8 +18,7 @@ void add_table(TransformParameters& parameters, const PELOJ_JDINFO& jd, uint8_t 
 
 }  // namespace
 
-void __elo_jpeg_adv_set_enc_info_from_dec_info(CoefficientSource* source,
-                                               TransformParameters* parameters) {
+void parameters_of_source(CoefficientSource* source, TransformParameters* parameters) {
   const PELOJ_JDINFO& jd = source->decoder();
   const McuGrid& grid = source->grid();
   *parameters = {};
@@ -34,7 +32,7 @@ void __elo_jpeg_adv_set_enc_info_from_dec_info(CoefficientSource* source,
   }
 }
 
-void elo_jpeg_transpose_enc_info(TransformParameters* parameters) {
+void transpose_parameters(TransformParameters* parameters) {
   for (CodingParameters::Component& component : parameters->coding.components)
     std::swap(component.h, component.v);
   for (auto& table : parameters->coding.quant) {
@@ -43,3 +41,5 @@ void elo_jpeg_transpose_enc_info(TransformParameters* parameters) {
     }
   }
 }
+
+}  // namespace pelo::jpeg

@@ -15,11 +15,11 @@ struct TransformParameters {
   std::array<std::array<int64_t, 64>, kQuantTables> ratio;
 };
 
-}  // namespace pelo::jpeg
-
 // Takes components, sampling factors and each distinct quantisation table of the source; ratios are 1.
-TAVIRPELO_API void __elo_jpeg_adv_set_enc_info_from_dec_info(
-    pelo::jpeg::CoefficientSource* source, pelo::jpeg::TransformParameters* parameters);
+void parameters_of_source(pelo::jpeg::CoefficientSource* source,
+                          pelo::jpeg::TransformParameters* parameters);
 
 // Exchanges vertical and horizontal: sampling factors and the tables' rows and columns.
-TAVIRPELO_API void elo_jpeg_transpose_enc_info(pelo::jpeg::TransformParameters* parameters);
+void transpose_parameters(pelo::jpeg::TransformParameters* parameters);
+
+}  // namespace pelo::jpeg

@@ -4,8 +4,8 @@
 #include <array>
 #include <memory>
 
-#include "codec/formats/jpeg/strips/strips.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
+#include "codec/formats/jpeg/strips/strips.h"
 
 namespace pelo::jpeg {
 

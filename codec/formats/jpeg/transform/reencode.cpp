@@ -5,13 +5,13 @@
 #include <cstring>
 #include <utility>
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/exif/exif_writer.h"
+#include "codec/formats/jpeg/head.h"
 #include "codec/formats/jpeg/transform/requantise.h"
 #include "tavirpelo/parse.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 constexpr int kPasses = 5;
@@ -49,12 +49,13 @@ bool read_source(Job& job) {
   const Frame frame = open(job.source);
   if (frame == nullptr) return false;
   TAVIRPELO_HINFO header{};
-  if (TAVIRPELO_Parser(frame.get(), &header) != TAVIRPELO_FORMAT_JPEG) return false;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
+  if (parse_source(*frame, &header, detect) != TAVIRPELO_FORMAT_JPEG) return false;
   job.width = header.width;
   job.height = header.height;
   job.source.size = frame->pIO->size;
   job.app1 = {job.app1Bytes.data(), 0};
-  if (!pelo_get_app1_mark(frame.get(), &job.app1)) job.app1.length = 0;
+  if (!make_app1(frame.get(), &job.app1)) job.app1.length = 0;
   return true;
 }
 
@@ -81,7 +82,7 @@ bool code_again(const Job& job, CoefficientSource& source, const TransformParame
   restart(destination);
   ELO_ENCODER* encoder = begin_bands(&image, &destination, &options, &parameters.coding);
   if (encoder == nullptr) return false;
-  const auto control = source.progressive() ? __elo_prog_bits_control : __elo_bits_control;
+  const auto control = source.progressive() ? requantise_progressive : requantise_sequential;
   const bool sameGrid =
       encoder->mcusAcross == source.grid().across && encoder->mcusDown == source.grid().down;
   const bool coded = sameGrid && control(&source, &parameters, encoder);
@@ -97,9 +98,8 @@ Outcome requantise(const Job& job, const Input& input, int width, int height,
   for (int pass = 0; pass < kPasses; ++pass) {
     CoefficientSource source;
     if (!source.open(input.kind, input.address, input.size, width, height)) return Outcome::kFailed;
-    if (pass == 0) __elo_jpeg_adv_set_enc_info_from_dec_info(&source, &parameters);
-    const Coarsening coarsening =
-        __elo_set_qunat_table(&parameters, __elo_get_update_gain(size, target));
+    if (pass == 0) parameters_of_source(&source, &parameters);
+    const Coarsening coarsening = set_gained_table(&parameters, updated_gain(size, target));
     if (coarsening == Coarsening::kFailed) return Outcome::kFailed;
     if (coarsening == Coarsening::kTooCoarse) return Outcome::kTooLarge;
     if (!code_again(job, source, parameters, destination)) return Outcome::kFailed;
@@ -156,8 +156,8 @@ Outcome reduce(const Job& job, int ratio, ELO_DESTINATION& destination) {
     outcome = Outcome::kFailed;
     if (width == 0 || height == 0) break;
     restart(reduced);
-    if (!__elo_resize_jpeg_image(job.source.address, job.source.size, job.source.kind, width, height,
-                                 job.segment(), &reduced)) {
+    if (!resize_within(job.source.address, job.source.size, job.source.kind, width, height,
+                       job.segment(), &reduced)) {
       break;
     }
     if (reduced.total <= job.target) {
@@ -181,7 +181,7 @@ bool encode_within(const Input& source, int target, ELO_DESTINATION& destination
   job.target = target;
   if (job.target < kGreyHeaders || !read_source(job)) return false;
   if (job.target < kGreyHeaders + job.app1.length) return false;
-  const int ratio = __elo_get_outimage_scale_ratio(job.width, job.height, job.target);
+  const int ratio = scale_for_target(job.width, job.height, job.target);
   Outcome outcome = Outcome::kTooLarge;
   if (ratio == kWholeSize) outcome = requantise(job, job.source, job.width, job.height, destination);
   // Reduced pictures are coded in colour.
@@ -219,7 +219,7 @@ bool write_out(const ELO_DESTINATION& work, const char* path) {
 
 }  // namespace
 
-int __elo_get_outimage_scale_ratio(int width, int height, int target) {
+int scale_for_target(int width, int height, int target) {
   const int64_t estimate = int64_t{width} * height * 12 / 160;
   if (estimate <= target) return kWholeSize;
   const int64_t percent = int64_t{100} * target / estimate;
@@ -231,8 +231,8 @@ int __elo_get_outimage_scale_ratio(int width, int height, int target) {
   return static_cast<int>(ratio);
 }
 
-int __elo_resize_jpeg_image(void* source, int size, int kind, int width, int height,
-                            const TAVIRPELO_APP1* app1, ELO_DESTINATION* destination) {
+int resize_within(void* source, int size, int kind, int width, int height, const TAVIRPELO_APP1* app1,
+                  ELO_DESTINATION* destination) {
   const Frame frame = open({kind, source, size});
   Band band;
   if (frame == nullptr || !band.allocate(width)) return 0;
@@ -251,8 +251,7 @@ int __elo_resize_jpeg_image(void* source, int size, int kind, int width, int hei
   return coded && finished;
 }
 
-int __elo_bits_contol_encode(void* source, int size, int kind, ELO_DESTINATION* destination,
-                             int target) {
+int encode_within_target(void* source, int size, int kind, ELO_DESTINATION* destination, int target) {
   const Input input{kind, source, size};
   if (destination->kind == ELO_TO_MEMORY) return encode_within(input, target, *destination);
   ELO_DESTINATION work = working_memory(target);
@@ -262,33 +261,21 @@ int __elo_bits_contol_encode(void* source, int size, int kind, ELO_DESTINATION* 
   return done;
 }
 
-int elo_re_encode_to_buffer(void* source, int size, int kind, uint8_t** buffer, int* outSize,
-                            int target) {
+int reencode_to_buffer(void* source, int size, int kind, uint8_t** buffer, int* outSize, int target) {
   ELO_DESTINATION destination{ELO_TO_MEMORY, std::max(*outSize, 0), 0, 0, nullptr, *buffer};
   if (*buffer == nullptr) destination.capacity = 0;
-  const int done = __elo_bits_contol_encode(source, size, kind, &destination, target);
+  const int done = encode_within_target(source, size, kind, &destination, target);
   if (!done) discard(destination);
   *buffer = destination.buffer;
   *outSize = destination.total;
   return done;
 }
 
-int elo_re_encode_to_file(void* source, int size, int kind, const char* path, int target) {
+int reencode_to_file(void* source, int size, int kind, const char* path, int target) {
   ELO_DESTINATION work = working_memory(target);
   const bool done = encode_within({kind, source, size}, target, work) && write_out(work, path);
   discard(work);
   return done;
 }
 
-int TAVIRPELO_ReEncodeJpegToBuffer(void* source, int size, int kind, uint8_t** buffer, int* outSize,
-                                   int target) {
-  if (source == nullptr || buffer == nullptr || *buffer == nullptr || outSize == nullptr) {
-    debug_PeloCodecError = TAVIRPELO_CODEC_ARGUMENT;
-    return 0;
-  }
-  return elo_re_encode_to_buffer(source, size, kind, buffer, outSize, target);
-}
-
-int TAVIRPELO_ReEncodeJpegToFile(void* source, int size, int kind, const char* path, int target) {
-  return source != nullptr ? elo_re_encode_to_file(source, size, kind, path, target) : 0;
-}
+}  // namespace pelo::jpeg

@@ -3,16 +3,26 @@
 
 #include "tavirpelo/transform.h"
 
+namespace pelo::jpeg {
+
 // The scale (1024 = 1.0) at which a picture of width x height pixels is estimated to take `target`
 // bytes.
-TAVIRPELO_API int __elo_get_outimage_scale_ratio(int width, int height, int target);
+int scale_for_target(int width, int height, int target);
 
 // Decodes a source to width x height and encodes it at quality 50 behind the APP1 segment. 1, or 0 when
 // it cannot be decoded so or memory is short.
-TAVIRPELO_API int __elo_resize_jpeg_image(void* source, int size, int kind, int width, int height,
-                                          const TAVIRPELO_APP1* app1, ELO_DESTINATION* destination);
+int resize_within(void* source, int size, int kind, int width, int height, const TAVIRPELO_APP1* app1,
+                  ELO_DESTINATION* destination);
 
 // Encodes the source within `target` bytes to a memory destination, or to a file one whose file is open.
 // 1 or 0; the destination's buffer stays the caller's.
-TAVIRPELO_API int __elo_bits_contol_encode(void* source, int size, int kind,
-                                           ELO_DESTINATION* destination, int target);
+int encode_within_target(void* source, int size, int kind, ELO_DESTINATION* destination, int target);
+
+// Behind the given names of the public headers, which say what they do.
+int rotate_jpeg(void* source, int size, int width, int height, ELO_DESTINATION* destination, int angle,
+                int flip, ELO_TRANSFORMSTATE* state);
+int abort_rotation(ELO_TRANSFORMSTATE* state);
+int reencode_to_buffer(void* source, int size, int kind, uint8_t** buffer, int* outSize, int target);
+int reencode_to_file(void* source, int size, int kind, const char* path, int target);
+
+}  // namespace pelo::jpeg

@@ -5,9 +5,7 @@
 #include "codec/formats/jpeg/tables.h"
 #include "codec/formats/jpeg/transform/stream_encoder.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 constexpr int kOne = 1024;  // fixed point of gains and ratios
@@ -73,21 +71,21 @@ int requantise(CoefficientSource& source, const TransformParameters& parameters,
       const size_t component = encoder.blockComponent[b % static_cast<size_t>(grid.blocks)];
       multiply(row[b], parameters.ratio[parameters.coding.components[component].quantTable]);
     }
-    if (!__elo_jpeg_enc_entroy_encoder(&encoder, row.data())) return 0;
+    if (!code_stream(&encoder, row.data())) return 0;
   }
   return 1;
 }
 
 }  // namespace
 
-int __elo_get_update_gain(int size, int target) {
+int updated_gain(int size, int target) {
   if (target < 1) return 10;
   const int64_t r = int64_t{kGainBase} * size / target;
   if (r < kGainBase) return kOne;
   return r >= kGainEnd ? 10 : kGains[static_cast<size_t>(r - kGainBase)];
 }
 
-Coarsening __elo_set_qunat_table(TransformParameters* parameters, int gain) {
+Coarsening set_gained_table(TransformParameters* parameters, int gain) {
   if (parameters->tableCount < 1 || parameters->tableCount > 2) return Coarsening::kFailed;
   const std::array<uint8_t, 64>* const bases[2] = {&kLuminanceQuant, &kChrominanceQuant};
   std::array<Scaled, 2> scaled;
@@ -103,12 +101,14 @@ Coarsening __elo_set_qunat_table(TransformParameters* parameters, int gain) {
   return Coarsening::kDone;
 }
 
-int __elo_bits_control(CoefficientSource* source, const TransformParameters* parameters,
-                       ELO_ENCODER* encoder) {
+int requantise_sequential(CoefficientSource* source, const TransformParameters* parameters,
+                          ELO_ENCODER* encoder) {
   return !source->progressive() && requantise(*source, *parameters, *encoder);
 }
 
-int __elo_prog_bits_control(CoefficientSource* source, const TransformParameters* parameters,
-                            ELO_ENCODER* encoder) {
+int requantise_progressive(CoefficientSource* source, const TransformParameters* parameters,
+                           ELO_ENCODER* encoder) {
   return source->progressive() && requantise(*source, *parameters, *encoder);
 }
+
+}  // namespace pelo::jpeg

@@ -47,15 +47,15 @@ bool Rotation::start(void* source, int size, Size picture, ELO_DESTINATION* dest
   if (!row_.allocate(blocks) || !turned_.allocate(blocks)) return false;
   take_parameters(size);
   if (!start_encoder(picture, destination)) return false;
-  return !operation.mirrorsRows || __elo_create_row_info(&source_, &snapshots_);
+  return !operation.mirrorsRows || make_row_record(&source_, &snapshots_);
 }
 
 void Rotation::take_parameters(int size) {
-  __elo_jpeg_adv_set_enc_info_from_dec_info(&source_, &parameters_);
+  parameters_of_source(&source_, &parameters_);
   parameters_.sourceSize = size;
   if (!operation_->transposes) return;
   parameters_.coding.restartPerRow = true;
-  elo_jpeg_transpose_enc_info(&parameters_);
+  transpose_parameters(&parameters_);
 }
 
 bool Rotation::start_encoder(Size picture, ELO_DESTINATION* destination) {
@@ -70,8 +70,7 @@ bool Rotation::start_encoder(Size picture, ELO_DESTINATION* destination) {
   const McuGrid& grid = source_.grid();
   const Size mcus = operation_->transposes ? Size{grid.down, grid.across} : Size{grid.across, grid.down};
   if (encoder_->mcusAcross != mcus.width || encoder_->mcusDown != mcus.height) return false;
-  return !operation_->transposes ||
-         __elo_jpeg_enc_col_encoder_init(&columns_, encoder_, parameters_.sourceSize);
+  return !operation_->transposes || begin_column(&columns_, encoder_, parameters_.sourceSize);
 }
 
 // The source's next row, in the order of the operation, transformed and coded.
@@ -79,7 +78,7 @@ bool Rotation::one_row() {
   const McuGrid& grid = source_.grid();
   if (operation_->mirrorsRows) {
     const auto row = static_cast<size_t>(grid.down - 1 - rowsTaken_);
-    if (!__ValorenOrbLoadPartialInfo(&source_.decoder(), &snapshots_[row])) return false;
+    if (!load_partial(&source_.decoder(), &snapshots_[row])) return false;
   }
   if (!source_.read_row(row_.data())) return false;
   for (int mcu = 0; mcu < grid.across; ++mcu) {
@@ -88,8 +87,8 @@ bool Rotation::one_row() {
                   turned_.data() + target * grid.blocks);
   }
   ++rowsTaken_;
-  return operation_->transposes ? __elo_jpeg_enc_col_entroy_encoder(&columns_, turned_.data())
-                                : __elo_jpeg_enc_entroy_encoder(encoder_, turned_.data());
+  return operation_->transposes ? code_column(&columns_, turned_.data())
+                                : code_stream(encoder_, turned_.data());
 }
 
 int Rotation::run(bool inSteps) {
@@ -102,7 +101,7 @@ int Rotation::run(bool inSteps) {
 
 bool Rotation::end() {
   if (encoder_ == nullptr) return true;
-  const bool joined = __elo_jpeg_enc_col_encoder_finish(&columns_);
+  const bool joined = finish_column(&columns_);
   const bool finished = finish_bands(std::exchange(encoder_, nullptr), nullptr, nullptr);
   columns_.encoder = nullptr;
   return joined && finished;
@@ -146,13 +145,8 @@ int proceed(OwnedRotation rotation, ELO_DESTINATION& destination, ELO_TRANSFORMS
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-int elo_rotate_jpeg(void* source, int size, int width, int height, ELO_DESTINATION* destination,
-                    int angle, int flip, ELO_TRANSFORMSTATE* state) {
+int rotate_jpeg(void* source, int size, int width, int height, ELO_DESTINATION* destination, int angle,
+                int flip, ELO_TRANSFORMSTATE* state) {
   if (angle == 0 && flip == 0) return kDone;
   const Operation* operation = find_operation(angle, flip != 0);
   if (destination == nullptr) return kFailed;
@@ -163,12 +157,14 @@ int elo_rotate_jpeg(void* source, int size, int width, int height, ELO_DESTINATI
   return proceed(std::move(rotation), *destination, state);
 }
 
-void __elo_jpeg_abort_transform(void* context) {
+void abort_turn(void* context) {
   const OwnedRotation rotation(static_cast<Rotation*>(context));
   if (rotation != nullptr) rotation->end();
 }
 
-int elo_abort_rotate_jpeg(ELO_TRANSFORMSTATE* state) {
-  if (state != nullptr) __elo_jpeg_abort_transform(take(*state).release());
+int abort_rotation(ELO_TRANSFORMSTATE* state) {
+  if (state != nullptr) abort_turn(take(*state).release());
   return 1;
 }
+
+}  // namespace pelo::jpeg

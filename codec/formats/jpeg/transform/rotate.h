@@ -7,5 +7,9 @@
 #include "codec/formats/jpeg/transform/stream_encoder.h"
 #include "tavirpelo/transform.h"
 
+namespace pelo::jpeg {
+
 // Ends a turn at any point: what is coded so far is completed, with an end mark; everything is released.
-TAVIRPELO_API void __elo_jpeg_abort_transform(void* context);
+void abort_turn(void* context);
+
+}  // namespace pelo::jpeg

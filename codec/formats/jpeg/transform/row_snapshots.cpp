@@ -1,8 +1,8 @@
 #include "codec/formats/jpeg/transform/row_snapshots.h"
 
-using namespace pelo::jpeg;
+namespace pelo::jpeg {
 
-void __ValorenOrbInitPartialInfo(const PELOJ_JDINFO* jdInfo, RowSnapshot* snapshot) {
+void init_partial(const PELOJ_JDINFO* jdInfo, RowSnapshot* snapshot) {
   const EntropyState& entropy = *jdInfo->entropy;
   *snapshot = {entropy.bits,         entropy.lastDc,
                entropy.restartsToGo, pelo::source_offset(*jdInfo->source),
@@ -10,7 +10,7 @@ void __ValorenOrbInitPartialInfo(const PELOJ_JDINFO* jdInfo, RowSnapshot* snapsh
                jdInfo->unreadMarker};
 }
 
-int __ValorenOrbLoadPartialInfo(PELOJ_JDINFO* jdInfo, const RowSnapshot* snapshot) {
+int load_partial(PELOJ_JDINFO* jdInfo, const RowSnapshot* snapshot) {
   if (!pelo::source_reposition(*jdInfo->source, snapshot->sourcePosition)) return 0;
   EntropyState& entropy = *jdInfo->entropy;
   entropy.bits = snapshot->bits;
@@ -22,7 +22,7 @@ int __ValorenOrbLoadPartialInfo(PELOJ_JDINFO* jdInfo, const RowSnapshot* snapsho
   return 1;
 }
 
-int __elo_create_row_info(CoefficientSource* source, RowSnapshots* snapshots) {
+int make_row_record(CoefficientSource* source, RowSnapshots* snapshots) {
   PELOJ_JDINFO& jd = source->decoder();
   const int rows = source->grid().down;
   if (!snapshots->allocate(static_cast<size_t>(rows))) return 0;
@@ -31,8 +31,10 @@ int __elo_create_row_info(CoefficientSource* source, RowSnapshots* snapshots) {
       TAVIRPELO_PrintMessage("__ValorenJpgProcessDataSkip : pJDInfo->CheckFn fail");
       return 0;
     }
-    __ValorenOrbInitPartialInfo(&jd, &(*snapshots)[static_cast<size_t>(row)]);
+    init_partial(&jd, &(*snapshots)[static_cast<size_t>(row)]);
     if (!source->skip_row()) return 0;
   }
   return 1;
 }
+
+}  // namespace pelo::jpeg

@@ -18,15 +18,12 @@ struct RowSnapshot {
 };
 using RowSnapshots = OsBuffer<RowSnapshot>;
 
-}  // namespace pelo::jpeg
-
 // Reads the whole source once, DC only, and notes where each of its rows begins. False when memory is
 // short, data fail or the progress function refuses.
-TAVIRPELO_API int __elo_create_row_info(pelo::jpeg::CoefficientSource* source,
-                                        pelo::jpeg::RowSnapshots* snapshots);
+int make_row_record(pelo::jpeg::CoefficientSource* source, pelo::jpeg::RowSnapshots* snapshots);
 
 // Notes, and goes back to, the decoder's place. Load: 0 when the source cannot be moved there.
-TAVIRPELO_API void __ValorenOrbInitPartialInfo(const PELOJ_JDINFO* jdInfo,
-                                               pelo::jpeg::RowSnapshot* snapshot);
-TAVIRPELO_API int __ValorenOrbLoadPartialInfo(PELOJ_JDINFO* jdInfo,
-                                              const pelo::jpeg::RowSnapshot* snapshot);
+void init_partial(const PELOJ_JDINFO* jdInfo, pelo::jpeg::RowSnapshot* snapshot);
+int load_partial(PELOJ_JDINFO* jdInfo, const pelo::jpeg::RowSnapshot* snapshot);
+
+}  // namespace pelo::jpeg

@@ -4,8 +4,7 @@
 #include <climits>
 #include <utility>
 
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 // Lends the encoder a stream's destination and bits.
@@ -47,8 +46,7 @@ bool reserve(ELO_DESTINATION& destination, int64_t bytes) {
   const int64_t missing = destination.used + bytes - destination.capacity;
   if (destination.kind != ELO_TO_MEMORY || missing <= 0) return true;
   if (missing > INT_MAX) return false;
-  uint8_t* grown =
-      grow_block(destination.buffer, destination.capacity, static_cast<int>(missing));
+  uint8_t* grown = grow_block(destination.buffer, destination.capacity, static_cast<int>(missing));
   if (grown == nullptr) return false;
   destination.buffer = grown;
   destination.capacity += static_cast<int>(missing);
@@ -57,7 +55,7 @@ bool reserve(ELO_DESTINATION& destination, int64_t bytes) {
 
 }  // namespace
 
-int __elo_jpeg_enc_entroy_encoder(ELO_ENCODER* encoder, const CoefficientBlock* row) {
+int code_stream(ELO_ENCODER* encoder, const CoefficientBlock* row) {
   for (int mcu = 0; mcu < encoder->mcusAcross; ++mcu, row += encoder->mcuBlocks) {
     if (!code_mcu(encoder, row)) return 0;
   }
@@ -65,7 +63,7 @@ int __elo_jpeg_enc_entroy_encoder(ELO_ENCODER* encoder, const CoefficientBlock* 
   return 1;
 }
 
-int __elo_jpeg_enc_col_encoder_init(ColumnEncoder* columns, ELO_ENCODER* encoder, int sourceSize) {
+int begin_column(ColumnEncoder* columns, ELO_ENCODER* encoder, int sourceSize) {
   columns->encoder = encoder;
   columns->column = 0;
   if (!columns->streams.allocate(static_cast<size_t>(encoder->mcusDown))) return 0;
@@ -80,7 +78,7 @@ int __elo_jpeg_enc_col_encoder_init(ColumnEncoder* columns, ELO_ENCODER* encoder
   return 1;
 }
 
-int __elo_jpeg_enc_col_entroy_encoder(ColumnEncoder* columns, const CoefficientBlock* column) {
+int code_column(ColumnEncoder* columns, const CoefficientBlock* column) {
   ELO_ENCODER& encoder = *columns->encoder;
   for (size_t i = 0; i < columns->streams.size(); ++i, column += encoder.mcuBlocks) {
     const UseStream use(encoder, columns->streams[i]);
@@ -90,7 +88,7 @@ int __elo_jpeg_enc_col_entroy_encoder(ColumnEncoder* columns, const CoefficientB
   return 1;
 }
 
-int __elo_jpeg_enc_col_encoder_finish(ColumnEncoder* columns) {
+int finish_column(ColumnEncoder* columns) {
   if (columns->encoder == nullptr) return 1;
   ELO_ENCODER& encoder = *columns->encoder;
   int64_t total = 0;
@@ -110,3 +108,5 @@ int __elo_jpeg_enc_col_encoder_finish(ColumnEncoder* columns) {
   columns->release();
   return 1;
 }
+
+}  // namespace pelo::jpeg

@@ -29,19 +29,16 @@ class ColumnEncoder {
   }
 };
 
-}  // namespace pelo::jpeg
-
 // Codes the MCUs of the next output row, one after another. 1 or 0.
-TAVIRPELO_API int __elo_jpeg_enc_entroy_encoder(ELO_ENCODER* encoder,
-                                                const pelo::jpeg::CoefficientBlock* row);
+int code_stream(ELO_ENCODER* encoder, const pelo::jpeg::CoefficientBlock* row);
 
 // Makes the streams. 1, or 0 when memory is short.
-TAVIRPELO_API int __elo_jpeg_enc_col_encoder_init(pelo::jpeg::ColumnEncoder* columns,
-                                                  ELO_ENCODER* encoder, int sourceSize);
+int begin_column(pelo::jpeg::ColumnEncoder* columns, ELO_ENCODER* encoder, int sourceSize);
 
 // Codes the next column: one MCU for each stream, from the upper row down. 1 or 0.
-TAVIRPELO_API int __elo_jpeg_enc_col_entroy_encoder(pelo::jpeg::ColumnEncoder* columns,
-                                                    const pelo::jpeg::CoefficientBlock* column);
+int code_column(pelo::jpeg::ColumnEncoder* columns, const pelo::jpeg::CoefficientBlock* column);
 
 // Completes every stream and joins them behind the headers, with restart markers between. 1 or 0.
-TAVIRPELO_API int __elo_jpeg_enc_col_encoder_finish(pelo::jpeg::ColumnEncoder* columns);
+int finish_column(pelo::jpeg::ColumnEncoder* columns);
+
+}  // namespace pelo::jpeg
