@@ -73,6 +73,51 @@ TEST(GifHostile, EveryTruncation) {
   EXPECT_EQ(0, decode(TAVIRPELOI_DecodeGIF, decInfo.get(), 23, 19).answer);
 }
 
+// Where each image's data begin and end, found without the library in a file of sub-blocks, extensions
+// and images.
+std::vector<std::pair<size_t, size_t>> image_data_places(const Bytes& file) {
+  const auto table = [](int flags) { return flags & 0x80 ? size_t{6} << (flags & 7) : 0; };
+  const auto behind_sub_blocks = [&](size_t at) {
+    while (file[at] != 0) at += file[at] + 1u;
+    return at + 1;
+  };
+  std::vector<std::pair<size_t, size_t>> places;
+  for (size_t at = 13 + table(file[10]); file[at] != 0x3B;) {
+    const bool image = file[at] == 0x2C;
+    const size_t data = at + (image ? 11 + table(file[at + 9]) : 2);
+    at = behind_sub_blocks(data);
+    if (image) places.emplace_back(data, at);
+  }
+  return places;
+}
+
+// Data with any byte in them, trailers and separators too: only the file's own trailer ends it with 3.
+TEST(GifHostile, AnimationsCutAnywhere) {
+  GifFile file = sample_gif(40, 30);
+  for (int i = 1; i < 4; ++i) {
+    file.images.push_back(file.images[0]);
+    file.images.back().indices = sample_indices(40, 30, 256, 77u + static_cast<uint32_t>(i));
+  }
+  const Bytes bytes = file.bytes();
+  const GifFrames all = decode_frames(bytes, 40, 30);
+  EXPECT_EQ(3, all.answer);
+  const auto places = image_data_places(bytes);
+  ASSERT_EQ(4u, places.size());
+  every_truncation(bytes, [&](const Bytes& cut) {
+    const auto starts = [&](const auto& place) { return place.first <= cut.size(); };
+    const auto frames = std::max<size_t>(1, std::count_if(places.begin(), places.end(), starts));
+    from_every_source(cut, 7, 0, [&](TAVIRPELO_DECINFO* decInfo) {
+      if (decInfo == nullptr) return;
+      for (size_t i = 0; i < frames; ++i) {
+        Bytes frame(40 * 30 * 4);
+        ASSERT_EQ(i + 1 < frames ? 1 : 0, TAVIRPELOI_DecodeAGIF(decInfo, frame.data(), 40, 30))
+            << cut.size() << " " << i;
+        if (places[i].second <= cut.size()) ASSERT_EQ(all.frames[i], frame) << cut.size();
+      }
+    });
+  });
+}
+
 TEST(GifHostile, EveryFlippedByte) {
   every_flip(victim().bytes(), {0xFF, 0x01, 0x80},
              [](const Bytes& damaged, size_t) { decode_all(damaged); });
