@@ -99,12 +99,9 @@ constexpr bool writes(int format) {
          (format >= TAVIRPELO_ARGB8888 && format <= TAVIRPELO_BGRA8888);
 }
 
-// Bytes of a row's pixels, and of a row with its padding to four bytes.
-constexpr int64_t pixel_bytes(int64_t width, int64_t bitCount) {
-  return (width * bitCount + 7) / 8;
-}
+// Bytes of a row with its padding to four.
 constexpr int64_t row_size(int64_t width, int64_t bitCount) {
-  return (pixel_bytes(width, bitCount) + 3) & ~int64_t{3};
+  return (width * bitCount + 31) / 32 * 4;
 }
 
 }  // namespace pelo::bmp

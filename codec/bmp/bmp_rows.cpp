@@ -66,20 +66,24 @@ void write_row(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelSt
   });
 }
 
-// Adds two pixels of a row to each output pixel's word, a quarter of each channel.
+// Adds a quarter of each channel of the pixels that output pixels draw on, as far as they are among the
+// row's pixels from `first` to before `end`, to the output pixels' words.
 template <class Source>
-void add_row(PELOI_BMPRECORD& record, const uint8_t* row) {
-  const uint32_t* quarter = record.columns.data();
-  const uint32_t* threeQuarters = quarter + record.outWidth;
-  uint32_t* words = record.accumulators.data();
+void add_pixels(PELOI_BMPRECORD& record, const uint8_t* bytes, int64_t first, int64_t end) {
   const auto word = [&](uint32_t column) {
     uint8_t rgba[4];
-    Source::pixel(record.colours, row, column, rgba);
+    Source::pixel(record.colours, bytes, column - static_cast<size_t>(first), rgba);
     const uint32_t bgra =
         uint32_t{rgba[3]} << 24 | uint32_t{rgba[0]} << 16 | uint32_t{rgba[1]} << 8 | rgba[2];
     return bgra >> 2 & 0x3F3F3F3F;
   };
-  for (int x = 0; x < record.outWidth; ++x) words[x] += word(quarter[x]) + word(threeQuarters[x]);
+  for (const uint32_t* points : {record.columns.data(), record.columns.data() + record.outWidth}) {
+    const uint32_t* pointsEnd = points + record.outWidth;
+    const uint32_t* column = std::lower_bound(points, pointsEnd, first);
+    uint32_t* words = record.accumulators.data() + (column - points);
+    for (pointsEnd = std::lower_bound(column, pointsEnd, end); column != pointsEnd; ++column)
+      *words++ += word(*column);
+  }
 }
 
 template <bool KeepsAlpha>
@@ -98,14 +102,14 @@ void write_words(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pi
 struct Family {
   void (*write)(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
                 const PELOI_BMPCOLOURS* colours);
-  void (*add)(PELOI_BMPRECORD& record, const uint8_t* row);
+  void (*add)(PELOI_BMPRECORD& record, const uint8_t* bytes, int64_t first, int64_t end);
   void (*writeResized)(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pixelStep,
                        int format);
 };
 
 // Row `up` counted from the last image row.
-const uint8_t* row_from_below(PELOI_BMPRECORD& record, int64_t up) {
-  return record.reader.row(record.topDown ? record.height - 1 - up : up);
+int64_t row_from_below(const PELOI_BMPRECORD& record, int64_t up) {
+  return record.topDown ? record.height - 1 - up : up;
 }
 
 // Output row `up`, counted from the last. False when the source lacks a row of it, which then keeps what
@@ -113,17 +117,22 @@ const uint8_t* row_from_below(PELOI_BMPRECORD& record, int64_t up) {
 bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Family& family) {
   const RowSpan span = record.grid.span(record.outHeight - 1 - up, 0, record.outWidth);
   if (record.oneToOne) {
-    const uint8_t* row = row_from_below(record, up);
-    if (row == nullptr) return false;
-    family.write(row, span.first, span.count, span.step, record.outFormat, &record.colours);
-    return true;
+    return record.reader.for_pieces(
+        row_from_below(record, up), [&](const uint8_t* bytes, int64_t first, int64_t count) {
+          const auto visible = static_cast<int>(std::min(count, span.count - first));
+          family.write(bytes, span.first + first * span.step, visible, span.step, record.outFormat,
+                       &record.colours);
+        });
   }
   std::fill_n(record.accumulators.data(), record.outWidth, 0u);
   const int64_t quarters[2] = {record.height / 4, int64_t{3} * record.height / 4};
   for (const int64_t phase : {quarters[record.topDown], quarters[!record.topDown]}) {  // in file order
-    const uint8_t* row = row_from_below(record, (phase + up * record.height) / record.outHeight);
-    if (row == nullptr) return false;
-    family.add(record, row);
+    const int64_t row = row_from_below(record, (phase + up * record.height) / record.outHeight);
+    const bool there =
+        record.reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
+          family.add(record, bytes, first, first + count);
+        });
+    if (!there) return false;
   }
   family.writeResized(record.accumulators.data(), span.first, span.count, span.step, record.outFormat);
   return true;
@@ -157,15 +166,15 @@ void PELOI_BMP_WriteResizedOutputWithAlpha(const uint32_t* accumulatorRow, uint8
 }
 
 // A member of the family: its row writer and its row decoder.
-#define PELOI_BMP_MEMBER(bits, Source, writeResized)                                       \
-  void PELOI_BMP_Write##bits##bitOutput(const uint8_t* row, uint8_t* output, int width,    \
-                                        ptrdiff_t pixelStep, int format,                   \
-                                        const PELOI_BMPCOLOURS* colours) {                 \
-    write_row<Source>(row, output, width, pixelStep, format, *colours);                    \
-  }                                                                                        \
-  int PELOI_BMP_Decode##bits##bitBMP(PELOI_BMPRECORD* record, int rows) {                  \
-    return decode_rows(*record, rows,                                                      \
-                       {PELOI_BMP_Write##bits##bitOutput, add_row<Source>, writeResized}); \
+#define PELOI_BMP_MEMBER(bits, Source, writeResized)                                          \
+  void PELOI_BMP_Write##bits##bitOutput(const uint8_t* row, uint8_t* output, int width,       \
+                                        ptrdiff_t pixelStep, int format,                      \
+                                        const PELOI_BMPCOLOURS* colours) {                    \
+    write_row<Source>(row, output, width, pixelStep, format, *colours);                       \
+  }                                                                                           \
+  int PELOI_BMP_Decode##bits##bitBMP(PELOI_BMPRECORD* record, int rows) {                     \
+    return decode_rows(*record, rows,                                                         \
+                       {PELOI_BMP_Write##bits##bitOutput, add_pixels<Source>, writeResized}); \
   }
 PELOI_BMP_MEMBER(1, PaletteSource<1>, PELOI_BMP_WriteResizedOutput)
 PELOI_BMP_MEMBER(4, PaletteSource<4>, PELOI_BMP_WriteResizedOutput)

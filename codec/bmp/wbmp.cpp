@@ -60,38 +60,47 @@ bool read_header(TAVIRPELO_IO* io, Wbmp& wbmp) {
 
 // Black or white in an output format.
 template <class Store>
-void write_plain_row(const uint8_t* row, const RowSpan& span, Store store) {
+void write_pixels(const uint8_t* bytes, const RowSpan& span, Store store) {
   for (int i = 0; i < span.count; ++i) {
-    store(span.first + i * span.step, packed_sample<1>(row, static_cast<size_t>(span.skip + i)) != 0);
+    store(span.first + i * span.step, packed_sample<1>(bytes, static_cast<size_t>(i)) != 0);
   }
 }
 
+// A picture that fits is cut nowhere: pixels of a row and of its span are the same.
 bool write_plain(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, int format) {
   for (uint32_t y = 0; y < wbmp.height; ++y) {
-    const uint8_t* row = reader.row(y);
-    if (row == nullptr) return false;
-    const RowSpan span = grid.span(y, 0, wbmp.width);
-    if (format == TAVIRPELO_RGB565) {
-      write_plain_row(row, span,
-                      [](uint8_t* out, bool white) { store_le16(out, white ? kWhite565 : 0u); });
-    } else {
-      write_plain_row(row, span, [](uint8_t* out, bool white) { std::memset(out, white ? 255 : 0, 3); });
-    }
+    const auto write = [&](const uint8_t* bytes, int64_t first, int64_t count) {
+      const RowSpan span = grid.span(y, first, count);
+      if (format == TAVIRPELO_RGB565) {
+        write_pixels(bytes, span,
+                     [](uint8_t* out, bool white) { store_le16(out, white ? kWhite565 : 0u); });
+      } else {
+        write_pixels(bytes, span,
+                     [](uint8_t* out, bool white) { std::memset(out, white ? 255 : 0, 3); });
+      }
+    };
+    if (!reader.for_pieces(y, write)) return false;
   }
   return true;
 }
 
 // Adds the two samples of each output pixel in a row.
-void add_row(const uint8_t* row, const Wbmp& wbmp, OsBuffer<uint32_t>& words) {
-  const auto out = static_cast<int64_t>(words.size());
-  AxisStepper quarter(wbmp.width, out, wbmp.width / 4);
-  AxisStepper threeQuarters(wbmp.width, out, int64_t{3} * wbmp.width / 4);
-  const auto sample = [row](const AxisStepper& at) {
-    return packed_sample<1>(row, static_cast<size_t>(at.position())) != 0 ? kWhiteSample : 0u;
+bool add_row(RowReader& reader, int64_t row, const Wbmp& wbmp, OsBuffer<uint32_t>& words) {
+  struct Point {
+    AxisStepper at;
+    size_t next;  // output pixel
   };
-  for (size_t x = 0; x < words.size(); ++x, quarter.advance(), threeQuarters.advance()) {
-    words[x] += sample(quarter) + sample(threeQuarters);
-  }
+  const auto out = static_cast<int64_t>(words.size());
+  Point points[] = {{{wbmp.width, out, wbmp.width / 4}, 0},
+                    {{wbmp.width, out, int64_t{3} * wbmp.width / 4}, 0}};
+  return reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
+    for (auto& [at, next] : points) {
+      for (; next < words.size() && at.position() < first + count; ++next, at.advance()) {
+        const bool white = packed_sample<1>(bytes, static_cast<size_t>(at.position() - first)) != 0;
+        words[next] += white ? kWhiteSample : 0u;
+      }
+    }
+  });
 }
 
 void write_words(const OsBuffer<uint32_t>& words, const RowSpan& span, int format) {
@@ -118,9 +127,7 @@ bool write_resized(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, 
   for (int y = 0; y < out.height; ++y, quarter.advance(), threeQuarters.advance()) {
     std::fill_n(words.data(), words.size(), 0u);
     for (const int64_t source : {quarter.position(), threeQuarters.position()}) {
-      const uint8_t* row = reader.row(source);
-      if (row == nullptr) return false;
-      add_row(row, wbmp, words);
+      if (!add_row(reader, source, wbmp, words)) return false;
     }
     write_words(words, grid.span(y, 0, out.width), format);
   }
@@ -178,7 +185,7 @@ int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   if (format != TAVIRPELO_RGB565 && format != TAVIRPELO_RGB888) return 1;
 
   RowReader reader;
-  if (!reader.open(io, wbmp.dataOffset, wbmp.rowBytes, wbmp.rowBytes, io->readSize)) return 0;
+  if (!reader.open(io, {wbmp.dataOffset, wbmp.rowBytes, wbmp.width, 1}, io->readSize)) return 0;
   const pelo::OutputGrid grid(output, {width, height}, (int64_t{width} - out.width + 1) / 2,
                               (int64_t{height} - out.height + 1) / 2, pelo::bytes_per_pixel(format));
   const bool plain =
