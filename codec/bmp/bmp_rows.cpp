@@ -77,13 +77,21 @@ void add_pixels(PELOI_BMPRECORD& record, const uint8_t* bytes, int64_t first, in
         uint32_t{rgba[3]} << 24 | uint32_t{rgba[0]} << 16 | uint32_t{rgba[1]} << 8 | rgba[2];
     return bgra >> 2 & 0x3F3F3F3F;
   };
-  for (const uint32_t* points : {record.columns.data(), record.columns.data() + record.outWidth}) {
-    const uint32_t* pointsEnd = points + record.outWidth;
-    const uint32_t* column = std::lower_bound(points, pointsEnd, first);
-    uint32_t* words = record.accumulators.data() + (column - points);
-    for (pointsEnd = std::lower_bound(column, pointsEnd, end); column != pointsEnd; ++column)
-      *words++ += word(*column);
-  }
+  const uint32_t* quarter = record.columns.data();
+  const uint32_t* threeQuarters = quarter + record.outWidth;
+  const ptrdiff_t outWidth = record.outWidth;
+  const auto output_from = [&](const uint32_t* columns, int64_t column) -> ptrdiff_t {
+    if (column <= columns[0]) return 0;
+    if (column > columns[outWidth - 1]) return outWidth;  // most rows are one piece
+    return std::lower_bound(columns, columns + outWidth, column) - columns;
+  };
+  uint32_t* words = record.accumulators.data();
+  const ptrdiff_t both = output_from(quarter, first), bothEnd = output_from(threeQuarters, end);
+  const ptrdiff_t quarterEnd = output_from(quarter, end);
+  ptrdiff_t x = output_from(threeQuarters, first);
+  for (; x < std::min(both, bothEnd); ++x) words[x] += word(threeQuarters[x]);
+  for (x = both; x < bothEnd; ++x) words[x] += word(quarter[x]) + word(threeQuarters[x]);
+  for (; x < quarterEnd; ++x) words[x] += word(quarter[x]);
 }
 
 template <bool KeepsAlpha>
