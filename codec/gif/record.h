@@ -83,9 +83,7 @@ struct Record : FormatState {
   static constexpr FormatKind kKind = FormatKind::kGif;
 
   Size screen;
-  int colourResolution;
   int backgroundIndex;
-  int aspectRatio;
   uint32_t globalTable[256];  // packed lanes, see pixel/lanes.h
   Frame frame;
   int interlacePass;  // 0: rows in order

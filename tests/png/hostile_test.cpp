@@ -113,8 +113,17 @@ TEST(PngHostile, ChunkTable) {
   const Bytes lines = zlib_stored(lines_of(image));
   const Bytes file = build_png(image, lines, 2);
   ASSERT_LT(2048u, png_chunks(file).size());
-  EXPECT_EQ(0, decode_png(file, 32, 32, 7).answer);
-  EXPECT_EQ(1, decode_png(build_png(image, lines, 3), 32, 32, 7).answer);
+  const Bytes want = decode_png(build_png(image, lines), 32, 32, 7).pixels;
+  from_every_source(file, 7, 0, [&](TAVIRPELO_DECINFO* decInfo) {
+    const Decode got = decode(TAVIRPELOI_DecodePNG, decInfo, 32, 32);
+    EXPECT_EQ(1, got.answer);
+    EXPECT_EQ(want, got.pixels);
+  });
+  // A stream of more chunks than the size that it claims has room for.
+  MemoryStream endless{file};
+  const DecInfo decInfo = open_stream(endless, 7);
+  decInfo->pIO->size = 1000;
+  EXPECT_EQ(0, decode(TAVIRPELOI_DecodePNG, decInfo.get(), 32, 32).answer);
   // No data at all; an empty chunk ends the file wherever it stands.
   EXPECT_EQ(0, answer(build_png(image, {})));
   auto chunks = png_chunks(file);
@@ -274,7 +283,8 @@ TEST(PngHostile, UnknownFilterKeepsTheRow) {
 
 TEST(PngHostile, ShortMemoryAtEveryStep) {
   for (const bool interlaced : {false, true}) {
-    const Bytes file = build_png(random_png_image(2, 6, 8, 20, 20, interlaced, false));
+    const PngImage image = random_png_image(2, 6, 8, 20, 20, interlaced, false);
+    const Bytes file = build_png(image, zlib_stored(lines_of(image)), 40);  // more than 16 chunks
     EXPECT_EQ(1, fail_each_allocation([&] { return decode_png(file, 9, 9, 7, 0x1000).answer; }));
   }
 }
