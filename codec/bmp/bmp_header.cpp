@@ -178,7 +178,10 @@ PELOI_BMPRECORD* PELOI_BMP_Initialize(TAVIRPELO_DECINFO* decInfo, int width, int
   record->requestHeight = height;
   record->outFormat = decInfo->outFormat;
   record->option = decInfo->option;
+  record->decInfo = decInfo;
   decInfo->scaleDenom = 1;
+  decInfo->imageWidth = record->width;
+  decInfo->imageHeight = record->height;
   choose_size(*record);
   if (!prepare_rows(*record, decInfo->pIO)) return nullptr;
   decInfo->outWidth = record->outWidth;

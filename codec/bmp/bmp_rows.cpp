@@ -7,6 +7,7 @@
 
 #include "codec/bmp/bmp_record.h"
 #include "codec/core/ground/byte_order.h"
+#include "codec/core/ground/row_progress.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/pixel_layout.h"
 
@@ -149,11 +150,13 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Family& family) {
 int decode_rows(PELOI_BMPRECORD& record, int rows, const Family& family) {
   constexpr int kShort = 5;
   const int count = std::min(rows, record.outHeight - record.rowsDone);
-  const int64_t lowest = int64_t{record.outHeight} - record.rowsDone - count;
+  const int done = record.rowsDone;
+  const int64_t lowest = int64_t{record.outHeight} - done - count;
   record.rowsDone += count;
   if (record.outWidth == 0 || !writes(record.outFormat)) return 1;
   bool complete = true;
-  for (int64_t i = 0; i < count; ++i) {
+  for (int i = 0; i < count; ++i) {
+    if (!caller_agrees(record.decInfo, done + i)) return 0;
     complete &= decode_row(record, lowest + (record.topDown ? count - 1 - i : i), family);
   }
   return complete || record.reader.at_end() ? 1 : kShort;

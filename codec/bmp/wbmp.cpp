@@ -10,6 +10,7 @@
 #include "codec/core/ground/axis_stepper.h"
 #include "codec/core/ground/geometry.h"
 #include "codec/core/ground/output_grid.h"
+#include "codec/core/ground/row_progress.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_layout.h"
@@ -67,8 +68,10 @@ void write_pixels(const uint8_t* bytes, const RowSpan& span, Store store) {
 }
 
 // A picture that fits is cut nowhere: pixels of a row and of its span are the same.
-bool write_plain(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, int format) {
-  for (uint32_t y = 0; y < wbmp.height; ++y) {
+bool write_plain(TAVIRPELO_DECINFO* decInfo, RowReader& reader, const OutputGrid& grid, Size picture,
+                 int format) {
+  for (int y = 0; y < picture.height; ++y) {
+    if (!caller_agrees(decInfo, y)) return false;
     const auto write = [&](const uint8_t* bytes, int64_t first, int64_t count) {
       const RowSpan span = grid.span(y, first, count);
       if (format == TAVIRPELO_RGB565) {
@@ -118,13 +121,15 @@ void write_words(const OsBuffer<uint32_t>& words, const RowSpan& span, int forma
 }
 
 // Averages of four samples; the rows they stand in follow each other downwards.
-bool write_resized(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, Size out, int format) {
+bool write_resized(TAVIRPELO_DECINFO* decInfo, const Wbmp& wbmp, RowReader& reader,
+                   const OutputGrid& grid, Size out, int format) {
   OsBuffer<uint32_t> words;
   if (int64_t{out.width} * 4 > kMaxPictureBlock || !words.allocate(static_cast<size_t>(out.width)))
     return false;
   AxisStepper quarter(wbmp.height, out.height, wbmp.height / 4);
   AxisStepper threeQuarters(wbmp.height, out.height, int64_t{3} * wbmp.height / 4);
   for (int y = 0; y < out.height; ++y, quarter.advance(), threeQuarters.advance()) {
+    if (!caller_agrees(decInfo, y)) return false;
     std::fill_n(words.data(), words.size(), 0u);
     for (const int64_t source : {quarter.position(), threeQuarters.position()}) {
       if (!add_row(reader, source, wbmp, words)) return false;
@@ -178,6 +183,8 @@ int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   const bool stretch = decInfo->option == TAVIRPELO_FIT_STRETCH;
   const pelo::Size out =
       stretch ? pelo::Size{width, height} : pelo::fit_by_ratio(wbmp.width, wbmp.height, {width, height});
+  decInfo->imageWidth = static_cast<int>(wbmp.width);
+  decInfo->imageHeight = static_cast<int>(wbmp.height);
   decInfo->outWidth = out.width;
   decInfo->outHeight = out.height;
   if (out.width == 0 || out.height == 0 || wbmp.width == 0 || wbmp.height == 0) return 1;
@@ -190,6 +197,6 @@ int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
                               (int64_t{height} - out.height + 1) / 2, pelo::bytes_per_pixel(format));
   const bool plain =
       out.width == static_cast<int64_t>(wbmp.width) && out.height == static_cast<int64_t>(wbmp.height);
-  return plain ? write_plain(wbmp, reader, grid, format)
-               : write_resized(wbmp, reader, grid, out, format);
+  return plain ? write_plain(decInfo, reader, grid, out, format)
+               : write_resized(decInfo, wbmp, reader, grid, out, format);
 }

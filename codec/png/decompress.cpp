@@ -112,8 +112,8 @@ int inflate_image(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInpu
 
 int inflate_interlaced(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInput) {
   const int result = inflate_image(context, total, openInput);
-  if (result == kDone && context.output.wholeImage) __PELOI_WriteOutputDataFromINTBuffer(&context);
-  return result;
+  if (result != kDone || !context.output.wholeImage) return result;
+  return __PELOI_WriteOutputDataFromINTBuffer(&context) ? kDone : kFailed;
 }
 
 }  // namespace

@@ -2,6 +2,16 @@
 #include "tests/png/png_decode.h"
 #include "tests/support/failures.h"
 
+namespace {
+int externalStatus = 0, timesAsked = 0;
+}
+
+// Linked in place of the library's.
+extern "C" void __wrap_TAVIRPELO_CheckExStatus(int* status) {
+  ++timesAsked;
+  *status = externalStatus;
+}
+
 namespace tests {
 namespace {
 
@@ -279,6 +289,21 @@ TEST(PngHostile, UnknownFilterKeepsTheRow) {
   EXPECT_EQ(1, got.answer);
   EXPECT_EQ(0, got.pixels[36]);
   EXPECT_EQ(lines[39], got.pixels[37]);
+}
+
+TEST(PngHostile, CancelledFromOutside) {
+  for (const bool interlaced : {false, true}) {
+    for (const auto& [side, option] : {std::pair(12, 0u), {7, 0x700u}, {7, 0x1700u}}) {
+      from_every_source(build_png(small(2, interlaced)), 7, option, [&](TAVIRPELO_DECINFO* decInfo) {
+        for (const int status : {0, 5, -1}) {
+          externalStatus = status, timesAsked = 0;
+          EXPECT_EQ(status >= 0, decode(TAVIRPELOI_DecodePNG, decInfo, side, side).answer);
+          EXPECT_TRUE(status < 0 ? timesAsked == 1 : timesAsked >= std::min(side, 10)) << timesAsked;
+        }
+      });
+    }
+  }
+  externalStatus = 0;
 }
 
 TEST(PngHostile, ShortMemoryAtEveryStep) {
