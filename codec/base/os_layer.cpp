@@ -14,6 +14,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "codec/core/ground/os_memory.h"
 #include "platform/fault_injection.h"
 #include "tavirpelo/io.h"
 
@@ -62,6 +63,11 @@ FILE* open_regular(const char* path, const char* mode) {
 void* TAVIRPELO_OsMalloc(size_t size) {
   if (size == 0 || allocations.hit()) return nullptr;
   return std::malloc(size);
+}
+
+void* pelo::os_zeroed(size_t size) {
+  if (size == 0 || allocations.hit()) return nullptr;
+  return std::calloc(1, size);
 }
 
 void TAVIRPELO_OsFree(void* pointer) {

@@ -12,6 +12,10 @@
 
 namespace pelo {
 
+// `size` zero bytes, to be freed with TAVIRPELO_OsFree; null for 0 or when memory is short. Large blocks
+// are fresh pages of the system, which take no room until they are written.
+void* os_zeroed(size_t size);
+
 // A block of `count` trivial elements, zero-filled, freed with the OS layer.
 template <class T>
 class OsBuffer {
@@ -33,10 +37,18 @@ class OsBuffer {
     reset();
     const auto bytes = checked_mul(count, sizeof(T));
     if (!bytes) return false;
-    data_ = static_cast<T*>(TAVIRPELO_OsMalloc(*bytes));
+    data_ = static_cast<T*>(os_zeroed(*bytes));
     if (data_ == nullptr) return false;
     count_ = count;
-    TAVIRPELO_OsMemset(data_, 0, *bytes);
+    return true;
+  }
+  // More elements behind those that are there, zeroed; false, with nothing changed, when memory is
+  // short.
+  [[nodiscard]] bool grow(size_t count) {
+    OsBuffer larger;
+    if (count < count_ || !larger.allocate(count)) return false;
+    TAVIRPELO_OsMemcpy(larger.data_, data_, count_ * sizeof(T));
+    swap(larger);
     return true;
   }
   void reset() {

@@ -86,8 +86,15 @@ TAVIRPELO_API int debug_PeloCodecError; /* raw images and the one-call functions
 struct TAVIRPELO_DECINFO;
 struct TAVIRPELO_ZOOMINFO;
 
-/* Progress and abort: called before each step of output rows with the rows finished and the caller's
- * row counter; 0 aborts. */
+/* Progress and abort: asked before each step of output rows, of which `currentRow` are complete in this picture
+ * or frame. 0 ends the decode, which answers 0 and leaves the rows that are written; nothing else of the object
+ * may be touched. A null pointer is never asked. A step is
+ *   JPEG        a row of MCUs; rowCounter counts rows at the chosen scale, before they are resized
+ *   PNG         an output row; of interlaced pictures, each time that a pass adds pixels to one
+ *   GIF         the output rows that one image row makes; one by one by lines and when pixels are averaged
+ *   animations  the output rows that one row of the screen makes
+ *   BMP, WBMP   an output row
+ * and rowCounter repeats currentRow in all formats but JPEG. */
 typedef int (*TAVIRPELO_CHECKFN)(struct TAVIRPELO_DECINFO* decInfo, int currentRow, int rowCounter);
 
 /* Progress report: the caller's argument and the percentage done. */

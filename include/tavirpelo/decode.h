@@ -115,8 +115,8 @@ TAVIRPELO_API int PELOJ_DecodeUncompressThumbnail(void);
 /* Size of the last produced picture, before rotation; 1. */
 TAVIRPELO_API int PELOJ_GetDecSize(const TAVIRPELO_DECINFO* decInfo, int* width, int* height);
 
-/* Turn a packed width x height picture in place, clockwise or the other way. 1, or 0 for formats other
- * than 0, 1 and 9 or when memory is short. */
+/* Turn a packed width x height picture by a quarter, clockwise and back, into its own buffer. 0 when the
+ * format is none of 0, 1 and 9 or a copy of the picture finds no memory, otherwise 1. */
 TAVIRPELO_API int PELOJ_RotateImage90(void* buffer, int width, int height, int outFormat);
 TAVIRPELO_API int PELOJ_RotateImage270(void* buffer, int width, int height, int outFormat);
 
@@ -153,8 +153,9 @@ TAVIRPELO_API int TAVIRPELOI_AbortPNGIter(TAVIRPELO_DECINFO* decInfo);
  * `output` is a buffer of width x height pixels of decInfo->outFormat (0, 1, 5, 7, 8, 10 or 11; for
  * others the picture is decoded and nothing written), fitted and rotated by decInfo->option; fill acts
  * as fit inside. Transparent pixels are zero bytes. A picture reduced on both sides is averaged; one
- * that is not turned then fills a box smaller than its reduced size whole. What an image does not cover
- * keeps the buffer's bytes. decInfo->outWidth and outHeight receive the size before rotation.
+ * that is not turned then fills a box smaller than its reduced size whole. Where the image does not reach, or
+ * its data give no row, a picture reduced on both sides is zero bytes, unless it comes by lines; any other
+ * keeps the buffer's. decInfo->outWidth and outHeight receive the size before rotation.
  * Operations of several calls hold their state in decInfo->pFormatInfo and want the same width, height,
  * format and option each time: a different request ends them with 0, and another decoder's state is
  * answered with 0. 0 also means: null, negative size, no GIF, damaged data, a screen, row or plane
@@ -170,7 +171,8 @@ TAVIRPELO_API int TAVIRPELOI_DecodeGIFLine(TAVIRPELO_DECINFO* decInfo, void* out
                                            int height, int lines);
 
 /* The first image in steps: the first call prepares, each later one decodes 16 image rows. 4 while
- * there are more, 1 at the end, also when the data turn out damaged; 0 when the first call fails. */
+ * there are more, 1 at the end, also when the data turn out damaged; 0 when the first call fails or CheckFn
+ * ends the decode. */
 TAVIRPELO_API int TAVIRPELOI_DecodeGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width,
                                            int height);
 
@@ -194,7 +196,7 @@ TAVIRPELO_API int TAVIRPELOI_AborAGIF(TAVIRPELO_DECINFO* decInfo);
  * filled; turned by the option word; larger pictures are averaged down. Rows that the source lacks keep what
  * the buffer held. */
 
-/* Decodes the whole picture. 1, or 0 for headers that are damaged or not supported. */
+/* Decodes the whole picture. 1, or 0 for headers that are damaged or not supported, and when CheckFn says so. */
 TAVIRPELO_API int TAVIRPELOI_DecodeBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
 
 /* Decode the next `lines` (100) output rows; all calls get the same buffer and sizes. 1 for progress, with

@@ -134,6 +134,31 @@ TEST(Bmp, EveryDepthFormatTurnAndSize) {
   }
 }
 
+// Rows of more than a megabyte are read in pieces.
+TEST(Bmp, WideRows) {
+  for (const int bits : {4, 24}) {
+    const int width = (8 << 20) / bits + 77;
+    const Bmp bmp = random_bmp(1, bits, width, 1);
+    const TempFile onDisk;
+    onDisk.write(bmp.file());
+    for (const View& v : {View{{width, 1}, {width, 1}}, {{999, 2}, {999, 2}, TAVIRPELO_FIT_STRETCH}}) {
+      const Bytes want = expected(bmp, v, 1);
+      EXPECT_TRUE(want == decode_bmp(bmp.file(), v, 1).pixels) << bits;
+      const DecInfo decInfo = open_file(onDisk.path(), 1, v.option);
+      EXPECT_TRUE(want == decode(TAVIRPELOI_DecodeBMP, decInfo.get(), v.box.width, v.box.height).pixels);
+    }
+  }
+  // None of 264 MB is there.
+  const TempFile onDisk;
+  onDisk.write(overwritten(random_bmp(1, 24, 20, 20).file(), 18, ByteWriter(false).u32(88'000'000)));
+  const DecInfo decInfo = open_file(onDisk.path(), 1);
+  const long before = peak_kib("VmPeak");
+  const Decode got = decode(TAVIRPELOI_DecodeBMP, decInfo.get(), 40, 40);
+  EXPECT_EQ(1, got.answer);
+  EXPECT_EQ(Bytes(got.pixels.size(), kFill), got.pixels);
+  EXPECT_LT(peak_kib("VmPeak") - before, 16 * 1024);
+}
+
 TEST(Bmp, TightPicturesFollowThePictureSize) {
   const Bmp bmp = random_bmp(1, 24, 40, 24);
   const View tight{{40, 24}, {24, 14}, TAVIRPELO_FIT_TIGHT | TAVIRPELO_ROTATE_90};

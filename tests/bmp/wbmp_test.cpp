@@ -17,7 +17,9 @@ struct Wbmp {
     ByteWriter out;
     out.u16(0);
     for (const int side : {width, height}) {
-      if (side > 127) out.u8(side >> 7 | 128);
+      for (int shift = 21; shift > 0; shift -= 7) {
+        if (side >> shift != 0) out.u8((side >> shift & 127) | 128);
+      }
       out.u8(side & 127);
     }
     return out.block(rows);
@@ -55,6 +57,8 @@ TEST(WBmp, PlacedFittedAndStretched) {
     expect_everywhere(small, size, TAVIRPELO_FIT_STRETCH, size, 0, 0);
   expect_everywhere(random_wbmp(200, 150), {60, 50}, 0, {60, 45}, 0, 3);
   expect_everywhere(random_wbmp(30, 300), {70, 101}, 0, {10, 101}, 30, 0);
+  // Rows of more than a megabyte are read in pieces.
+  expect_everywhere(random_wbmp((8 << 20) + 77, 1), {99, 2}, TAVIRPELO_FIT_STRETCH, {99, 2}, 0, 0);
 }
 
 TEST(WBmp, WhiteIn565) {

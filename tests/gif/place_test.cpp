@@ -95,6 +95,34 @@ TEST(GifPlace, ReducedButLargerInOneDirection) {
   }
 }
 
+// What an image does not reach, or has no data for, is zero bytes, averaged or not; unless both sides
+// shrink, it stays as it was.
+TEST(GifPlace, MarginsOfReducedPictures) {
+  GifFile file = sample_gif(8, 6, 6);
+  file.width = 20, file.height = 16;
+  file.images[0].left = 4, file.images[0].top = 4;
+  const Bytes bytes = file.bytes(), cut = prefix(bytes, bytes.size() - 35), zero(4), kept(4, kFill);
+  for (const uint32_t turn : {0x0, 0x8}) {
+    for (const auto& [size, missing] :
+         {std::pair(Size{5, 4}, zero), {Size{4, 3}, zero}, {Size{10, 8}, zero}, {Size{5, 16}, kept}}) {
+      for (const Bytes& input : {bytes, cut}) {
+        const Decode got = decode_gif(input, size.width, size.height, 7, TAVIRPELO_FIT_STRETCH | turn);
+        EXPECT_EQ(1, got.answer);
+        EXPECT_EQ(missing, prefix(got.pixels, 4)) << size.width << " " << turn;
+        EXPECT_EQ(missing, suffix(got.pixels, got.pixels.size() - 4));
+        const bool fills =
+            std::search_n(got.pixels.begin(), got.pixels.end(), 4, kFill) != got.pixels.end();
+        EXPECT_EQ(missing == kept, fills);
+      }
+    }
+  }
+  Bytes pixels(10 * 8 * 4, kFill), stepwise = bytes;
+  const DecInfo decInfo = open_memory(stepwise, 7);
+  while (TAVIRPELOI_DecodeGIFIter(decInfo.get(), pixels.data(), 10, 8) == 4) {
+  }
+  EXPECT_EQ(decode_gif(bytes, 10, 8).pixels, pixels);
+}
+
 TEST(GifPlace, EmptySidesAndUnknownFormatsWriteNothing) {
   const GifFile file = sample_gif(30, 20, 4);
   for (const auto& [width, height] : {std::pair(0, 10), {10, 0}, {0, 0}})

@@ -2,6 +2,16 @@
 #include "tests/png/png_decode.h"
 #include "tests/support/failures.h"
 
+namespace {
+int externalStatus = 0, timesAsked = 0;
+}
+
+// Linked in place of the library's.
+extern "C" void __wrap_TAVIRPELO_CheckExStatus(int* status) {
+  ++timesAsked;
+  *status = externalStatus;
+}
+
 namespace tests {
 namespace {
 
@@ -113,8 +123,17 @@ TEST(PngHostile, ChunkTable) {
   const Bytes lines = zlib_stored(lines_of(image));
   const Bytes file = build_png(image, lines, 2);
   ASSERT_LT(2048u, png_chunks(file).size());
-  EXPECT_EQ(0, decode_png(file, 32, 32, 7).answer);
-  EXPECT_EQ(1, decode_png(build_png(image, lines, 3), 32, 32, 7).answer);
+  const Bytes want = decode_png(build_png(image, lines), 32, 32, 7).pixels;
+  from_every_source(file, 7, 0, [&](TAVIRPELO_DECINFO* decInfo) {
+    const Decode got = decode(TAVIRPELOI_DecodePNG, decInfo, 32, 32);
+    EXPECT_EQ(1, got.answer);
+    EXPECT_EQ(want, got.pixels);
+  });
+  // A stream of more chunks than the size that it claims has room for.
+  MemoryStream endless{file};
+  const DecInfo decInfo = open_stream(endless, 7);
+  decInfo->pIO->size = 1000;
+  EXPECT_EQ(0, decode(TAVIRPELOI_DecodePNG, decInfo.get(), 32, 32).answer);
   // No data at all; an empty chunk ends the file wherever it stands.
   EXPECT_EQ(0, answer(build_png(image, {})));
   auto chunks = png_chunks(file);
@@ -272,9 +291,25 @@ TEST(PngHostile, UnknownFilterKeepsTheRow) {
   EXPECT_EQ(lines[39], got.pixels[37]);
 }
 
+TEST(PngHostile, CancelledFromOutside) {
+  for (const bool interlaced : {false, true}) {
+    for (const auto& [side, option] : {std::pair(12, 0u), {7, 0x700u}, {7, 0x1700u}}) {
+      from_every_source(build_png(small(2, interlaced)), 7, option, [&](TAVIRPELO_DECINFO* decInfo) {
+        for (const int status : {0, 5, -1}) {
+          externalStatus = status, timesAsked = 0;
+          EXPECT_EQ(status >= 0, decode(TAVIRPELOI_DecodePNG, decInfo, side, side).answer);
+          EXPECT_TRUE(status < 0 ? timesAsked == 1 : timesAsked >= std::min(side, 10)) << timesAsked;
+        }
+      });
+    }
+  }
+  externalStatus = 0;
+}
+
 TEST(PngHostile, ShortMemoryAtEveryStep) {
   for (const bool interlaced : {false, true}) {
-    const Bytes file = build_png(random_png_image(2, 6, 8, 20, 20, interlaced, false));
+    const PngImage image = random_png_image(2, 6, 8, 20, 20, interlaced, false);
+    const Bytes file = build_png(image, zlib_stored(lines_of(image)), 40);  // more than 16 chunks
     EXPECT_EQ(1, fail_each_allocation([&] { return decode_png(file, 9, 9, 7, 0x1000).answer; }));
   }
 }

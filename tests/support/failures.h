@@ -3,6 +3,9 @@
 
 #include <gtest/gtest.h>
 
+#include <fstream>
+#include <string>
+
 #include "platform/android_log.h"
 #include "platform/fault_injection.h"
 
@@ -31,6 +34,16 @@ auto fail_each_allocation(Run run, Judge judge, long first = 1) {
 template <class Run>
 auto fail_each_allocation(Run run) {
   return fail_each_allocation(run, [](auto answer) { EXPECT_EQ(0, answer); });
+}
+
+// A peak of the whole process so far, in KiB: "VmHWM" of memory in use, "VmPeak" of addresses.
+inline long peak_kib(const std::string& name) {
+  std::ifstream status("/proc/self/status");
+  long kib = 0;
+  for (std::string word; kib == 0 && status >> word;) {
+    if (word == name + ":") status >> kib;
+  }
+  return kib;
 }
 
 // Nothing is logged, nothing fails any more after a test.

@@ -26,30 +26,25 @@ bool same_request(const PELOI_BMPRECORD& record, const TAVIRPELO_DECINFO& decInf
          record.outFormat == decInfo.outFormat && record.option == decInfo.option;
 }
 
-// The next rows by the bit count's decoder; another bit count decodes nothing.
-void decode(PELOI_BMPRECORD& record, int rows) {
+// The next rows by the bit count's decoder, which another bit count does not have; false when the caller
+// ends the decode.
+bool decode(PELOI_BMPRECORD& record, int rows) {
   switch (record.bitCount) {
     case 1:
-      PELOI_BMP_Decode1bitBMP(&record, rows);
-      break;
+      return PELOI_BMP_Decode1bitBMP(&record, rows) != 0;
     case 4:
-      PELOI_BMP_Decode4bitBMP(&record, rows);
-      break;
+      return PELOI_BMP_Decode4bitBMP(&record, rows) != 0;
     case 8:
-      PELOI_BMP_Decode8bitBMP(&record, rows);
-      break;
+      return PELOI_BMP_Decode8bitBMP(&record, rows) != 0;
     case 16:
-      PELOI_BMP_Decode16bitBMP(&record, rows);
-      break;
+      return PELOI_BMP_Decode16bitBMP(&record, rows) != 0;
     case 24:
-      PELOI_BMP_Decode24bitBMP(&record, rows);
-      break;
+      return PELOI_BMP_Decode24bitBMP(&record, rows) != 0;
     case 32:
-      PELOI_BMP_Decode32bitBMP(&record, rows);
-      break;
+      return PELOI_BMP_Decode32bitBMP(&record, rows) != 0;
     default:
       record.rowsDone = record.outHeight;
-      break;
+      return true;
   }
 }
 
@@ -75,9 +70,9 @@ int TAVIRPELOI_DecodeBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, in
   if (decInfo->pFormatInfo != nullptr) return 0;  // another format's
   PELOI_BMPRECORD* record = PELOI_BMP_Initialize(decInfo, width, height, output);
   if (record == nullptr) return 0;
-  decode(*record, INT_MAX);
+  const bool done = decode(*record, INT_MAX);
   PELOI_BMP_DeleteDecInfo(record);
-  return 1;
+  return done ? 1 : 0;
 }
 
 int TAVIRPELOI_DecodeBMPIterLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
@@ -86,9 +81,10 @@ int TAVIRPELOI_DecodeBMPIterLine(TAVIRPELO_DECINFO* decInfo, void* output, int w
   PELOI_BMPRECORD* record = obtain(decInfo, output, width, height);
   if (record == nullptr) return 0;
   decInfo->pFormatInfo = record;
-  decode(*record, lines);
-  if (record->rowsDone >= record->outHeight) PELOI_BMP_DestroyBMP(decInfo);
-  return 1;
+  record->decInfo = decInfo;
+  const bool goesOn = decode(*record, lines);
+  if (!goesOn || record->rowsDone >= record->outHeight) PELOI_BMP_DestroyBMP(decInfo);
+  return goesOn ? 1 : 0;
 }
 
 int TAVIRPELOI_DecodeBMPIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {

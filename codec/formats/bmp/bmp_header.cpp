@@ -158,8 +158,8 @@ bool prepare_rows(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
   if (!known_bit_count(record.bitCount)) return true;  // nothing will be decoded
   const int64_t rowSize = row_size(record.width, record.bitCount);
   if (rowSize > INT_MAX) return false;
-  return record.reader.open(io, record.dataOffset, rowSize, pixel_bytes(record.width, record.bitCount),
-                            io->readSize) &&
+  const RowLayout layout{record.dataOffset, rowSize, record.width, record.bitCount};
+  return record.reader.open(io, layout, io->readSize) &&
          (record.outWidth == 0 || record.outHeight == 0 || prepare_resizing(record));
 }
 
@@ -178,7 +178,10 @@ PELOI_BMPRECORD* PELOI_BMP_Initialize(TAVIRPELO_DECINFO* decInfo, int width, int
   record->requestHeight = height;
   record->outFormat = decInfo->outFormat;
   record->option = decInfo->option;
+  record->decInfo = decInfo;
   decInfo->scaleDenom = 1;
+  decInfo->imageWidth = record->width;
+  decInfo->imageHeight = record->height;
   choose_size(*record);
   if (!prepare_rows(*record, decInfo->pIO)) return nullptr;
   decInfo->outWidth = record->outWidth;

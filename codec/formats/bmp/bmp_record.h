@@ -28,6 +28,7 @@ typedef struct PELOI_BMPRECORD : pelo::FormatState {
   uint32_t dataOffset;
   PELOI_BMPCOLOURS colours;
 
+  TAVIRPELO_DECINFO* decInfo;  // of the current call
   // The request of the first call, which later ones must repeat.
   void* output;
   int requestWidth, requestHeight;
@@ -56,7 +57,8 @@ TAVIRPELO_API void PELOI_BMP_DeleteDecInfo(PELOI_BMPRECORD* record);
 // Frees the object's record, if it holds one; 1.
 TAVIRPELO_API int PELOI_BMP_DestroyBMP(TAVIRPELO_DECINFO* decInfo);
 
-// Decode the next `rows` output rows. 1, or 5 when the source could not give a row before its end.
+// Decode the next `rows` output rows. 1, 5 when the source could not give a row before its end, or 0
+// when the caller ends the decode.
 TAVIRPELO_API int PELOI_BMP_Decode1bitBMP(PELOI_BMPRECORD* record, int rows);
 TAVIRPELO_API int PELOI_BMP_Decode4bitBMP(PELOI_BMPRECORD* record, int rows);
 TAVIRPELO_API int PELOI_BMP_Decode8bitBMP(PELOI_BMPRECORD* record, int rows);
@@ -99,12 +101,9 @@ constexpr bool writes(int format) {
          (format >= TAVIRPELO_ARGB8888 && format <= TAVIRPELO_BGRA8888);
 }
 
-// Bytes of a row's pixels, and of a row with its padding to four bytes.
-constexpr int64_t pixel_bytes(int64_t width, int64_t bitCount) {
-  return (width * bitCount + 7) / 8;
-}
+// Bytes of a row with its padding to four.
 constexpr int64_t row_size(int64_t width, int64_t bitCount) {
-  return (pixel_bytes(width, bitCount) + 3) & ~int64_t{3};
+  return (width * bitCount + 31) / 32 * 4;
 }
 
 }  // namespace pelo::bmp

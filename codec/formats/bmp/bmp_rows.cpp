@@ -5,8 +5,9 @@
 // as rows stand in an ordinary file, so that a top-down file gives the same picture.
 #include <algorithm>
 
-#include "codec/formats/bmp/bmp_record.h"
 #include "codec/base/byte_order.h"
+#include "codec/base/row_progress.h"
+#include "codec/formats/bmp/bmp_record.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/pixel_layout.h"
 
@@ -66,20 +67,32 @@ void write_row(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelSt
   });
 }
 
-// Adds two pixels of a row to each output pixel's word, a quarter of each channel.
+// Adds a quarter of each channel of the pixels that output pixels draw on, as far as they are among the
+// row's pixels from `first` to before `end`, to the output pixels' words.
 template <class Source>
-void add_row(PELOI_BMPRECORD& record, const uint8_t* row) {
-  const uint32_t* quarter = record.columns.data();
-  const uint32_t* threeQuarters = quarter + record.outWidth;
-  uint32_t* words = record.accumulators.data();
+void add_pixels(PELOI_BMPRECORD& record, const uint8_t* bytes, int64_t first, int64_t end) {
   const auto word = [&](uint32_t column) {
     uint8_t rgba[4];
-    Source::pixel(record.colours, row, column, rgba);
+    Source::pixel(record.colours, bytes, column - static_cast<size_t>(first), rgba);
     const uint32_t bgra =
         uint32_t{rgba[3]} << 24 | uint32_t{rgba[0]} << 16 | uint32_t{rgba[1]} << 8 | rgba[2];
     return bgra >> 2 & 0x3F3F3F3F;
   };
-  for (int x = 0; x < record.outWidth; ++x) words[x] += word(quarter[x]) + word(threeQuarters[x]);
+  const uint32_t* quarter = record.columns.data();
+  const uint32_t* threeQuarters = quarter + record.outWidth;
+  const ptrdiff_t outWidth = record.outWidth;
+  const auto output_from = [&](const uint32_t* columns, int64_t column) -> ptrdiff_t {
+    if (column <= columns[0]) return 0;
+    if (column > columns[outWidth - 1]) return outWidth;  // most rows are one piece
+    return std::lower_bound(columns, columns + outWidth, column) - columns;
+  };
+  uint32_t* words = record.accumulators.data();
+  const ptrdiff_t both = output_from(quarter, first), bothEnd = output_from(threeQuarters, end);
+  const ptrdiff_t quarterEnd = output_from(quarter, end);
+  ptrdiff_t x = output_from(threeQuarters, first);
+  for (; x < std::min(both, bothEnd); ++x) words[x] += word(threeQuarters[x]);
+  for (x = both; x < bothEnd; ++x) words[x] += word(quarter[x]) + word(threeQuarters[x]);
+  for (; x < quarterEnd; ++x) words[x] += word(quarter[x]);
 }
 
 template <bool KeepsAlpha>
@@ -98,14 +111,14 @@ void write_words(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pi
 struct Family {
   void (*write)(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
                 const PELOI_BMPCOLOURS* colours);
-  void (*add)(PELOI_BMPRECORD& record, const uint8_t* row);
+  void (*add)(PELOI_BMPRECORD& record, const uint8_t* bytes, int64_t first, int64_t end);
   void (*writeResized)(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pixelStep,
                        int format);
 };
 
 // Row `up` counted from the last image row.
-const uint8_t* row_from_below(PELOI_BMPRECORD& record, int64_t up) {
-  return record.reader.row(record.topDown ? record.height - 1 - up : up);
+int64_t row_from_below(const PELOI_BMPRECORD& record, int64_t up) {
+  return record.topDown ? record.height - 1 - up : up;
 }
 
 // Output row `up`, counted from the last. False when the source lacks a row of it, which then keeps what
@@ -113,17 +126,22 @@ const uint8_t* row_from_below(PELOI_BMPRECORD& record, int64_t up) {
 bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Family& family) {
   const RowSpan span = record.grid.span(record.outHeight - 1 - up, 0, record.outWidth);
   if (record.oneToOne) {
-    const uint8_t* row = row_from_below(record, up);
-    if (row == nullptr) return false;
-    family.write(row, span.first, span.count, span.step, record.outFormat, &record.colours);
-    return true;
+    return record.reader.for_pieces(
+        row_from_below(record, up), [&](const uint8_t* bytes, int64_t first, int64_t count) {
+          const auto visible = static_cast<int>(std::min(count, span.count - first));
+          family.write(bytes, span.first + first * span.step, visible, span.step, record.outFormat,
+                       &record.colours);
+        });
   }
   std::fill_n(record.accumulators.data(), record.outWidth, 0u);
   const int64_t quarters[2] = {record.height / 4, int64_t{3} * record.height / 4};
   for (const int64_t phase : {quarters[record.topDown], quarters[!record.topDown]}) {  // in file order
-    const uint8_t* row = row_from_below(record, (phase + up * record.height) / record.outHeight);
-    if (row == nullptr) return false;
-    family.add(record, row);
+    const int64_t row = row_from_below(record, (phase + up * record.height) / record.outHeight);
+    const bool there =
+        record.reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
+          family.add(record, bytes, first, first + count);
+        });
+    if (!there) return false;
   }
   family.writeResized(record.accumulators.data(), span.first, span.count, span.step, record.outFormat);
   return true;
@@ -132,11 +150,13 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Family& family) {
 int decode_rows(PELOI_BMPRECORD& record, int rows, const Family& family) {
   constexpr int kShort = 5;
   const int count = std::min(rows, record.outHeight - record.rowsDone);
-  const int64_t lowest = int64_t{record.outHeight} - record.rowsDone - count;
+  const int done = record.rowsDone;
+  const int64_t lowest = int64_t{record.outHeight} - done - count;
   record.rowsDone += count;
   if (record.outWidth == 0 || !writes(record.outFormat)) return 1;
   bool complete = true;
-  for (int64_t i = 0; i < count; ++i) {
+  for (int i = 0; i < count; ++i) {
+    if (!caller_agrees(record.decInfo, done + i)) return 0;
     complete &= decode_row(record, lowest + (record.topDown ? count - 1 - i : i), family);
   }
   return complete || record.reader.at_end() ? 1 : kShort;
@@ -157,15 +177,15 @@ void PELOI_BMP_WriteResizedOutputWithAlpha(const uint32_t* accumulatorRow, uint8
 }
 
 // A member of the family: its row writer and its row decoder.
-#define PELOI_BMP_MEMBER(bits, Source, writeResized)                                       \
-  void PELOI_BMP_Write##bits##bitOutput(const uint8_t* row, uint8_t* output, int width,    \
-                                        ptrdiff_t pixelStep, int format,                   \
-                                        const PELOI_BMPCOLOURS* colours) {                 \
-    write_row<Source>(row, output, width, pixelStep, format, *colours);                    \
-  }                                                                                        \
-  int PELOI_BMP_Decode##bits##bitBMP(PELOI_BMPRECORD* record, int rows) {                  \
-    return decode_rows(*record, rows,                                                      \
-                       {PELOI_BMP_Write##bits##bitOutput, add_row<Source>, writeResized}); \
+#define PELOI_BMP_MEMBER(bits, Source, writeResized)                                          \
+  void PELOI_BMP_Write##bits##bitOutput(const uint8_t* row, uint8_t* output, int width,       \
+                                        ptrdiff_t pixelStep, int format,                      \
+                                        const PELOI_BMPCOLOURS* colours) {                    \
+    write_row<Source>(row, output, width, pixelStep, format, *colours);                       \
+  }                                                                                           \
+  int PELOI_BMP_Decode##bits##bitBMP(PELOI_BMPRECORD* record, int rows) {                     \
+    return decode_rows(*record, rows,                                                         \
+                       {PELOI_BMP_Write##bits##bitOutput, add_pixels<Source>, writeResized}); \
   }
 PELOI_BMP_MEMBER(1, PaletteSource<1>, PELOI_BMP_WriteResizedOutput)
 PELOI_BMP_MEMBER(4, PaletteSource<4>, PELOI_BMP_WriteResizedOutput)

@@ -1,50 +1,50 @@
 #include "codec/formats/bmp/row_reader.h"
 
-#include <algorithm>
 #include <cstdio>
 
 namespace pelo::bmp {
 namespace {
 
-constexpr int64_t kMaxChunk = 1 << 20;  // unless one row takes more
+constexpr int64_t kMaxChunk = 1 << 20;  // bytes
+
+// The bytes at an offset; as many as there are, 0 when the source cannot be moved.
+int read_at(TAVIRPELO_IO* io, int64_t offset, uint8_t* out, int64_t count) {
+  const auto target = checked_int(offset);
+  if (!target || TAVIRPELO_Seek_IO(io, *target, SEEK_SET) != *target) return 0;
+  return std::max(0, TAVIRPELO_Read_IO(io, out, static_cast<int>(count)));
+}
 
 }  // namespace
 
-bool RowReader::open(TAVIRPELO_IO* io, int64_t dataOffset, int64_t rowSize, int64_t pixelBytes,
-                     int readSize) {
+bool RowReader::open(TAVIRPELO_IO* io, const RowLayout& layout, int readSize) {
   io_ = io;
-  dataOffset_ = dataOffset;
-  rowSize_ = rowSize;
-  pixelBytes_ = pixelBytes;
+  layout_ = layout;
+  pieceWidth_ = kMaxChunk / layout.bits * 8;
+  const int64_t rowSize = layout.rowSize;
   if (io->ioType == TAVIRPELO_IO_MEMORY) return true;
   if (io->ioType != TAVIRPELO_IO_FILE || rowSize > kMaxPictureBlock) return false;
-  const int64_t wanted = std::min<int64_t>(readSize, kMaxChunk);
-  const int64_t rows = std::max<int64_t>(1, rowSize == 0 ? 1 : wanted / rowSize);
-  return rowSize == 0 || chunk_.allocate(static_cast<size_t>(rows * rowSize));
+  if (rowSize == 0) return true;
+  const int64_t rows = std::max<int64_t>(1, std::min<int64_t>(readSize, kMaxChunk) / rowSize);
+  return chunk_.allocate(static_cast<size_t>(std::min(rows * rowSize, kMaxChunk)));
 }
 
-const uint8_t* RowReader::row(int64_t index) {
-  const int64_t offset = dataOffset_ + index * rowSize_;
+bool RowReader::holds(int64_t offset) {
+  if (io_->ioType == TAVIRPELO_IO_MEMORY) return offset < io_->size;
+  uint8_t byte;
+  return read_at(io_, offset, &byte, 1) == 1;
+}
+
+const uint8_t* RowReader::read(int64_t offset, int64_t count) {
   if (io_->ioType == TAVIRPELO_IO_MEMORY) {
-    if (offset + pixelBytes_ > io_->size) return nullptr;
+    if (offset + count > io_->size) return nullptr;
     return static_cast<const uint8_t*>(io_->pSource) + offset;
   }
-  const auto held = [&] {
-    const int64_t at = (index - chunkFirst_) * rowSize_;
-    return index >= chunkFirst_ && at + pixelBytes_ <= chunkBytes_;
-  };
-  if (!held() && !(fill(index) && held())) return nullptr;
-  return chunk_.data() + (index - chunkFirst_) * rowSize_;
-}
-
-// Reads the chunk that begins with a row.
-bool RowReader::fill(int64_t index) {
-  chunkFirst_ = index;
-  chunkBytes_ = 0;
-  const auto offset = checked_int(dataOffset_ + index * rowSize_);
-  if (!offset || TAVIRPELO_Seek_IO(io_, *offset, SEEK_SET) != *offset) return false;
-  chunkBytes_ = std::max(0, TAVIRPELO_Read_IO(io_, chunk_.data(), static_cast<int>(chunk_.size())));
-  return chunkBytes_ > 0;
+  if (offset < chunkStart_ || offset + count > chunkStart_ + chunkBytes_) {
+    chunkStart_ = offset;
+    chunkBytes_ = read_at(io_, offset, chunk_.data(), static_cast<int64_t>(chunk_.size()));
+    if (count > chunkBytes_) return nullptr;
+  }
+  return chunk_.data() + (offset - chunkStart_);
 }
 
 }  // namespace pelo::bmp

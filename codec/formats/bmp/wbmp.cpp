@@ -6,10 +6,11 @@
 #include <cstring>
 #include <utility>
 
-#include "codec/formats/bmp/row_reader.h"
 #include "codec/base/axis_stepper.h"
 #include "codec/base/geometry.h"
 #include "codec/base/output_grid.h"
+#include "codec/base/row_progress.h"
+#include "codec/formats/bmp/row_reader.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_layout.h"
@@ -60,38 +61,49 @@ bool read_header(TAVIRPELO_IO* io, Wbmp& wbmp) {
 
 // Black or white in an output format.
 template <class Store>
-void write_plain_row(const uint8_t* row, const RowSpan& span, Store store) {
+void write_pixels(const uint8_t* bytes, const RowSpan& span, Store store) {
   for (int i = 0; i < span.count; ++i) {
-    store(span.first + i * span.step, packed_sample<1>(row, static_cast<size_t>(span.skip + i)) != 0);
+    store(span.first + i * span.step, packed_sample<1>(bytes, static_cast<size_t>(i)) != 0);
   }
 }
 
-bool write_plain(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, int format) {
-  for (uint32_t y = 0; y < wbmp.height; ++y) {
-    const uint8_t* row = reader.row(y);
-    if (row == nullptr) return false;
-    const RowSpan span = grid.span(y, 0, wbmp.width);
-    if (format == TAVIRPELO_RGB565) {
-      write_plain_row(row, span,
-                      [](uint8_t* out, bool white) { store_le16(out, white ? kWhite565 : 0u); });
-    } else {
-      write_plain_row(row, span, [](uint8_t* out, bool white) { std::memset(out, white ? 255 : 0, 3); });
-    }
+// A picture that fits is cut nowhere: pixels of a row and of its span are the same.
+bool write_plain(TAVIRPELO_DECINFO* decInfo, RowReader& reader, const OutputGrid& grid, Size picture,
+                 int format) {
+  for (int y = 0; y < picture.height; ++y) {
+    if (!caller_agrees(decInfo, y)) return false;
+    const auto write = [&](const uint8_t* bytes, int64_t first, int64_t count) {
+      const RowSpan span = grid.span(y, first, count);
+      if (format == TAVIRPELO_RGB565) {
+        write_pixels(bytes, span,
+                     [](uint8_t* out, bool white) { store_le16(out, white ? kWhite565 : 0u); });
+      } else {
+        write_pixels(bytes, span,
+                     [](uint8_t* out, bool white) { std::memset(out, white ? 255 : 0, 3); });
+      }
+    };
+    if (!reader.for_pieces(y, write)) return false;
   }
   return true;
 }
 
 // Adds the two samples of each output pixel in a row.
-void add_row(const uint8_t* row, const Wbmp& wbmp, OsBuffer<uint32_t>& words) {
-  const auto out = static_cast<int64_t>(words.size());
-  AxisStepper quarter(wbmp.width, out, wbmp.width / 4);
-  AxisStepper threeQuarters(wbmp.width, out, int64_t{3} * wbmp.width / 4);
-  const auto sample = [row](const AxisStepper& at) {
-    return packed_sample<1>(row, static_cast<size_t>(at.position())) != 0 ? kWhiteSample : 0u;
+bool add_row(RowReader& reader, int64_t row, const Wbmp& wbmp, OsBuffer<uint32_t>& words) {
+  struct Point {
+    AxisStepper at;
+    size_t next;  // output pixel
   };
-  for (size_t x = 0; x < words.size(); ++x, quarter.advance(), threeQuarters.advance()) {
-    words[x] += sample(quarter) + sample(threeQuarters);
-  }
+  const auto out = static_cast<int64_t>(words.size());
+  Point points[] = {{{wbmp.width, out, wbmp.width / 4}, 0},
+                    {{wbmp.width, out, int64_t{3} * wbmp.width / 4}, 0}};
+  return reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
+    for (auto& [at, next] : points) {
+      for (; next < words.size() && at.position() < first + count; ++next, at.advance()) {
+        const bool white = packed_sample<1>(bytes, static_cast<size_t>(at.position() - first)) != 0;
+        words[next] += white ? kWhiteSample : 0u;
+      }
+    }
+  });
 }
 
 void write_words(const OsBuffer<uint32_t>& words, const RowSpan& span, int format) {
@@ -109,18 +121,18 @@ void write_words(const OsBuffer<uint32_t>& words, const RowSpan& span, int forma
 }
 
 // Averages of four samples; the rows they stand in follow each other downwards.
-bool write_resized(const Wbmp& wbmp, RowReader& reader, const OutputGrid& grid, Size out, int format) {
+bool write_resized(TAVIRPELO_DECINFO* decInfo, const Wbmp& wbmp, RowReader& reader,
+                   const OutputGrid& grid, Size out, int format) {
   OsBuffer<uint32_t> words;
   if (int64_t{out.width} * 4 > kMaxPictureBlock || !words.allocate(static_cast<size_t>(out.width)))
     return false;
   AxisStepper quarter(wbmp.height, out.height, wbmp.height / 4);
   AxisStepper threeQuarters(wbmp.height, out.height, int64_t{3} * wbmp.height / 4);
   for (int y = 0; y < out.height; ++y, quarter.advance(), threeQuarters.advance()) {
+    if (!caller_agrees(decInfo, y)) return false;
     std::fill_n(words.data(), words.size(), 0u);
     for (const int64_t source : {quarter.position(), threeQuarters.position()}) {
-      const uint8_t* row = reader.row(source);
-      if (row == nullptr) return false;
-      add_row(row, wbmp, words);
+      if (!add_row(reader, source, wbmp, words)) return false;
     }
     write_words(words, grid.span(y, 0, out.width), format);
   }
@@ -171,6 +183,8 @@ int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   const bool stretch = decInfo->option == TAVIRPELO_FIT_STRETCH;
   const pelo::Size out =
       stretch ? pelo::Size{width, height} : pelo::fit_by_ratio(wbmp.width, wbmp.height, {width, height});
+  decInfo->imageWidth = static_cast<int>(wbmp.width);
+  decInfo->imageHeight = static_cast<int>(wbmp.height);
   decInfo->outWidth = out.width;
   decInfo->outHeight = out.height;
   if (out.width == 0 || out.height == 0 || wbmp.width == 0 || wbmp.height == 0) return 1;
@@ -178,11 +192,11 @@ int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   if (format != TAVIRPELO_RGB565 && format != TAVIRPELO_RGB888) return 1;
 
   RowReader reader;
-  if (!reader.open(io, wbmp.dataOffset, wbmp.rowBytes, wbmp.rowBytes, io->readSize)) return 0;
+  if (!reader.open(io, {wbmp.dataOffset, wbmp.rowBytes, wbmp.width, 1}, io->readSize)) return 0;
   const pelo::OutputGrid grid(output, {width, height}, (int64_t{width} - out.width + 1) / 2,
                               (int64_t{height} - out.height + 1) / 2, pelo::bytes_per_pixel(format));
   const bool plain =
       out.width == static_cast<int64_t>(wbmp.width) && out.height == static_cast<int64_t>(wbmp.height);
-  return plain ? write_plain(wbmp, reader, grid, format)
-               : write_resized(wbmp, reader, grid, out, format);
+  return plain ? write_plain(decInfo, reader, grid, out, format)
+               : write_resized(decInfo, wbmp, reader, grid, out, format);
 }

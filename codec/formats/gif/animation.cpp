@@ -42,24 +42,27 @@ Rgba background(const Record& record) {
           static_cast<uint8_t>(lanes), 255};
 }
 
-void write_canvas_rows(Record& record, void* output, int begin, int end) {
+bool write_canvas_rows(Record& record, void* output, int begin, int end) {
   for (int row = begin; row < std::min(end, record.screen.height); ++row) {
     record.currentRow = row;
     record.rowSource = canvas_row(record, row);
-    write_screen_row(record, output);
+    if (!write_screen_row(record, output)) return false;
   }
+  return true;
 }
 
 // The frame's first step: the rows above the image, and everything ready for its own.
 int start_frame(Record& record, void* output) {
-  write_canvas_rows(record, output, 0, record.frame.top);
+  record.rowsWritten = 0;
+  if (!write_canvas_rows(record, output, 0, record.frame.top)) return kFailure;
   record.inImage = true;
   return PELOI_DecodeGIFImageIter(record.reader.source, &record, output, 1);
 }
 
 // The frame's last step: the rows below the image, and what comes next.
 int finish_frame(Record& record, void* output) {
-  write_canvas_rows(record, output, record.frame.top + record.frame.height, record.screen.height);
+  const int below = record.frame.top + record.frame.height;
+  if (!write_canvas_rows(record, output, below, record.screen.height)) return kFailure;
   record.inImage = false;
   return PELOI_SeekImageData(record.reader.source, &record);
 }

@@ -53,6 +53,7 @@ Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return nullptr;
   if (Record* held = held_state<Record>(*decInfo)) {
     const Request asked{mode, {width, height}, decInfo->outFormat, decInfo->option};
+    held->decInfo = decInfo;
     if (held->request == asked) return held;
     release_state<Record>(*decInfo);
     return nullptr;
@@ -69,6 +70,7 @@ Record* PELOI_InitializeGIF(TAVIRPELO_DECINFO* decInfo, int width, int height, i
   OsPtr<Record> record(PELOI_CreateGIFDecoderInfo());
   if (record == nullptr) return nullptr;
   decInfo->scaleDenom = 1;
+  record->decInfo = decInfo;
   record->animated = animated != 0;
   record->request = {animated != 0 ? Mode::kAnimated : Mode::kWhole,
                      {width, height},
@@ -91,7 +93,7 @@ int TAVIRPELOI_DecodeGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, in
   const auto record = start(*decInfo, output, width, height, Mode::kWhole);
   if (record == nullptr) return kFailure;
   const int result = PELOI_DecodeGIFImage(decInfo->pIO, record.get(), output);
-  write_reduced(*record, output);
+  if (record->ended || !finish_picture(*record, output)) return kFailure;
   return result;
 }
 
@@ -113,9 +115,9 @@ int TAVIRPELOI_DecodeGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width
   const int result = PELOI_DecodeGIFImageIter(decInfo->pIO, record, output, first);
   if (result == kMore) return kMore;
   // Damaged data end the image as its last row does.
-  if (!first) write_reduced(*record, output);
+  const bool done = !first && !record->ended && finish_picture(*record, output);
   release_state<Record>(*decInfo);
-  return first ? kFailure : kDone;
+  return done ? kDone : kFailure;
 }
 
 int TAVIRPELOI_AbortGIFIter(TAVIRPELO_DECINFO* decInfo) {

@@ -2,6 +2,7 @@
 
 #include "codec/base/axis_stepper.h"
 #include "codec/formats/gif/geometry.h"
+#include "codec/formats/gif/output.h"
 #include "codec/formats/gif/store_span.h"
 #include "codec/pixel/packers.h"
 
@@ -63,11 +64,12 @@ struct QuarterPoints {
 };
 
 // Enlarging, copying and reducing alike: at equal sizes both points are the pixel itself.
-void resample(const Record& record, Size target, const OutputGrid& grid) {
+bool resample(Record& record, Size target, const OutputGrid& grid) {
   const Size source = record.plane.size;
   Samples samples(record);
   QuarterPoints rows(source.height, target.height, 0);
   for (int y = 0; y < target.height; ++y, rows.advance()) {
+    if (!may_write(record, 1)) return false;
     samples.select_rows(rows.first.position(), rows.second.position());
     const RowSpan span = grid.span(y, 0, target.width);
     QuarterPoints columns(source.width, target.width, span.skip);
@@ -77,29 +79,33 @@ void resample(const Record& record, Size target, const OutputGrid& grid) {
       return average_of_four(sums);
     });
   }
+  return true;
 }
 
 }  // namespace
 
 bool plan_reduction(Record& record) {
   const Size reduced = reduced_size(record);
-  // Sampling straight into the output gives the same pixels.
+  // Sampling straight into the output gives the same pixels, but for those that the image does not
+  // cover.
+  record.clears = is_reduced(record) && reduced == record.picture && record.store != nullptr;
   if (reduced == record.picture || record.store == nullptr) return true;
   return set_sampling(record.sampling, record.screen, reduced) && record.plane.allocate(reduced);
 }
 
 // A picture that is not turned fills the whole box when that is smaller on both sides.
-void write_reduced(const Record& record, void* output) {
+bool finish_picture(Record& record, void* output) {
   const Size reduced = record.plane.size;
-  if (!record.plane.indices) return;
+  if (record.clears) clear_picture(record, output);
+  if (!record.plane.indices) return true;
   const Size buffer = record.request.buffer;
   const bool upright = (record.option & TAVIRPELO_ROTATE_MASK) == TAVIRPELO_ROTATE_0;
   const bool tight = (record.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT;
   if (upright && !tight && buffer.width < reduced.width && buffer.height < reduced.height) {
-    resample(record, buffer, OutputGrid(output, buffer, 0, 0, bytes_per_pixel(record.request.format)));
-  } else {
-    resample(record, record.picture, grid_of(record, output));
+    return resample(record, buffer,
+                    OutputGrid(output, buffer, 0, 0, bytes_per_pixel(record.request.format)));
   }
+  return resample(record, record.picture, grid_of(record, output));
 }
 
 }  // namespace pelo::gif

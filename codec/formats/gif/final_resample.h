@@ -1,14 +1,17 @@
-// The last step of a reduced still image: averaging its sampled pixels into the output.
+// Reduced still images: their pixels are averaged in a last step, unless sampling them is all there is
+// to it.
 #pragma once
 
 #include "codec/formats/gif/record.h"
 
 namespace pelo::gif {
 
-// Prepares the plane of sampled indices when the picture is to be averaged. False when memory is short.
+// Prepares the plane of sampled indices when the picture is to be averaged, and has it cleared first
+// when it is sampled into the output. False when memory is short.
 [[nodiscard]] bool plan_reduction(Record& record);
 
-// Averages the plane, if there is one, into the caller's buffer.
-void write_reduced(const Record& record, void* output);
+// Averages the plane, if there is one, into the caller's buffer; clears a picture that got no row. False
+// when the caller ends the decode.
+bool finish_picture(Record& record, void* output);
 
 }  // namespace pelo::gif

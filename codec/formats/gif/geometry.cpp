@@ -26,13 +26,19 @@ Size fit_screen(Size screen, Size box, uint32_t option) {
   return fit_by_width(screen.width, screen.height, box);
 }
 
-Size reduced_size(const Record& record) {
+bool is_reduced(const Record& record) {
   const Size screen = record.screen;
   const Size picture = record.picture;
   const bool tight = (record.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT;
   const Size box = tight ? picture : box_of(record);
-  if (box.width >= screen.width || box.height >= screen.height) return picture;
-  if (picture.width < 1 || picture.height < 1) return picture;
+  return box.width < screen.width && box.height < screen.height && picture.width > 0 &&
+         picture.height > 0;
+}
+
+Size reduced_size(const Record& record) {
+  const Size screen = record.screen;
+  const Size picture = record.picture;
+  if (!is_reduced(record)) return picture;
   int factor = screen.width / picture.width;
   while (screen.width % factor != 0) --factor;
   return {screen.width / factor, std::max(screen.height / factor, 1)};

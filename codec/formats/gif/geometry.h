@@ -12,8 +12,11 @@ Size box_of(const Record& record);
 // The produced size, before rotation, of a screen in a box. Never enlarges unless stretched.
 Size fit_screen(Size screen, Size box, uint32_t option);
 
+// Whether a still image comes out smaller than its screen on both sides.
+bool is_reduced(const Record& record);
+
 // The size to which a still image is sampled before its pixels are averaged: a whole fraction of the
-// screen's width. The picture's own size when it is not reduced on both sides.
+// screen's width. The picture's own size when it is not reduced.
 Size reduced_size(const Record& record);
 
 // Fits the record's screen for an option word: picture size, sampling. False when memory is short.

@@ -58,14 +58,16 @@ int decode_rows(Record& record, void* output, int rowLimit) {
 }
 
 // Output rows that no image row is left for: from the plane, or untouched.
-void emit_plane_rows(Record& record, void* output) {
+bool emit_plane_rows(Record& record, void* output) {
   const OutputGrid grid = line_grid_of(record, output);
   for (; record.linesHere < record.lines && record.lineRow < record.picture.height; ++record.linesHere) {
+    if (!may_write(record, 1)) return false;
     const int row = record.lineRow++;
     if (record.plane.painted && record.plane.painted[static_cast<size_t>(row)]) {
       write_plane_row(record, row, grid, record.linesHere);
     }
   }
+  return true;
 }
 
 bool start_lines(Record& record, void* output) {
@@ -84,6 +86,7 @@ bool begin_image(Record& record) {
   if (record.frame.width == 0) record.frame.height = 0;
   record.currentRow = record.frame.top;
   record.lineRow = record.lines = record.linesHere = 0;
+  if (!record.animated) record.rowsWritten = 0;
   set_palette(record);
   cover_frame(record.sampling, record.frame);
   return start_lzw(record);
@@ -112,6 +115,6 @@ int PELOI_DecodeGIFImageLine(TAVIRPELO_IO* source, Record* record, void* output,
     if (result == kFailure) return kFailure;
     record->imageDone = result == kDone;
   }
-  if (record->imageDone) emit_plane_rows(*record, output);
+  if (record->imageDone && !emit_plane_rows(*record, output)) return kFailure;
   return record->lineRow < record->picture.height ? kMore : kDone;
 }

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "codec/base/row_progress.h"
 #include "codec/formats/gif/geometry.h"
 #include "codec/formats/gif/interlace.h"
 #include "codec/formats/gif/store_span.h"
@@ -55,9 +56,42 @@ void write_into_plane(Record& record) {
   }
 }
 
+// How many output rows are made of the current row.
+int rows_of_current(const Record& record) {
+  if (record.currentRow >= record.screen.height) return 0;
+  const OutputRows rows = rows_of(record.sampling, record.currentRow);
+  return std::max(0, rows.end - rows.begin);
+}
+
+bool write_still_row(Record& record, void* output) {
+  if (!may_write(record, rows_of_current(record))) return false;
+  if (record.clears) clear_picture(record, output);
+  if (record.picture == record.screen) {
+    PELOI_WriteGIFOneToOneRow(&record, output);
+  } else {
+    PELOI_DownsizeGIFRow(&record, output);
+  }
+  return true;
+}
+
 }  // namespace
 
 namespace pelo::gif {
+
+bool may_write(Record& record, int rows) {
+  if (rows < 1) return true;
+  record.ended = !caller_agrees(record.decInfo, record.rowsWritten);
+  record.rowsWritten += rows;
+  return !record.ended;
+}
+
+void clear_picture(Record& record, void* output) {
+  record.clears = false;
+  const OutputGrid grid = grid_of(record, output);
+  for (int row = 0; row < record.picture.height; ++row) {
+    store_span(record.store, grid.span(row, 0, record.picture.width), [](int) { return Rgba{}; });
+  }
+}
 
 StoreRgba gif_storer(int format) {
   return format == TAVIRPELO_RGB565A8 ? nullptr : rgba_storer(format, Alpha::kIgnored);
@@ -87,12 +121,14 @@ void write_plane_row(const Record& record, int planeRow, const OutputGrid& grid,
              [=](int i) { return palette[indices[i]]; });
 }
 
-void write_screen_row(Record& record, void* output) {
+bool write_screen_row(Record& record, void* output) {
+  if (!may_write(record, rows_of_current(record))) return false;
   if (record.picture == record.screen) {
     PELOI_WriteAGIFOneToOneRow(&record, output);
   } else {
     PELOI_DownsizeAGIFRow(&record, output);
   }
+  return true;
 }
 
 }  // namespace pelo::gif
@@ -133,21 +169,21 @@ int PELOI_DownsizeAGIFRow(Record* record, void* output) {
 }
 
 int PELOI_WriteTheLine(Record* record, void* output) {
+  bool goesOn = true;
   if (record->animated) {
-    write_screen_row(*record, output);
+    goesOn = write_screen_row(*record, output);
   } else if (record->plane.indices) {
     write_into_plane(*record);
-  } else if (record->picture == record->screen) {
-    PELOI_WriteGIFOneToOneRow(record, output);
   } else {
-    PELOI_DownsizeGIFRow(record, output);
+    goesOn = write_still_row(*record, output);
   }
-  return advance_row(*record);
+  return goesOn && advance_row(*record);
 }
 
 int PELOI_GIFMakeOut1Row(Record* record, void* output, int* consumed) {
   const OutputRows rows = rows_of(record->sampling, record->currentRow);
   if (record->lineRow < rows.end) {
+    if (!may_write(*record, 1)) return 0;
     // Rows above the image keep what the buffer holds.
     if (record->lineRow >= rows.begin) {
       write_sampled_row(*record, line_grid_of(*record, output), record->linesHere);

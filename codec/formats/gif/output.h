@@ -14,14 +14,20 @@ StoreRgba gif_storer(int format);
 // The colours of the current image's indices: opaque, but zeros for the transparent one.
 void set_palette(Record& record);
 
+// Asks the caller before the next `rows` output rows, if any, and counts them. False ends the decode.
+[[nodiscard]] bool may_write(Record& record, int rows);
+
+// Makes every pixel of the picture zero bytes, once.
+void clear_picture(Record& record, void* output);
+
 // True when some output is made of the current row.
 bool row_is_wanted(const Record& record);
 
 // Writes a row of the plane into picture row `row` of a grid, where the frame covers it.
 void write_plane_row(const Record& record, int planeRow, const OutputGrid& grid, int row);
 
-// Writes the current screen row from the row source.
-void write_screen_row(Record& record, void* output);
+// Writes the current screen row from the row source. False when the caller ends the decode.
+[[nodiscard]] bool write_screen_row(Record& record, void* output);
 
 }  // namespace pelo::gif
 
@@ -33,9 +39,9 @@ TAVIRPELO_API int PELOI_WriteAGIFOneToOneRow(pelo::gif::Record* record, void* ou
 TAVIRPELO_API int PELOI_DownsizeAGIFRow(pelo::gif::Record* record, void* output);
 
 // Writes the current row where the record's mode wants it and moves on to the next image row. 1, or 0
-// when there is no such interlace pass.
+// when the caller ends the decode or there is no such interlace pass.
 TAVIRPELO_API int PELOI_WriteTheLine(pelo::gif::Record* record, void* output);
 
 // Line mode: writes the next output row, unrotated, when it is made of the current image row. *consumed
-// becomes 1 when no further output row is; the current row has then moved on.
+// becomes 1 when no further output row is; the current row has then moved on. Answers as the one above.
 TAVIRPELO_API int PELOI_GIFMakeOut1Row(pelo::gif::Record* record, void* output, int* consumed);

@@ -99,9 +99,7 @@ int PELOI_ParseGIFHeader(TAVIRPELO_IO* source, Record* record) {
   if (b == nullptr || !is_signature(b)) return 0;
   record->screen = {load_le16(b + 6), load_le16(b + 8)};
   const uint8_t flags = b[10];
-  record->colourResolution = flags >> 4 & 7;
   record->backgroundIndex = b[11];
-  record->aspectRatio = b[12];
   return (flags & 0x80) == 0 || read_table(reader, flags, record->globalTable);
 }
 

@@ -22,6 +22,7 @@ namespace pelo::gif {
 
 const uint8_t* take(Reader& reader, int n) {
   if (!PELOI_CheckBuffer(n, reader.source, reader.buffer, &reader.remaining, &reader.cursor)) {
+    reader.remaining = 0;  // the rest of what was cut is no block
     return nullptr;
   }
   const uint8_t* bytes = reader.cursor;

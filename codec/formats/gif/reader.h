@@ -18,7 +18,7 @@ struct Reader {
 };
 
 // Consumes n bytes (up to kReaderBytes), which stay valid until the next call; null when the source has
-// fewer.
+// fewer, which are passed over.
 const uint8_t* take(Reader& reader, int n);
 
 // Consumes data sub-blocks up to and with the empty one; false when the source ends before.

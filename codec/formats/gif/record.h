@@ -83,9 +83,7 @@ struct Record : FormatState {
   static constexpr FormatKind kKind = FormatKind::kGif;
 
   Size screen;
-  int colourResolution;
   int backgroundIndex;
-  int aspectRatio;
   uint32_t globalTable[256];  // packed lanes, see pixel/lanes.h
   Frame frame;
   int interlacePass;  // 0: rows in order
@@ -97,6 +95,7 @@ struct Record : FormatState {
   TranslationTable table;
   Reader reader;
 
+  TAVIRPELO_DECINFO* decInfo;  // of the current call; null: nobody to ask
   Request request;
   uint32_t option;  // the option word that the output is placed by
   StoreRgba store;  // null: the output format has no writer
@@ -105,6 +104,9 @@ struct Record : FormatState {
   IndexPlane plane;
   OsBuffer<uint8_t> line;  // indices of the current row and the rest of the string behind it
   int currentRow;          // on the screen
+  bool clears;             // the picture is to be cleared before its first row
+  int rowsWritten;         // output rows of the image or frame
+  bool ended;              // by the caller
   LzwState lzw;
 
   int lineRow;     // line mode: the next output row

@@ -18,12 +18,13 @@ constexpr uint8_t kEmptyIend[12] = {0, 0, 0, 0, 'I', 'E', 'N', 'D', 0xAE, 0x42, 
 // its data.
 bool merge_chunks(PELOI_PNGCONTEXT& context) {
   PELOI_PNGINFO& info = context.info;
-  uint8_t* const data = info.idat[0].data;
-  const uint8_t* const end = context.reader.base + context.reader.limit;
+  uint8_t* const base = context.reader.base;
+  uint8_t* const data = base + info.idat[0].offset;
+  const uint8_t* const end = base + context.reader.limit;
   if (info.idatLength + 4 + sizeof kEmptyIend > static_cast<uint64_t>(end - data)) return false;
   uint8_t* out = data + info.idat[0].length;
   for (size_t i = 1; i < info.idatCount; ++i) {
-    std::memmove(out, info.idat[i].data, info.idat[i].length);
+    std::memmove(out, base + info.idat[i].offset, info.idat[i].length);
     out += info.idat[i].length;
   }
   const auto length = static_cast<uint32_t>(info.idatLength);
@@ -39,7 +40,7 @@ Result open_memory_input(PELOI_PNGCONTEXT& context) {
   if (context.inputReady) return kDone;
   if (context.info.idatCount > 1 && !merge_chunks(context)) return kFailed;
   InflateInput& input = context.inflater.input();
-  input.next = context.info.idat[0].data;
+  input.next = context.reader.base + context.info.idat[0].offset;
   input.end = input.next + context.info.idat[0].length;
   context.inputReady = true;
   return kDone;
@@ -100,15 +101,6 @@ Result open_decompression(PELOI_PNGCONTEXT& context) {
   return kDone;
 }
 
-// A much smaller output than image was once smoothed here.
-void smooth_output(PELOI_PNGCONTEXT& context) {
-  const uint32_t side = std::max(context.fullWidth, context.fullHeight);
-  const uint32_t outSide = std::max(context.output.width, context.output.height);
-  if (outSide != 0 && side / outSide > 3) {
-    __PELOI_NearestInterpolateOutput(&context, nullptr, context.output.width, context.output.height);
-  }
-}
-
 using OpenInput = Result (*)(PELOI_PNGCONTEXT&);
 
 int inflate_image(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInput) {
@@ -116,14 +108,13 @@ int inflate_image(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInpu
   if (result == kDone) result = openInput(context);
   if (result == kDone) result = run(context);
   *total = static_cast<uint32_t>(context.inflater.total());
-  if (result == kDone) smooth_output(context);
   return result;
 }
 
 int inflate_interlaced(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInput) {
   const int result = inflate_image(context, total, openInput);
-  if (result == kDone && context.output.wholeImage) __PELOI_WriteOutputDataFromINTBuffer(&context);
-  return result;
+  if (result != kDone || !context.output.wholeImage) return result;
+  return __PELOI_WriteOutputDataFromINTBuffer(&context) ? kDone : kFailed;
 }
 
 }  // namespace

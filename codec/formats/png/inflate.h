@@ -70,7 +70,6 @@ class Inflater {
   Step codes();
   bool fast_codes(Step& step);
   Step one_symbol();
-  Step copy_match(size_t length, size_t distance);
 
   // ---- bits: the lowest of `bits_` is the next of the stream ----
   bool fill(int count);

@@ -8,6 +8,7 @@
 #include <cstring>
 
 #include "codec/base/byte_order.h"
+#include "codec/base/row_progress.h"
 #include "codec/pixel/blend.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_runs.h"
@@ -118,24 +119,22 @@ int64_t first_output_row(const PELOI_PNGCONTEXT& context, int64_t y) {
   return numerator <= 0 ? 0 : std::min(outHeight, ceil_div(numerator, height));
 }
 
-// Every output row of a pass's scanline; passes revisit the picture, so rows are found by division.
+int64_t source_row(const PELOI_PNGCONTEXT& context) {
+  return int64_t{context.pass.firstRow} + int64_t{context.pass.rowStep} * context.scanline.row;
+}
+
+// The next output row of a pass's scanline.
 void write_interlaced(PELOI_PNGCONTEXT& context, const uint8_t* row) {
   OutputState& output = context.output;
-  const PassState& pass = context.pass;
-  const int64_t y = int64_t{pass.firstRow} + int64_t{pass.rowStep} * context.scanline.row;
-  if (output.store == nullptr) return;
-  if (one_to_one(context)) {
-    write_pass_row(context, row, y);
+  const int64_t target = output.passRow++;
+  if (output.wholeImage) {
+    gather_pass_columns(context, row, static_cast<size_t>(target));
     return;
   }
-  const int64_t end = first_output_row(context, y + 1);
-  for (int64_t target = first_output_row(context, y); target < end; ++target) {
-    if (output.wholeImage) {
-      gather_pass_columns(context, row, static_cast<size_t>(target));
-    } else {
-      write_pass_columns(context, row, target);
-    }
+  if (output.store != nullptr) {
+    (one_to_one(context) ? write_pass_row : write_pass_columns)(context, row, target);
   }
+  if (completes_row(context, source_row(context))) ++output.written;
 }
 
 // ---- set-up ----
@@ -213,10 +212,11 @@ void aim_output(PELOI_PNGCONTEXT& context, void* bytes, int lines) {
   int64_t y = tight ? 0 : (int64_t{request.height} - shown.height) / 2;
   output.base = 0;
   output.stop = 0;
-  if (lines > 0) {  // the buffer receives these rows alone
+  if (lines > 0) {  // the buffer receives these rows alone; an interlaced image comes whole
     output.base = output.written;
-    output.stop = static_cast<uint32_t>(
-        std::min<uint64_t>(uint64_t{output.written} + static_cast<uint32_t>(lines), UINT32_MAX));
+    const uint64_t stop = uint64_t{output.written} + static_cast<uint32_t>(lines);
+    if (context.info.interlace == 0)
+      output.stop = static_cast<uint32_t>(std::min<uint64_t>(stop, UINT32_MAX));
     box.height = lines;
     y = 0;
   }
@@ -241,6 +241,20 @@ void begin_pass_output(PELOI_PNGCONTEXT& context) {
     output.passTargets[count++] = k;
   }
   pass.columnCount = count;
+}
+
+void begin_row_output(PELOI_PNGCONTEXT& context) {
+  if (context.pass.number == 0) return;
+  const int64_t y = source_row(context);
+  OutputState& output = context.output;
+  output.passRow = one_to_one(context) ? y : first_output_row(context, y);
+  output.passRowsEnd = one_to_one(context) ? y + 1 : first_output_row(context, y + 1);
+}
+
+bool has_output_row(const PELOI_PNGCONTEXT& context) {
+  const OutputState& output = context.output;
+  if (context.pass.number != 0) return output.passRow < output.passRowsEnd;
+  return output.written < output.height && output.rows.position() == context.scanline.row;
 }
 
 namespace {
@@ -274,15 +288,11 @@ StoreRgba gathered_storer(const PELOI_PNGCONTEXT& context) {
 using namespace pelo::png;
 
 void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context) {
+  if (!has_output_row(*context)) return;
   OutputState& output = context->output;
   const uint8_t* row = context->scanline.finished;
   if (context->pass.number != 0) {
     write_interlaced(*context, row);
-    context->pendingRows = 0;
-    return;
-  }
-  if (output.written >= output.height || output.rows.position() != context->scanline.row) {
-    context->pendingRows = 0;
     return;
   }
   write_row(*context, row, int64_t{output.written} - output.base);
@@ -290,13 +300,16 @@ void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context) {
   output.rows.advance();
 }
 
-void __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context) {
-  const OutputState& output = context->output;
-  if (output.store == nullptr) return;
+int __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context) {
+  OutputState& output = context->output;
+  if (output.store == nullptr) return 1;
   const pelo::StoreRgba store = gathered_storer(*context);
   for (size_t y = 0; y < output.height; ++y) {
+    if (!pelo::caller_agrees(context->decInfo, static_cast<int>(y))) return 0;
     const pelo::RowSpan span = output.grid.span(static_cast<int64_t>(y), 0, output.width);
     const uint8_t* row = output.wholeImage.data() + y * output.width * 4;
     store(row + size_t{4} * static_cast<size_t>(span.skip), span.count, span.first, span.step);
+    if (!may_go_on()) return 0;
   }
+  return 1;
 }

@@ -13,6 +13,7 @@ constexpr uint8_t kSignature[8] = {137, 'P', 'N', 'G', 13, 10, 26, 10};
 constexpr uint32_t kIhdr = 0x49484452, kPlte = 0x504C5445, kIdat = 0x49444154, kIend = 0x49454E44,
                    kTrns = 0x74524E53;
 constexpr uint32_t kCrcBytes = 4;
+constexpr uint32_t kChunkFrame = 12;  // bytes around the data of a chunk
 
 struct Chunk {
   uint32_t length;
@@ -114,9 +115,13 @@ int parse_trns(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length
 }
 
 int note_idat(PELOI_PNGINFO& info, const PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
-  if (info.idatCount == kMaxIdatChunks) return kFailed;
-  uint8_t* data = is_memory(buffer) ? buffer.base + chunk.data : nullptr;
-  info.idat[info.idatCount++] = {chunk.length, data, chunk.data};
+  constexpr size_t kFirstEntries = 16;
+  // Streams may deliver more than they said.
+  if (info.idatCount >= buffer.limit / kChunkFrame || chunk.data > UINT32_MAX) return kFailed;
+  if (info.idatCount == info.idat.size() &&
+      !info.idat.grow(std::max(kFirstEntries, 2 * info.idat.size())))
+    return kNoMemory;
+  info.idat[info.idatCount++] = {chunk.length, static_cast<uint32_t>(chunk.data)};
   info.idatLength += chunk.length;
   return kDone;
 }

@@ -53,7 +53,8 @@ struct OutputState {
   OsBuffer<uint32_t> passColumns;  // of the pass: the pass's pixel, and behind these
   uint32_t* passTargets;           // the output columns that show it
   AxisStepper rows;                // source row of the next output row
-  uint32_t written;                // output rows written
+  int64_t passRow, passRowsEnd;    // interlaced: the output rows that the finished scanline still gives
+  uint32_t written;                // output rows finished
   uint32_t base;                   // of these, by earlier line-mode calls
   uint32_t stop;                   // line mode: rows after which to stop; 0 never
   OutputGrid grid;
@@ -76,20 +77,19 @@ typedef struct PELOI_PNGCONTEXT : pelo::FormatState {
   uint32_t fullWidth, fullHeight;  // interlaced images: info holds the pass's size meanwhile
   pelo::png::PassState pass;
   pelo::png::ScanlineState scanline;
-  uint32_t pendingRows;  // 1 while the finished scanline may give another output row
   pelo::png::OutputState output;
+  TAVIRPELO_DECINFO* decInfo;  // of the current call
 } PELOI_PNGCONTEXT;
 
 // Undoes one scanline's filter in place; its type stands in the byte before `row`.
 TAVIRPELO_API void __PELOI_PngReadFilterRow(PELOI_PNGCONTEXT* context, uint8_t* row,
                                             const uint8_t* previousRow, size_t rowBytes);
 
-// Writes the next output row that the finished scanline gives, if there is one, and sets or clears
-// pendingRows. A scanline of an interlaced image writes all of its rows at once.
+// Writes the next output row that the finished scanline gives, if there is one.
 TAVIRPELO_API void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context);
 
-// Writes the gathered whole image, rotated, into the output.
-TAVIRPELO_API void __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context);
+// Writes the gathered whole image, rotated, into the output. 1, or 0 when it is cancelled between rows.
+TAVIRPELO_API int __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context);
 
 // Sets the pass's size in the information record, and answers the bytes of its rows (0 when it is
 // empty).
@@ -121,6 +121,12 @@ namespace pelo::png {
 // dropped.
 Result consume(PELOI_PNGCONTEXT& context);
 
+// True when no later pass has pixels in a source row.
+bool completes_row(const PELOI_PNGCONTEXT& context, int64_t sourceRow);
+
+// Asked after every output row: the external status may pause the decode; false cancels it.
+bool may_go_on();
+
 // ---- output.cpp ----
 
 // Sizes, placement and writers for the request. kDone, or kNoMemory.
@@ -131,5 +137,11 @@ void aim_output(PELOI_PNGCONTEXT& context, void* output, int lines);
 
 // Lists the output columns that show a pixel of the current pass.
 void begin_pass_output(PELOI_PNGCONTEXT& context);
+
+// Finds the output rows of the scanline just finished.
+void begin_row_output(PELOI_PNGCONTEXT& context);
+
+// Whether the finished scanline gives another output row.
+bool has_output_row(const PELOI_PNGCONTEXT& context);
 
 }  // namespace pelo::png

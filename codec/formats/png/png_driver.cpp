@@ -6,10 +6,12 @@ namespace {
 // The state of a first call: reader, header, output.
 Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
   if (!open_read_buffer(context.reader, decInfo.pIO)) return kNoMemory;
-  if (__PELOI_PngParserMain(&context.info, &context.reader) != kDone) return kNoMemory;
+  if (__PELOI_PngParserMain(&context.info, &context.reader) != kDone) return kUnreadable;
   const PELOI_PNGINFO& info = context.info;
-  if (info.width == 0 || info.height == 0 || info.idatCount == 0) return kNoMemory;
-  if (info.colourType == kPalette && (info.criticalFlags & kPlteRead) == 0) return kNoMemory;
+  if (info.width == 0 || info.height == 0 || info.idatCount == 0) return kUnreadable;
+  if (info.colourType == kPalette && (info.criticalFlags & kPlteRead) == 0) return kUnreadable;
+  decInfo.imageWidth = static_cast<int>(info.width);
+  decInfo.imageHeight = static_cast<int>(info.height);
   const Result result = set_up_output(context);
   decInfo.outWidth = static_cast<int>(context.output.width);
   decInfo.outHeight = static_cast<int>(context.output.height);
@@ -52,6 +54,7 @@ int decode(TAVIRPELO_DECINFO& decInfo, void* output, const Request& request, int
   if (context->output.width == 0 || context->output.height == 0) return kDone;
   if (!accepts_lines(*context, lines)) return kLineMode;
   context->reader.source = decInfo.pIO;
+  context->decInfo = &decInfo;
   context->iterFlag = decInfo.pngIterFlag != 0 ? 1 : 0;
   aim_output(*context, output, lines);
   return decompress(*context);

@@ -5,9 +5,9 @@
 
 #include "codec/formats/png/png_context.h"
 
-// Decodes into `output`; lines > 0: that many output rows, into a buffer that receives only these. 1
-// done (also for a computed output size of 0), 9 more to come, 7 parse failure or out of memory, 10 line
-// mode of an interlaced image, or the decompressor's 6, 8. Every answer but 9 releases the state.
+// One call of a decode: whole (lines 0) or the next `lines` output rows, which then are all that
+// `output` has room for. A Result; a picture too small to have any pixel is kDone. Only kMore leaves the
+// state in place.
 TAVIRPELO_API int PELOI_FastImgDecodePng(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
                                          int lines);
 

@@ -19,24 +19,23 @@ enum ColourType : uint8_t {
 
 // Outcomes of the inner operations.
 enum Result {
-  kNoLookup = 0,
   kDone = 1,
   kCorrupt = 6,  // checksum, zlib or DEFLATE data
   kNoMemory = 7,
-  kFailed = 8,    // anything else: header, palette, a read or seek, cancelled
-  kMore = 9,      // stopped with its state kept
-  kLineMode = 10  // line mode asked of an interlaced image
+  kUnreadable = 7,  // the driver's word for a file that does not parse, which shares the code
+  kFailed = 8,      // anything else: header, palette, a read or seek, cancelled
+  kMore = 9,        // stopped with its state kept
+  kLineMode = 10    // line mode asked of an interlaced image
 };
 
-constexpr size_t kMaxIdatChunks = 2048;
 constexpr uint32_t kTrnsRead = 0x1000;            // in ancillaryFlags
 constexpr uint32_t kIhdrRead = 1, kPlteRead = 2;  // in criticalFlags
 constexpr uint32_t kNoGrey = 0xFFFF;              // a colour key that no pixel equals
 
+// Where the data of a chunk lie.
 struct IdatEntry {
   uint32_t length;  // bytes not yet read
-  uint8_t* data;    // memory sources
-  int64_t offset;   // other sources: stream position
+  uint32_t offset;  // stream position
 };
 
 }  // namespace pelo::png
@@ -53,13 +52,13 @@ typedef struct PELOI_PNGINFO {
   uint32_t paletteEntries;
   uint32_t ancillaryFlags, criticalFlags;
   uint8_t bitsPerPixel;
-  uint8_t bytesPerPixel;  // the filters' distance, at least 1
-  std::array<pelo::png::IdatEntry, pelo::png::kMaxIdatChunks> idat;
+  uint8_t bytesPerPixel;                      // the filters' distance, at least 1
+  pelo::OsBuffer<pelo::png::IdatEntry> idat;  // grows as chunks are found
   uint32_t idatCount;
 } PELOI_PNGINFO;
 
 // Reads the chunks from the source's start to the first empty chunk; their data are checked, not
-// decompressed. A Result: 1, 6 (a checksum differs), 8.
+// decompressed. A Result: 1, 6 (a checksum differs), 7, 8.
 TAVIRPELO_API int __PELOI_PngParserMain(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer);
 
 // Reads the `length` bytes of a tRNS chunk at the cursor into the palette's alpha or the colour key. 1;

@@ -3,6 +3,7 @@
 #include <cstring>
 #include <utility>
 
+#include "codec/base/row_progress.h"
 #include "codec/formats/png/png_context.h"
 #include "codec/formats/png/row_filter.h"
 
@@ -58,24 +59,21 @@ void finish_scanline(PELOI_PNGCONTEXT& context) {
   scanline.finished = scanline.current + 1;
   std::swap(scanline.current, scanline.above);
   scanline.filled = 0;
-  context.pendingRows = 1;
+  begin_row_output(context);
 }
 
-// Asked after every output row: false cancels the decode.
-bool may_go_on() {
-  int status = 0;
-  TAVIRPELO_CheckExStatus(&status);
-  if (status > 0) TAVIRPELO_OsSleep(status);
-  return status >= 0;
+// Asks before a row of the caller's buffer changes. The rows of a gathered image get there at its end.
+bool may_write(const PELOI_PNGCONTEXT& context) {
+  const OutputState& output = context.output;
+  return output.wholeImage || caller_agrees(context.decInfo, static_cast<int>(output.written));
 }
 
 // The output rows of the finished scanline, as far as the caller wants them now.
 Result write_pending(PELOI_PNGCONTEXT& context) {
   const OutputState& output = context.output;
-  while (context.pendingRows != 0) {
-    const uint32_t before = output.written;
+  while (context.scanline.finished != nullptr && has_output_row(context)) {
+    if (!may_write(context)) return kFailed;
     __PELOI_PngWriteDataToOutputBuffer(&context);
-    if (output.written == before) continue;
     if (output.stop != 0 && output.written >= output.stop && output.written < output.height)
       return kMore;
     if (!may_go_on()) return kFailed;
@@ -104,6 +102,21 @@ bool begin_scanlines(PELOI_PNGCONTEXT& context) {
     return true;
   }
   return next_pass(context);
+}
+
+bool completes_row(const PELOI_PNGCONTEXT& context, int64_t sourceRow) {
+  for (int number = context.pass.number + 1; number <= 7; ++number) {
+    const Adam7& pass = kPasses[number];
+    if (context.fullWidth > pass.firstColumn && sourceRow % pass.rowStep == pass.firstRow) return false;
+  }
+  return true;
+}
+
+bool may_go_on() {
+  int status = 0;
+  TAVIRPELO_CheckExStatus(&status);
+  if (status > 0) TAVIRPELO_OsSleep(status);
+  return status >= 0;
 }
 
 Result consume(PELOI_PNGCONTEXT& context) {
