@@ -69,6 +69,20 @@ bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
   return true;
 }
 
+// A decoder ready for its first row; empty with the reason in `error`.
+Decoder start(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST& request, int& error) {
+  Decoder decoder = os_new<PELOJ_JDINFO>();
+  if (!decoder) {
+    error = TAVIRPELO_ERROR_MEMORY;
+    log_error("PELOJ_Initialize : malloc fail");
+    return nullptr;
+  }
+  take_wishes(*decoder, decInfo, source, request);
+  if (initialize(*decoder, request)) return decoder;
+  error = TAVIRPELO_ERROR_DECODE;
+  return nullptr;
+}
+
 // Passes the rows above the wanted part; false when the picture ends there.
 bool skip_rows(PELOJ_JDINFO& jd) {
   const RowFunction process = row_function(jd);
@@ -140,24 +154,17 @@ int PELOJ_StartDecompression(PELOJ_JDINFO* jdInfo) {
 }
 
 PELOJ_JDINFO* PELOJ_Initialize(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
-  Decoder decoder = os_new<PELOJ_JDINFO>();
-  if (!decoder) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_MEMORY;
-    log_error("PELOJ_Initialize : malloc fail");
-    return nullptr;
-  }
-  take_wishes(*decoder, *decInfo, source, *request);
-  return initialize(*decoder, *request) ? decoder.release() : nullptr;
+  int error = TAVIRPELO_ERROR_NONE;
+  Decoder decoder = start(*decInfo, source, *request, error);
+  if (error == TAVIRPELO_ERROR_MEMORY) gTAVIRPELO_Error = error;
+  return decoder.release();
 }
 
 int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
-  const Decoder decoder(PELOJ_Initialize(decInfo, source, request));
-  if (!decoder) {
-    if (gTAVIRPELO_Error != TAVIRPELO_ERROR_MEMORY) gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
-    return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
-  }
-  if (!first_scan_suffices(*decoder)) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
+  int error = TAVIRPELO_ERROR_DECODE;
+  const Decoder decoder = start(*decInfo, source, *request, error);
+  if (!decoder || !first_scan_suffices(*decoder)) {
+    gTAVIRPELO_Error = error;
     return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
   }
   return needs_all_scans(*decoder) ? decode_scans(*decoder) : decode_in_order(*decoder);
