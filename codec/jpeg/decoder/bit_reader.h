@@ -52,6 +52,9 @@ inline int32_t extend(uint32_t v, int s) {
   return value - ((value - low) >> 31 & (2 * low - 1));
 }
 
+// The source has ended: for a picture in several scans, as if an EOI had been met.
+void meet_end(PELOJ_JDINFO& jd);
+
 // Takes the reader's window from the decoder's source, and gives it back.
 BitReader open_bits(PELOJ_JDINFO& jd);
 void close_bits(PELOJ_JDINFO& jd, const BitReader& reader);

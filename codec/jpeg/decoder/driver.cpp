@@ -5,6 +5,7 @@
 #include "codec/jpeg/decoder/markers.h"
 #include "codec/jpeg/decoder/progressive.h"
 #include "codec/jpeg/decoder/row_process.h"
+#include "codec/jpeg/decoder/scan_list.h"
 #include "codec/jpeg/decoder/scan_setup.h"
 #include "codec/jpeg/decoder/upsample.h"
 #include "codec/jpeg/header_scan.h"
@@ -99,18 +100,16 @@ bool skip_rows(PELOJ_JDINFO& jd) {
   return true;
 }
 
-// From one pass over the data. Damage ends the picture, it does not fail.
-int decode_in_order(PELOJ_JDINFO& jd) {
+// From one pass over the data, or from all scans row by row. Damage ends a picture, or coarsens it; it
+// does not fail.
+int decode_rows(PELOJ_JDINFO& jd) {
+  if (needs_all_scans(jd)) {
+    // A scan that is cut must not hide what the others have of its rows.
+    jd.endIsMarker = 1;
+    if (list_scans(jd) != PELOJ_OK) return PELOJ_FAIL;
+  }
   if (!skip_rows(jd)) return 0;
-  show_rows(jd);
-  return PELOJ_OK;
-}
-
-// From all scans, row by row.
-int decode_scans(PELOJ_JDINFO& jd) {
-  if (list_scans(jd) != PELOJ_OK) return PELOJ_FAIL;
-  if (!skip_rows(jd)) return 0;
-  if (show_rows(jd) != PELOJ_FAIL) return PELOJ_OK;
+  if (show_rows(jd) != PELOJ_FAIL || !stores_coefficients(jd)) return PELOJ_OK;
   gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
   log_error(jd.scale == kFull ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
                               : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");
@@ -167,7 +166,7 @@ int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_RE
     gTAVIRPELO_Error = error;
     return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
   }
-  return needs_all_scans(*decoder) ? decode_scans(*decoder) : decode_in_order(*decoder);
+  return decode_rows(*decoder);
 }
 
 int PELOJ_ValorenDecodeFrame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, void* outBuffer,
