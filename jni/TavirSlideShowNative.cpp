@@ -2,7 +2,7 @@
 // com.tavir.slideshow.SlideShowJNI.
 #include <jni.h>
 
-#include <iterator>
+#include <span>
 
 #include "jni/log.h"
 #include "jni/natives.h"
@@ -15,45 +15,49 @@ constexpr char kClassPath[] = "com/tavir/slideshow/SlideShowJNI";
 
 using Show = SlideShow;
 
-const JNINativeMethod kNatives[] = {
-    native<CreateShow>("CreateShow", "(Ljava/lang/String;)I"),
-    native<OpenShow>("OpenShow", "(Ljava/lang/String;)I"),
-    native<DeleteShow>("DeleteShow", "(I)I"),
-    native<DestroyShowHandler>("DestroyShowHandler", "()V"),
-    native<from_file<&Show::AddImageToFile>>("AddImageToFile",
-                                             "(ILjava/lang/String;Ljava/lang/String;)I"),
-    native<from_bytes<&Show::AddImageToBuffer>>("AddImageToBuffer", "(I[BILjava/lang/String;)I"),
-    native<from_file<&Show::InsertImageToFile, jint>>("InsertImageToFile",
-                                                      "(ILjava/lang/String;Ljava/lang/String;I)I"),
-    native<from_bytes<&Show::InsertImageToBuffer, jint>>("InsertImageToBuffer",
-                                                         "(I[BILjava/lang/String;I)I"),
-    native<with_path<&Show::AddMusic>>("AddMusic", "(ILjava/lang/String;)I"),
-    native<call<&Show::RemoveMusic>>("RemoveMusic", "(I)I"),
-    native<call<&Show::RemoveImage, jint>>("RemoveImage", "(II)I"),
-    native<call<&Show::RemoveSubfile>>("RemoveCache", "(I)I"),
-    native<call<&Show::GetImageState, jint>>("GetImageState", "(II)I"),
-    native<GetBitmap>("GetBitmap", "(II[I)I"),
-    native<GetBitmapToBuffer>("GetBitmapToBuffer", "(II[BI[I)I"),
-    native<GetThumbnail>("GetThumbnail", "(IIII[I)I"),
-    native<call<&Show::GetSubWidth, jint>>("GetBitmapWidth", "(II)I"),
-    native<call<&Show::GetSubHeight, jint>>("GetBitmapHeight", "(II)I"),
-    native<get_number<&Show::subfileCount>>("GetNumFrames", "(I)I"),
-    native<get_flag<&Show::shuffle>>("GetShuffleMode", "(I)Z"),
-    native<get_number<&Show::effectType>>("GetEffectType", "(I)I"),
-    native<get_number<&Show::interval>>("GetInterval", "(I)I"),
-    native<get_flag<&Show::screenDirection>>("GetScreenDirection", "(I)Z"),
-    native<get_flag<&Show::loop>>("GetLoopMode", "(I)Z"),
-    native<text<&Show::GetMusic>>("GetMusicFilename", "(I[B)I"),
-    native<call<&Show::GetMusicSize>>("GetMusicSize", "(I)I"),
-    native<set_number<&Show::interval>>("SetInterval", "(II)V"),
-    native<set_number<&Show::effectType>>("SetEffectType", "(II)V"),
-    native<set_flag<&Show::shuffle>>("SetShuffleMode", "(IZ)V"),
-    native<set_flag<&Show::loop>>("SetLoopMode", "(IZ)V"),
-    native<set_flag<&Show::screenDirection>>("SetScreenDirection", "(IZ)V"),
-    native<with_path<&Show::SetPathName>>("SetPathName", "(ILjava/lang/String;)I"),
-    native<text<&Show::GetLastInformation>>("GetLastInformation", "(I[B)I"),
-};
-constexpr jint kNativeCount = static_cast<jint>(std::size(kNatives));
+// Function addresses as untyped pointers are no constants: a table outside a function would be filled
+// when the library is loaded.
+std::span<const JNINativeMethod> natives() {
+  static const JNINativeMethod table[] = {
+      native<CreateShow>("CreateShow", "(Ljava/lang/String;)I"),
+      native<OpenShow>("OpenShow", "(Ljava/lang/String;)I"),
+      native<DeleteShow>("DeleteShow", "(I)I"),
+      native<DestroyShowHandler>("DestroyShowHandler", "()V"),
+      native<from_file<&Show::AddImageToFile>>("AddImageToFile",
+                                               "(ILjava/lang/String;Ljava/lang/String;)I"),
+      native<from_bytes<&Show::AddImageToBuffer>>("AddImageToBuffer", "(I[BILjava/lang/String;)I"),
+      native<from_file<&Show::InsertImageToFile, jint>>("InsertImageToFile",
+                                                        "(ILjava/lang/String;Ljava/lang/String;I)I"),
+      native<from_bytes<&Show::InsertImageToBuffer, jint>>("InsertImageToBuffer",
+                                                           "(I[BILjava/lang/String;I)I"),
+      native<with_path<&Show::AddMusic>>("AddMusic", "(ILjava/lang/String;)I"),
+      native<call<&Show::RemoveMusic>>("RemoveMusic", "(I)I"),
+      native<call<&Show::RemoveImage, jint>>("RemoveImage", "(II)I"),
+      native<call<&Show::RemoveSubfile>>("RemoveCache", "(I)I"),
+      native<call<&Show::GetImageState, jint>>("GetImageState", "(II)I"),
+      native<GetBitmap>("GetBitmap", "(II[I)I"),
+      native<GetBitmapToBuffer>("GetBitmapToBuffer", "(II[BI[I)I"),
+      native<GetThumbnail>("GetThumbnail", "(IIII[I)I"),
+      native<call<&Show::GetSubWidth, jint>>("GetBitmapWidth", "(II)I"),
+      native<call<&Show::GetSubHeight, jint>>("GetBitmapHeight", "(II)I"),
+      native<get_number<&Show::subfileCount>>("GetNumFrames", "(I)I"),
+      native<get_flag<&Show::shuffle>>("GetShuffleMode", "(I)Z"),
+      native<get_number<&Show::effectType>>("GetEffectType", "(I)I"),
+      native<get_number<&Show::interval>>("GetInterval", "(I)I"),
+      native<get_flag<&Show::screenDirection>>("GetScreenDirection", "(I)Z"),
+      native<get_flag<&Show::loop>>("GetLoopMode", "(I)Z"),
+      native<text<&Show::GetMusic>>("GetMusicFilename", "(I[B)I"),
+      native<call<&Show::GetMusicSize>>("GetMusicSize", "(I)I"),
+      native<set_number<&Show::interval>>("SetInterval", "(II)V"),
+      native<set_number<&Show::effectType>>("SetEffectType", "(II)V"),
+      native<set_flag<&Show::shuffle>>("SetShuffleMode", "(IZ)V"),
+      native<set_flag<&Show::loop>>("SetLoopMode", "(IZ)V"),
+      native<set_flag<&Show::screenDirection>>("SetScreenDirection", "(IZ)V"),
+      native<with_path<&Show::SetPathName>>("SetPathName", "(ILjava/lang/String;)I"),
+      native<text<&Show::GetLastInformation>>("GetLastInformation", "(I[B)I"),
+  };
+  return table;
+}
 
 bool register_natives(JNIEnv* env) {
   jclass owner = env->FindClass(kClassPath);
@@ -61,7 +65,7 @@ bool register_natives(JNIEnv* env) {
     log(ANDROID_LOG_ERROR, "Native registration unable to find class '%s'", kClassPath);
     return false;
   }
-  if (env->RegisterNatives(owner, kNatives, kNativeCount) < 0) {
+  if (env->RegisterNatives(owner, natives().data(), static_cast<jint>(natives().size())) < 0) {
     log(ANDROID_LOG_ERROR, "RegisterNatives failed for '%s'", kClassPath);
     return false;
   }

@@ -1,4 +1,5 @@
-"""The shared library exports exactly what the headers declare with TAVIRPELO_API.
+"""The shared library exports exactly what the headers declare with TAVIRPELO_API, and runs no initialiser
+when it is loaded.
 
 The headers go through the preprocessor first, since some declare a family through a macro.
 """
@@ -36,8 +37,14 @@ def headers_under(*folders):
 
 public = declared(headers_under("include"))
 interface = declared(headers_under("include", "platform", "codec", "slideshow"))
-table = subprocess.run([arguments.nm, "-D", "--defined-only", arguments.library],
-                       capture_output=True, check=True, text=True).stdout
+
+
+def symbols(*options):
+    return subprocess.run([arguments.nm, *options, "--defined-only", arguments.library],
+                          capture_output=True, check=True, text=True).stdout
+
+
+table = symbols("-D")
 exported = {line.split()[-1].split("@")[0] for line in table.splitlines() if line.strip()}
 
 assert len(public) > 50, "the public headers were not read"
@@ -47,4 +54,6 @@ for title, names in (("exported, but declared in no header", exported - interfac
     for name in sorted(names):
         print(f"{title}: {name}")
 print(f"{len(exported)} names exported, {len(public)} of them public")
-sys.exit(exported - {"JNI_OnLoad"} != interface)
+initialisers = re.findall(r"_GLOBAL__sub_I_\S*", symbols())
+print("initialisers at load:", initialisers)
+sys.exit(exported - {"JNI_OnLoad"} != interface or bool(initialisers))
