@@ -62,7 +62,7 @@ void close_bits(PELOJ_JDINFO& jd, const BitReader& reader);
 // Fills by single bytes: stuffing, markers, the window's edge, the end. Returns the filled reader.
 BitReader fill_by_bytes(BitReader reader);
 
-// True when any byte of the word is 0xFF.
+// True when any byte of the word is 0xFF: the zero-byte test of A. Mycroft on the complement.
 constexpr bool has_ff(uint32_t word) { return ((~word - 0x01010101u) & word & 0x80808080u) != 0; }
 
 inline void BitReader::fill() {
