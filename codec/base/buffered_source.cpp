@@ -11,23 +11,24 @@ static_assert(sizeof(void*) != 4 ||
               (sizeof(PELOJ_SOURCE) == 24 && offsetof(PELOJ_SOURCE, consumed) == 4 &&
                offsetof(PELOJ_SOURCE, buffer) == 20));
 
-// A window at whose start unread bytes stand has no room left by these rules, even after a short read:
-// streams must deliver whole blocks while they have data.
 int PELOJ_CheckBuffer(PELOJ_SOURCE* source, int n) {
   if (source == nullptr || source->buffer == nullptr) return 0;
   if (int64_t{source->avail} >= n) return 2;
   if (int64_t{source->avail} + n > kSourceBufferSize) return 0;
 
-  const uint32_t room = source->avail == 0 ? kSourceBufferSize : source->pos;
   std::memmove(source->buffer, source->buffer + source->pos, source->avail);
   source->pos = 0;
-  if (room == 0) return 0;
-  const int count =
-      TAVIRPELO_Read_IO(source->io, source->buffer + source->avail, static_cast<int>(room));
-  if (count <= 0) return 0;
-  source->avail += static_cast<uint32_t>(count);
-  source->consumed += static_cast<uint32_t>(count);
-  return 1;
+  int result = 0;
+  while (int64_t{source->avail} < n) {
+    const uint32_t room = kSourceBufferSize - source->avail;
+    const int count =
+        TAVIRPELO_Read_IO(source->io, source->buffer + source->avail, static_cast<int>(room));
+    if (count <= 0) break;
+    source->avail += static_cast<uint32_t>(count);
+    source->consumed += static_cast<uint32_t>(count);
+    result = 1;
+  }
+  return result;
 }
 
 namespace pelo {
@@ -40,10 +41,8 @@ bool BufferedSource::open(TAVIRPELO_IO* io) {
 
 bool source_need(PELOJ_SOURCE& source, uint32_t n) {
   if (n > kSourceBufferSize) return false;
-  while (source.avail < n) {
-    if (PELOJ_CheckBuffer(&source, static_cast<int>(n)) == 0) return false;
-  }
-  return true;
+  return source.avail >= n ||
+         (PELOJ_CheckBuffer(&source, static_cast<int>(n)) != 0 && source.avail >= n);
 }
 
 bool source_skip(PELOJ_SOURCE& source, int64_t k) {

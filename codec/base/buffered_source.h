@@ -18,8 +18,9 @@ typedef struct PELOJ_SOURCE {
   uint8_t* buffer;    // 4096 bytes
 } PELOJ_SOURCE;
 
-// Makes n unread bytes available: 2 already there, 1 after a read that delivered at least one byte
-// (possibly fewer than n in all), 0 when the source has no more or n exceeds the buffer.
+// Makes n unread bytes available, in as many reads as the source needs for them: 2 already there, 1
+// after reads that delivered something (fewer than n in all when the source ends), 0 when it has no more
+// or n exceeds the buffer.
 TAVIRPELO_API int PELOJ_CheckBuffer(PELOJ_SOURCE* source, int n);
 
 namespace pelo {

@@ -13,7 +13,7 @@ class LsbBits {
   int count() const { return count_; }
 
   // Moves whole bytes of [next, end) into the queue: at least 56 bits are then there, or the range is
-  // used up.
+  // used up. The branchless refill of F. Giesen, "Reading bits in far too many ways" (variant 4).
   void fill(const uint8_t*& next, const uint8_t* end) {
     if (end - next >= 8) {
       // Of the last byte loaded only some bits may fit. They stay above count_ and are there already

@@ -14,7 +14,7 @@
 #include <cstdlib>
 #include <cstring>
 
-#include "codec/core/ground/os_memory.h"
+#include "codec/base/os_memory.h"
 #include "platform/fault_injection.h"
 #include "tavirpelo/io.h"
 

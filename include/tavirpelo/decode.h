@@ -99,8 +99,8 @@ TAVIRPELO_API void __elo_jpeg_dec_line_finish(struct PELOJ_JDINFO* state);
 
 /* Decodes into a buffer of reqWidth x reqHeight pixels of decInfo->outFormat, fitted and rotated by
  * decInfo->option. With TAVIRPELO_FIT_TIGHT the buffer holds exactly the produced picture. 1, or 0 with
- * gTAVIRPELO_Error 2 or 4 (or none) and a line in the log. Damaged or short baseline data keeps the rows
- * decoded so far and gives 1. */
+ * gTAVIRPELO_Error 2 or 4 (or none) and a line in the log. Damaged or short data gives 1 with what there is:
+ * the rows decoded so far, or of a picture in several scans all rows from the scans that came. */
 TAVIRPELO_API int TAVIRPELO_DecodeJPEG(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth,
                                        int reqHeight);
 

@@ -20,8 +20,8 @@ enum {
   TAVIRPELO_IO_STREAM = 4  /* a caller's stream behind three callbacks */
 };
 
-/* Delivers up to `length` bytes into `destination`; returns the number delivered, 0 at the end. A
- * stream must fill the request while it has data: a short read counts as the end of the data. */
+/* Delivers up to `length` bytes into `destination`; returns the number delivered. Any number above 0
+ * will do, however much was asked for: readers ask again for the rest. 0 or less ends the data. */
 typedef int (*TAVIRPELO_READFN)(void* context, void* destination, int length);
 /* Advances the stream by `count` bytes (`unused` is 0); returns the new position. */
 typedef int (*TAVIRPELO_SKIPFN)(void* context, int unused, int count);

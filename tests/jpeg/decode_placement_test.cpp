@@ -1,7 +1,7 @@
 // Formats, rotations, fittings and modes of a decode, against the upright RGB888 picture.
 #include "tests/support/exif_builder.h"
 #include "tests/support/guarded_decode.h"
-#include "tests/support/jpeg_samples.h"
+#include "tests/support/jpeg_segments.h"
 
 namespace tests {
 namespace {
@@ -150,6 +150,24 @@ TEST(Thumbnails, ServeSmallRequests) {
   EXPECT_TRUE(width == 64 && height == 48);
   EXPECT_EQ(0, PELOJ_DecodeThumbnail(open_memory(plain, 1).get(), out.data(), 64, 48, &width, &height));
   EXPECT_EQ(0, width + height);
+}
+
+// A failure leaves its reason, whatever the word held; a fallback that succeeds leaves none.
+TEST(Thumbnails, BrokenOnesGiveWayToTheMainPicture) {
+  ExifBuilder exif(false);
+  Bytes broken = frame(64, 48);  // too little to decode
+  broken.insert(broken.begin(), {0xFF, 0xD8});
+  append(broken, segment(0xDA, {1, 1, 0, 0, 63, 0}));
+  Bytes jpeg = exif.shorts(Ifd::k1, 259, {6}).thumbnail(broken).jpeg(sample_jpeg(400, 300));
+  Bytes out(64 * 48 * 3);
+  for (const uint32_t option : {TAVIRPELO_THUMBNAIL_IF_ENOUGH, TAVIRPELO_THUMBNAIL_ANY}) {
+    EXPECT_EQ(1, run(jpeg, 64, 48, 1, option).answer);
+    EXPECT_EQ(TAVIRPELO_ERROR_NONE, gTAVIRPELO_Error);
+  }
+  int width, height;
+  gTAVIRPELO_Error = TAVIRPELO_ERROR_MEMORY;
+  EXPECT_EQ(0, PELOJ_DecodeThumbnail(open_memory(jpeg, 1).get(), out.data(), 64, 48, &width, &height));
+  EXPECT_EQ(TAVIRPELO_ERROR_DECODE, gTAVIRPELO_Error);
 }
 
 TEST(RotateBuffer, RoundTrips) {

@@ -3,7 +3,7 @@
 #include "codec/formats/jpeg/decoder/idct.h"
 #include "codec/formats/jpeg/tables.h"
 #include "tests/support/guarded_decode.h"
-#include "tests/support/jpeg_samples.h"
+#include "tests/support/jpeg_segments.h"
 
 #ifdef TAVIR_HAVE_LIBJPEG
 namespace tests {
@@ -137,14 +137,100 @@ INSTANTIATE_TEST_SUITE_P(
                     Case{{131, 67}, kGrey, {131, 300}}, Case{{20, 20}, kRgb, {333, 21}},
                     Case{{150, 90}, k22, {98, 60}}, Case{{60, 40}, k21, {59, 40}}));
 
-// A luma plane in a scan of its own decodes first; the components that no scan delivered stay neutral.
-TEST(SeparateScans, ShowTheFirstWithNeutralColour) {
-  const JpegStyle s{.separateScans = true};
-  const Bytes jpeg = encode_libjpeg(70, 50, s);
+// However the same coefficients are spread over scans, they show the same picture at every scale; tables
+// defined anew between scans are those of the scans behind them.
+TEST(SeparateScans, ShowWhatOneScanShows) {
+  const JpegScans scans[] = {JpegScans::kSeparate, JpegScans::kLumaThenChroma, JpegScans::kChromaFirst};
+  for (JpegStyle s : {JpegStyle{.quality = 98},
+                      {.h = 1, .restartInterval = 3},
+                      {.h = 4, .v = 1, .optimise = true},
+                      {.quality = 97, .h = 1, .v = 1, .rgb = true, .optimise = true}}) {
+    const Bytes whole = encode_libjpeg(141, 93, s);
+    for (const JpegScans how : scans) {
+      s.scans = how;
+      const Bytes jpeg = encode_libjpeg(141, 93, s);
+      for (const int eighths : {8, 7, 4, 3, 2, 1}) {
+        for (const uint32_t option :
+             {TAVIRPELO_THUMBNAIL_NEVER | 0x700, TAVIRPELO_THUMBNAIL_NEVER | 0x300}) {
+          for (const int mode : {0, 1, 2}) {
+            const auto show = [&](Bytes bytes) {
+              const DecInfo info = open_memory(bytes, 1, option);
+              info->decMode = mode;
+              return decode(TAVIRPELO_DecodeJPEG, info.get(), 141 * eighths / 8, 70 * eighths / 8);
+            };
+            const Decode want = show(whole), got = show(jpeg);
+            ASSERT_TRUE(got.answer == 1 && want.pixels == got.pixels)
+                << static_cast<int>(how) << " " << eighths << " " << option << " " << mode;
+          }
+        }
+      }
+    }
+  }
+}
+
+// Between the luma scan and the others: scans of luma again, which are passed over, and in table 0 the
+// chroma quantisers, which the luma scan must not see. Without the others colour is neutral.
+TEST(SeparateScans, KeepTheTablesOfTheirTime) {
+  const JpegStyle s{.quality = 98, .scans = JpegScans::kSeparate};
+  const Bytes jpeg = encode_libjpeg(60, 50, s);
+  const size_t luma = find_marker(jpeg, 0xDB), frame = find_marker(jpeg, 0xC0);
+  const size_t first = find_marker(jpeg, 0xDA), data = first + 10;
+  const Bytes scan = prefix(suffix(jpeg, first), data - first);
+  const auto second = static_cast<size_t>(std::search(jpeg.begin() + static_cast<ptrdiff_t>(data),
+                                                      jpeg.end(), scan.begin(), scan.begin() + 2) -
+                                          jpeg.begin());
+  Bytes chroma = prefix(suffix(jpeg, luma + 69), 69);
+  chroma[4] = 0;
+  Bytes late = prefix(jpeg, second);
+  for (const size_t component : {1, 2}) late[frame + 12 + 3 * component] = 0;
+  for (int i = 0; i < 40; ++i) append(late, scan);
+  append(late, chroma);
+  append(late, suffix(jpeg, second));
+  for (const int mode : {0, 1}) {
+    const auto show = [&](Bytes bytes) {
+      const DecInfo info = open_memory(bytes, 1, TAVIRPELO_THUMBNAIL_NEVER);
+      info->decMode = mode;
+      return decode(TAVIRPELO_DecodeJPEG, info.get(), 60, 50).pixels;
+    };
+    EXPECT_TRUE(show(jpeg) == show(late)) << mode;
+  }
   std::vector<Plane> planes = read_coefficients(jpeg);
   for (size_t i = 1; i < 3; ++i)
     std::fill(planes[i].coefficients.begin(), planes[i].coefficients.end(), int16_t{0});
-  EXPECT_TRUE(run(jpeg, 70, 50) == reference(same({70, 50}, s), planes, false));
+  EXPECT_TRUE(run(prefix(jpeg, second), 60, 50) == reference(same({60, 50}, s), planes, true));
+}
+
+// True for a part of a JPEG that ends in entropy-coded data; libjpeg gives up inside a header.
+bool ends_in_data(const Bytes& cut) {
+  for (size_t at = cut.size() - 2; at > 0; --at) {
+    const uint8_t code = cut[at + 1];
+    if (cut[at] != 0xFF || code == 0 || code == 0xFF || (code >= 0xD0 && code <= 0xD7)) continue;
+    return code == 0xDA && at + 14 < cut.size();
+  }
+  return false;
+}
+
+// Behind the end of the data bits are zeros: all that came before is shown. In the MCU where they begin
+// libjpeg may also store what overruns its band.
+TEST(CutScans, ShowWhatTheyHave) {
+  for (const JpegStyle& s : {JpegStyle{.progressive = true},
+                             {.restartInterval = 2, .progressive = true},
+                             {.restartInterval = 3, .scans = JpegScans::kLumaThenChroma}}) {
+    const Bytes jpeg = encode_libjpeg(121, 103, s);
+    int compared = 0;
+    const auto compare = [&](const Bytes& cut) {
+      const Decode got = decode(TAVIRPELO_DecodeJPEG, cut, 121, 103, 1, TAVIRPELO_THUMBNAIL_NEVER);
+      ASSERT_EQ(1, got.answer) << cut.size();
+      if (!ends_in_data(cut)) return;
+      ++compared;
+      const Bytes want = reference(same({121, 103}, s), read_coefficients(cut), false);
+      size_t differing = 0;
+      for (size_t i = 0; i < want.size(); ++i) differing += got.pixels[i] != want[i];
+      ASSERT_LE(differing, 16u * 16 * 3) << cut.size();
+    };
+    every_truncation(jpeg, compare, find_marker(jpeg, 0xDA) + 15, 41);
+    EXPECT_GT(compared, 100);
+  }
 }
 
 // Reduced scales stay close to libjpeg's own at the same scale (which keeps more of subsampled chroma).

@@ -51,14 +51,18 @@ Bytes encode_own(int width, int height, int quality, bool grey) {
 #ifdef TAVIR_HAVE_LIBJPEG
 namespace {
 
-// Each component in a scan of its own.
-const jpeg_scan_info kSeparate[3] = {
-    {1, {0, 0, 0, 0}, 0, 63, 0, 0}, {1, {1, 0, 0, 0}, 0, 63, 0, 0}, {1, {2, 0, 0, 0}, 0, 63, 0, 0}};
+// Scan scripts, by JpegScans.
+const std::vector<jpeg_scan_info> kScans[] = {
+    {},
+    {{1, {0}, 0, 63, 0, 0}, {1, {1}, 0, 63, 0, 0}, {1, {2}, 0, 63, 0, 0}},
+    {{1, {0}, 0, 63, 0, 0}, {2, {1, 2}, 0, 63, 0, 0}},
+    {{1, {2}, 0, 63, 0, 0}, {2, {0, 1}, 0, 63, 0, 0}}};
 
 // A JPEG whose header libjpeg has read.
 struct Decompressor : jpeg_decompress_struct {
   explicit Decompressor(const Bytes& jpeg) {
     err = jpeg_std_error(&errors);
+    errors.output_message = [](j_common_ptr) {};  // of cut data
     jpeg_create_decompress(this);
     jpeg_mem_src(this, jpeg.data(), static_cast<unsigned long>(jpeg.size()));
     jpeg_read_header(this, TRUE);
@@ -93,9 +97,9 @@ Bytes encode_libjpeg(int width, int height, const JpegStyle& style) {
   c.restart_interval = static_cast<unsigned>(style.restartInterval);
   c.optimize_coding = style.optimise ? TRUE : FALSE;
   if (style.progressive) jpeg_simple_progression(&c);
-  if (style.separateScans) {
-    c.scan_info = kSeparate;
-    c.num_scans = 3;
+  if (const auto& scans = kScans[static_cast<size_t>(style.scans)]; !scans.empty()) {
+    c.scan_info = scans.data();
+    c.num_scans = static_cast<int>(scans.size());
   }
   jpeg_start_compress(&c, TRUE);
   Bytes pixels = sample_pixels(width, height);
@@ -132,7 +136,8 @@ std::vector<Plane> read_coefficients(const Bytes& jpeg) {
   std::vector<Plane> planes;
   for (int c = 0; c < d.num_components; ++c) {
     const jpeg_component_info& info = d.comp_info[c];
-    const uint16_t* quant = info.quant_table->quantval;
+    // A component whose scan is cut off has not taken its table.
+    const uint16_t* quant = d.quant_tbl_ptrs[info.quant_tbl_no]->quantval;
     Plane plane{info.h_samp_factor,
                 info.v_samp_factor,
                 static_cast<int>(info.width_in_blocks),

@@ -27,13 +27,16 @@ Bytes encode_own(int width, int height, int quality, bool grey = false);
 Bytes sample_jpeg(int width, int height, bool grey = false);
 
 #ifdef TAVIR_HAVE_LIBJPEG
+// How a sequential picture's components come.
+enum class JpegScans { kInterleaved, kSeparate, kLumaThenChroma, kChromaFirst };
+
 struct JpegStyle {
   int quality = 90;
   int components = 3;       // 1: grey
   int h = 2, v = 2;         // luma sampling factors; chroma 1 x 1
   int restartInterval = 0;  // MCUs
   bool rgb = false;         // colour space RGB instead of YCbCr
-  bool separateScans = false;
+  JpegScans scans = JpegScans::kInterleaved;
   bool optimise = false;
   bool progressive = false;
 };

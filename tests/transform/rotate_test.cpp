@@ -184,8 +184,10 @@ TEST(Rotate, MovesWhatJpegtranMoves) {
 }
 
 TEST(Rotate, RefusesWhatItCannotMove) {
-  for (const JpegStyle& style :
-       {JpegStyle{.progressive = true}, {.rgb = true}, {.separateScans = true}, {.h = 4, .v = 1}}) {
+  for (const JpegStyle& style : {JpegStyle{.progressive = true},
+                                 {.rgb = true},
+                                 {.scans = JpegScans::kSeparate},
+                                 {.h = 4, .v = 1}}) {
     EXPECT_EQ(0, turn(encode_libjpeg(64, 64, style), {64, 64}, 90, 0).answer);
   }
 }

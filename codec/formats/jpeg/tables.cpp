@@ -1,6 +1,6 @@
 #include "codec/formats/jpeg/tables.h"
 
-const uint8_t PELOJ_NATURAL_ORDER[80] = {
+constexpr uint8_t PELOJ_NATURAL_ORDER[80] = {
     0,  1,  8,  16, 9,  2,  3,  10, 17, 24, 32, 25, 18, 11, 4,  5,   //
     12, 19, 26, 33, 40, 48, 41, 34, 27, 20, 13, 6,  7,  14, 21, 28,  //
     35, 42, 49, 56, 57, 50, 43, 36, 29, 22, 15, 23, 30, 37, 44, 51,  //
@@ -83,6 +83,17 @@ constexpr uint8_t kAcChrominanceSymbols[162] = {
     0xD2, 0xD3, 0xD4, 0xD5, 0xD6, 0xD7, 0xD8, 0xD9, 0xDA, 0xE2, 0xE3, 0xE4, 0xE5, 0xE6, 0xE7,
     0xE8, 0xE9, 0xEA, 0xF2, 0xF3, 0xF4, 0xF5, 0xF6, 0xF7, 0xF8, 0xF9, 0xFA};
 
+constexpr ZigzagBits zigzag_bits() {
+  ZigzagBits table{};
+  for (uint32_t k = 0; k < 64; ++k) {
+    const uint32_t natural = PELOJ_NATURAL_ORDER[k];
+    for (uint32_t set = 0; set < 16; ++set) {
+      if ((set >> (natural % 4) & 1) != 0) table[natural / 4][set] |= uint64_t{1} << k;
+    }
+  }
+  return table;
+}
+
 constexpr auto kAan = outer_product(kAanFactor);
 constexpr auto kFour = outer_product(kFourPointFactor);
 static_assert(kAan[1] == 22725 && kAan[7] == 4520 && kAan[9] == 31521);
@@ -92,6 +103,8 @@ static_assert(kFour[1] == 20995 && kFour[3] == 17799 && kFour[9] == 26905 && kFo
 
 const std::array<uint16_t, 64> kAanScale = kAan;
 const std::array<uint16_t, 64> kFourPointScale = kFour;
+
+constexpr ZigzagBits kZigzagBits = zigzag_bits();
 
 const std::array<uint8_t, 64> kLuminanceQuant = {
     16, 11, 10, 16, 24,  40,  51,  61,  12, 12, 14, 19, 26,  58,  60,  55,   //

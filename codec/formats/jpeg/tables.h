@@ -7,14 +7,19 @@
 
 #include "tavirpelo/api.h"
 
-// Zig-zag position to natural (row-major) position, T.81 Figure A.6; the 16 entries behind the 64 keep a
-// run past the end of a block inside it.
+// The zig-zag sequence (T.81 Figure A.6) as places in a row-major block. A corrupt run can lead 16 places
+// beyond it: these are the last one again.
 TAVIRPELO_API const uint8_t PELOJ_NATURAL_ORDER[80];
 
 // EXTEND thresholds (T.81 F.12): 0 for size 0, 2^(s-1) for s = 1..15.
 TAVIRPELO_API const int32_t PELOJ_HUFF_EXTEND_TEST[16];
 
 namespace pelo::jpeg {
+
+// Zig-zag positions, one bit each, of the coefficients that the nibble i of a row-major block names: bit b
+// of the nibble stands for place 4 i + b.
+using ZigzagBits = std::array<std::array<uint64_t, 16>, 16>;
+extern const ZigzagBits kZigzagBits;
 
 // AAN scale factors with 14 fraction bits, natural order: round(16384 f(r) f(c)), f(0) = 1,
 // f(k) = sqrt(2) cos(k pi / 16).

@@ -1,6 +1,7 @@
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 
 #include "codec/formats/jpeg/decoder/jd_info.h"
+#include "codec/formats/jpeg/marker_codes.h"
 
 namespace pelo::jpeg {
 namespace {
@@ -20,14 +21,15 @@ int next_byte(BitReader& reader) {
 
 // The next data byte without its stuffing; -1 at a marker, which becomes the unread one, or at the end.
 int next_data_byte(BitReader& reader) {
-  const int byte = next_byte(reader);
-  if (byte != 0xFF) return byte;
-  int code;
-  do {
-    code = next_byte(reader);
-  } while (code == 0xFF);
+  int code = next_byte(reader);
+  if (code >= 0 && code != 0xFF) return code;
+  while (code == 0xFF) code = next_byte(reader);
   if (code == 0) return 0xFF;
-  if (code > 0) reader.jd->unreadMarker = static_cast<uint8_t>(code);
+  if (code > 0) {
+    reader.jd->unreadMarker = static_cast<uint8_t>(code);
+  } else {
+    meet_end(*reader.jd);
+  }
   return -1;
 }
 
@@ -53,6 +55,10 @@ uint32_t match_code(BitReader& reader, const DerivedTable& table, int length) {
 }
 
 }  // namespace
+
+void meet_end(PELOJ_JDINFO& jd) {
+  if (jd.endIsMarker) jd.unreadMarker = static_cast<uint8_t>(Marker::kEoi);
+}
 
 BitReader fill_by_bytes(BitReader reader) {
   BitState& state = reader.state;

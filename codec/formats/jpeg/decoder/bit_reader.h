@@ -52,6 +52,9 @@ inline int32_t extend(uint32_t v, int s) {
   return value - ((value - low) >> 31 & (2 * low - 1));
 }
 
+// The source has ended: for a picture in several scans, as if an EOI had been met.
+void meet_end(PELOJ_JDINFO& jd);
+
 // Takes the reader's window from the decoder's source, and gives it back.
 BitReader open_bits(PELOJ_JDINFO& jd);
 void close_bits(PELOJ_JDINFO& jd, const BitReader& reader);
@@ -59,7 +62,7 @@ void close_bits(PELOJ_JDINFO& jd, const BitReader& reader);
 // Fills by single bytes: stuffing, markers, the window's edge, the end. Returns the filled reader.
 BitReader fill_by_bytes(BitReader reader);
 
-// True when any byte of the word is 0xFF.
+// True when any byte of the word is 0xFF: the zero-byte test of A. Mycroft on the complement.
 constexpr bool has_ff(uint32_t word) { return ((~word - 0x01010101u) & word & 0x80808080u) != 0; }
 
 inline void BitReader::fill() {

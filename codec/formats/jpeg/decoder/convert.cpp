@@ -128,7 +128,7 @@ void convert_enlarging(PELOJ_JDINFO& jd, int rows) {
   jd.inputRow += rows;
 }
 
-// Centre points: the row is written once for each output row whose centre falls into it.
+// Centre points. A row may be none's centre, or that of several rows of an enlarged picture.
 template <auto WriteRow>
 void convert_picking(PELOJ_JDINFO& jd, int rows) {
   for (int i = 0; i < rows; ++i, ++jd.inputRow) {

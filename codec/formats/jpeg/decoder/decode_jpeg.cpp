@@ -84,6 +84,8 @@ bool decode(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const Request& req
       if (decode_at(decInfo, source, thumbnail.offset, thumbnail.width, thumbnail.height, request)) {
         return true;
       }
+      // What the thumbnail failed of says nothing about the main picture.
+      gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
     }
   }
   return decode_at(decInfo, source, 0, width, height, request);

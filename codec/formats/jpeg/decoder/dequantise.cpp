@@ -1,5 +1,7 @@
 #include "codec/formats/jpeg/decoder/dequantise.h"
 
+#include "codec/jpeg/decoder/scan_list.h"
+
 namespace pelo::jpeg {
 namespace {
 
@@ -7,10 +9,6 @@ namespace {
 int32_t reference_step(const Component& component, size_t position) {
   const auto& table = component.index == 0 ? kLuminanceQuant : kChrominanceQuant;
   return (table[position] * 30 + 50) / 100;
-}
-
-const QuantTable* quant_table(const PELOJ_JDINFO& jd, const Component& component) {
-  return component.quantTable < 4 ? jd.quant[component.quantTable].get() : nullptr;
 }
 
 // Some AC step of the first component is less than half of the reference's.
@@ -44,19 +42,32 @@ void set_requantising(QuantTable& table, Component& component) {
 
 }  // namespace
 
+QuantTable* quant_table(const PELOJ_JDINFO& jd, const Component& component) {
+  if (component.table != nullptr) return component.table;
+  return component.quantTable < 4 ? jd.quant[component.quantTable].get() : nullptr;
+}
+
 bool prepare_multipliers(PELOJ_JDINFO& jd) {
-  for (int c = 0; c < jd.componentCount; ++c) {
-    if (quant_table(jd, (*jd.components)[static_cast<size_t>(c)]) == nullptr) return false;
+  const bool sequential = !is_progressive(jd);
+  for (int i = 0; sequential && i < jd.scanComponentCount; ++i) {
+    Component& component = *jd.scan[static_cast<size_t>(i)];
+    component.table = quant_table(jd, component);
   }
-  const Component& first = (*jd.components)[0];
-  jd.requantise = jd.decMode == 1 && much_finer_than_reference(*quant_table(jd, first), first);
-  const bool requantise =
-      jd.requantise && jd.scale == kFull && jd.marker->frameType == FrameType::kBaseline;
-  for (int c = 0; c < jd.componentCount; ++c) {
-    Component& component = (*jd.components)[static_cast<size_t>(c)];
-    QuantTable& table = *jd.quant[component.quantTable];
-    set_multipliers(jd, table, component);
-    if (requantise) set_requantising(table, component);
+  std::array<QuantTable*, kMaxComponents> tables{};
+  for (size_t c = 0; c < static_cast<size_t>(jd.componentCount); ++c) {
+    const Component& component = (*jd.components)[c];
+    // Tables of sequential components may still come, in front of their scans.
+    tables[c] = sequential ? component.table : quant_table(jd, component);
+    if (tables[c] == nullptr && !sequential) return false;
+  }
+  jd.requantise = jd.decMode == 1 && tables[0] != nullptr &&
+                  much_finer_than_reference(*tables[0], (*jd.components)[0]);
+  const bool requantise = jd.requantise && jd.scale == kFull && sequential;
+  for (size_t c = 0; c < static_cast<size_t>(jd.componentCount); ++c) {
+    if (tables[c] == nullptr) continue;
+    Component& component = (*jd.components)[c];
+    set_multipliers(jd, *tables[c], component);
+    if (requantise) set_requantising(*tables[c], component);
   }
   return true;
 }

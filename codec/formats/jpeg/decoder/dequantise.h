@@ -5,8 +5,12 @@
 
 namespace pelo::jpeg {
 
-// Sets the requantisation flag (decode mode 1 only) and every component's multipliers. False when a
-// component's quantisation table is missing.
+// The component's table: in sequential pictures that of its scan, in progressive ones the latest. Null
+// for none.
+QuantTable* quant_table(const PELOJ_JDINFO& jd, const Component& component);
+
+// Sets the requantisation flag (decode mode 1 only) and the multipliers of the scans so far. False when
+// a quantisation table is missing.
 [[nodiscard]] bool prepare_multipliers(PELOJ_JDINFO& jd);
 
 }  // namespace pelo::jpeg

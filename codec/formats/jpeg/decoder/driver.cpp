@@ -5,6 +5,7 @@
 #include "codec/formats/jpeg/decoder/markers.h"
 #include "codec/formats/jpeg/decoder/progressive.h"
 #include "codec/formats/jpeg/decoder/row_process.h"
+#include "codec/formats/jpeg/decoder/scan_list.h"
 #include "codec/formats/jpeg/decoder/scan_setup.h"
 #include "codec/formats/jpeg/decoder/upsample.h"
 #include "codec/formats/jpeg/header_scan.h"
@@ -69,6 +70,20 @@ bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
   return true;
 }
 
+// A decoder ready for its first row; empty with the reason in `error`.
+Decoder start(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST& request, int& error) {
+  Decoder decoder = os_new<PELOJ_JDINFO>();
+  if (!decoder) {
+    error = TAVIRPELO_ERROR_MEMORY;
+    log_error("PELOJ_Initialize : malloc fail");
+    return nullptr;
+  }
+  take_wishes(*decoder, decInfo, source, request);
+  if (initialize(*decoder, request)) return decoder;
+  error = TAVIRPELO_ERROR_DECODE;
+  return nullptr;
+}
+
 // Passes the rows above the wanted part; false when the picture ends there.
 bool skip_rows(PELOJ_JDINFO& jd) {
   const RowFunction process = row_function(jd);
@@ -85,18 +100,16 @@ bool skip_rows(PELOJ_JDINFO& jd) {
   return true;
 }
 
-// From one pass over the data. Damage ends the picture, it does not fail.
-int decode_in_order(PELOJ_JDINFO& jd) {
+// From one pass over the data, or from all scans row by row. Damage ends a picture, or coarsens it; it
+// does not fail.
+int decode_rows(PELOJ_JDINFO& jd) {
+  if (needs_all_scans(jd)) {
+    // A scan that is cut must not hide what the others have of its rows.
+    jd.endIsMarker = 1;
+    if (list_scans(jd) != PELOJ_OK) return PELOJ_FAIL;
+  }
   if (!skip_rows(jd)) return 0;
-  show_rows(jd);
-  return PELOJ_OK;
-}
-
-// From all scans, row by row.
-int decode_scans(PELOJ_JDINFO& jd) {
-  if (list_scans(jd) != PELOJ_OK) return PELOJ_FAIL;
-  if (!skip_rows(jd)) return 0;
-  if (show_rows(jd) != PELOJ_FAIL) return PELOJ_OK;
+  if (show_rows(jd) != PELOJ_FAIL || !stores_coefficients(jd)) return PELOJ_OK;
   gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
   log_error(jd.scale == kFull ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
                               : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");
@@ -140,27 +153,20 @@ int PELOJ_StartDecompression(PELOJ_JDINFO* jdInfo) {
 }
 
 PELOJ_JDINFO* PELOJ_Initialize(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
-  Decoder decoder = os_new<PELOJ_JDINFO>();
-  if (!decoder) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_MEMORY;
-    log_error("PELOJ_Initialize : malloc fail");
-    return nullptr;
-  }
-  take_wishes(*decoder, *decInfo, source, *request);
-  return initialize(*decoder, *request) ? decoder.release() : nullptr;
+  int error = TAVIRPELO_ERROR_NONE;
+  Decoder decoder = start(*decInfo, source, *request, error);
+  if (error == TAVIRPELO_ERROR_MEMORY) gTAVIRPELO_Error = error;
+  return decoder.release();
 }
 
 int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
-  const Decoder decoder(PELOJ_Initialize(decInfo, source, request));
-  if (!decoder) {
-    if (gTAVIRPELO_Error != TAVIRPELO_ERROR_MEMORY) gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
+  int error = TAVIRPELO_ERROR_DECODE;
+  const Decoder decoder = start(*decInfo, source, *request, error);
+  if (!decoder || !first_scan_suffices(*decoder)) {
+    gTAVIRPELO_Error = error;
     return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
   }
-  if (!first_scan_suffices(*decoder)) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
-    return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
-  }
-  return needs_all_scans(*decoder) ? decode_scans(*decoder) : decode_in_order(*decoder);
+  return decode_rows(*decoder);
 }
 
 int PELOJ_ValorenDecodeFrame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, void* outBuffer,

@@ -73,11 +73,10 @@ uint32_t skip_entry(const DerivedTable& table, uint32_t v) {
   return advance << 16 | used;
 }
 
-bool build_skip_table(PELOJ_JDINFO& jd, size_t number, const DerivedTable& table) {
-  if (jd.skipTables[number]) return true;
-  jd.skipTables[number] = os_new<SkipTable>();
-  if (!jd.skipTables[number]) return false;
-  for (uint32_t v = 0; v < kSkipSize; ++v) (*jd.skipTables[number])[v] = skip_entry(table, v);
+bool build_skip_table(DerivedTable& table) {
+  table.skip = os_new<SkipTable>();
+  if (!table.skip) return false;
+  for (uint32_t v = 0; v < kSkipSize; ++v) (*table.skip)[v] = skip_entry(table, v);
   return true;
 }
 
@@ -108,8 +107,8 @@ int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
   } else {
     fill_coefficients(*table);
     if (jdInfo->marker->frameType == FrameType::kBaseline && jdInfo->scale != kFull) {
-      if (!build_skip_table(*jdInfo, number, *table)) return PELOJ_FAIL;
-      entropy->skip[number] = jdInfo->skipTables[number].get();
+      if (!build_skip_table(*table)) return PELOJ_FAIL;
+      entropy->skip[number] = table->skip.get();
     }
   }
   *derivedOut = table.get();

@@ -5,6 +5,7 @@
 #include <array>
 #include <cstdint>
 
+#include "codec/base/os_memory.h"
 #include "codec/formats/jpeg/tables.h"
 
 typedef struct PELOJ_JDINFO PELOJ_JDINFO;
@@ -16,18 +17,6 @@ namespace pelo::jpeg {
 constexpr int kLookBits = 10;
 constexpr uint32_t kLookSize = 1u << kLookBits;
 constexpr int kMaxCodeLength = 16;
-
-struct DerivedTable {
-  std::array<int32_t, kMaxCodeLength + 2> maxcode;    // largest code of each length, -1 for none;
-                                                      // entry 17 ends every search
-  std::array<int32_t, kMaxCodeLength + 1> valoffset;  // index of a length's first symbol - its code
-  const HuffmanSpec* raw;
-  // By the next kLookBits bits: code length << 8 | symbol, or 0 for a longer code.
-  std::array<uint16_t, kLookSize> lookup;
-  // AC tables, by the next kLookBits bits, when a code and its extra bits fit in them:
-  // value << 16 | run << 8 | bits used; 0 otherwise. The value is sign-extended (T.81 F.12).
-  std::array<int32_t, kLookSize> coefficient;
-};
 
 // By the next kSkipBits bits: how far the complete AC codes in them move the position. Wider than a look
 // at single codes: the wait for one entry passes several of them.
@@ -42,14 +31,26 @@ constexpr uint32_t kSkipEndOfBlock = 1u << 23;
 constexpr uint32_t skip_used(uint32_t entry) { return entry & 0xFFFF; }
 constexpr int skip_advance(uint32_t entry) { return static_cast<int>(entry >> 16 & 0x7F); }
 
+struct DerivedTable {
+  std::array<int32_t, kMaxCodeLength + 2> maxcode;    // largest code of each length, -1 for none;
+                                                      // entry 17 ends every search
+  std::array<int32_t, kMaxCodeLength + 1> valoffset;  // index of a length's first symbol - its code
+  const HuffmanSpec* raw;
+  // By the next kLookBits bits: code length << 8 | symbol, or 0 for a longer code.
+  std::array<uint16_t, kLookSize> lookup;
+  // AC tables, by the next kLookBits bits, when a code and its extra bits fit in them:
+  // value << 16 | run << 8 | bits used; 0 otherwise. The value is sign-extended (T.81 F.12).
+  std::array<int32_t, kLookSize> coefficient;
+  OsPtr<SkipTable> skip;  // AC tables of sequential pictures at reduced scales
+};
+
 struct EntropyState;
 
 }  // namespace pelo::jpeg
 
-// Derives the table of a class and number into the next pool slot and stores it in *derivedOut; for an
-// AC table of a baseline image at a reduced scale its skip table as well (in `entropy`). 200; 201 without
-// a raw table or memory; 0 for a bad table: more than 256 codes, a code that does not fit its length, a
-// DC symbol above 15.
+// Makes the table of a class and number ready for a scan. It lives in the state's pool and goes to
+// *derivedOut, its skip table, where it has one, to `entropy`. 200; 201 when there is nothing to derive
+// from or memory is short; 0 when no encoder can have meant the table (T.81 C.2, F.1.2.1.1).
 TAVIRPELO_API int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
                                           const pelo::jpeg::DerivedTable** derivedOut,
                                           pelo::jpeg::EntropyState* entropy);

@@ -69,20 +69,40 @@ void transform_mcu(PELOJ_JDINFO& jd, int mcu, int blockRow) {
 
 using DecodeMcu = int (*)(PELOJ_JDINFO*, int32_t* const*);
 
+// The current scan's part of the iMCU row; false when its data fails.
 template <class Size>
-int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
+bool decode_scan_row(PELOJ_JDINFO& jd, DecodeMcu decode) {
   const auto used = static_cast<size_t>(jd.mcuBlocks) * 64 * sizeof(int32_t);
   for (int blockRow = 0; blockRow < jd.mcuRowsPerImcu; ++blockRow) {
     for (int mcu = 0; mcu < jd.mcusPerRow; ++mcu) {
       TAVIRPELO_OsMemset(jd.coefficients.data(), 0, used);
       jd.lastPosition = {};
-      if (!decode(&jd, jd.blocks.data())) {
-        if (jd.usedHeight - jd.rowsDone < 16) return PELOJ_IMAGE_DONE;
-        log_error(failure);
-        return PELOJ_ROW_FAIL;
-      }
+      if (!decode(&jd, jd.blocks.data())) return false;
       transform_mcu<Size>(jd, mcu, blockRow);
     }
+  }
+  return true;
+}
+
+// The same of every listed scan.
+template <class Size>
+bool decode_scan_rows(PELOJ_JDINFO& jd, DecodeMcu decode) {
+  for (size_t i = 0; i < jd.scanCount; ++i) {
+    ScanRecord* record = jd.scans[i].get();
+    if (!PELOJ_LoadScanInfo(&jd, record) || !decode_scan_row<Size>(jd, decode)) return false;
+    PELOJ_SaveScanInfo(&jd, record);
+  }
+  return true;
+}
+
+template <class Size>
+int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
+  const bool decoded =
+      jd.scanCount > 0 ? decode_scan_rows<Size>(jd, decode) : decode_scan_row<Size>(jd, decode);
+  if (!decoded) {
+    if (jd.usedHeight - jd.rowsDone < 16) return PELOJ_IMAGE_DONE;
+    log_error(failure);
+    return PELOJ_ROW_FAIL;
   }
   if (++jd.imcuRow >= jd.imcuRows) return PELOJ_IMAGE_DONE;
   PELOJ_SetupiMcu(&jd);
@@ -113,7 +133,7 @@ int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo) {
                                         "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_4to1 fail");
   }
   // A progressive picture's first scan is all that an eighth of its size needs.
-  const bool progressive = jdInfo->marker->frameType == FrameType::kProgressive;
-  return decode_imcu_row<EighthSize>(*jdInfo, progressive ? PELOJ_ProgDecodeMcu : PELOJ_DecodeMcu8to1,
+  return decode_imcu_row<EighthSize>(*jdInfo,
+                                     is_progressive(*jdInfo) ? PELOJ_ProgDecodeMcu : PELOJ_DecodeMcu8to1,
                                      "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu8to1 fail");
 }

@@ -52,6 +52,7 @@ struct Component {
   int lastColumnWidth, lastRowHeight;       // blocks of the last MCU inside the picture
   uint8_t hExpand, vExpand;                 // replication to the full grid
   void (*upsample)(PELOJ_JDINFO*, Component*, uint8_t**, uint8_t***);
+  QuantTable* table;      // sequential: the one that its scan found
   std::array<int32_t, 64> multiplier;       // dequantisation, natural order
   SampleRows samples;     // one iMCU row
   SampleRows colour;      // replicated rows; empty when the samples are used as they are
@@ -88,7 +89,7 @@ struct Scale {
 };
 constexpr Scale kFull{1, 0}, kHalf{1, 1}, kThreeEighths{3, 3}, kQuarter{1, 2}, kEighth{1, 3};
 
-// A scan of a progressive picture between visits: its header, and where its decoding stands.
+// A scan between visits: its header, and where its decoding stands.
 constexpr size_t kMaxScans = 30;
 struct ScanRecord {
   int componentCount;
@@ -126,13 +127,15 @@ struct PELOJ_JDINFO {
   int restartInterval;    // MCUs; 0: none
   pelo::OsPtr<pelo::jpeg::MarkerRecord> marker;
   std::array<pelo::OsPtr<pelo::jpeg::QuantTable>, 4> quant;
+  // Replaced between scans, but still some component's.
+  std::array<pelo::OsPtr<pelo::jpeg::QuantTable>, pelo::jpeg::kMaxComponents> replacedQuant;
+  size_t replacedCount;
   std::array<const pelo::jpeg::HuffmanSpec*, 4> dcRaw, acRaw;
   // Every DHT definition keeps its slot: derived tables of earlier scans point into it.
   std::array<pelo::OsPtr<pelo::jpeg::HuffmanSpec>, pelo::jpeg::kTablePoolSize> rawPool;
   size_t rawCount;
   std::array<pelo::OsPtr<pelo::jpeg::DerivedTable>, pelo::jpeg::kTablePoolSize> derivedPool;
   size_t derivedCount;
-  std::array<pelo::OsPtr<pelo::jpeg::SkipTable>, 4> skipTables;
   pelo::OsPtr<std::array<pelo::jpeg::Component, pelo::jpeg::kMaxComponents>> components;
   int scanComponentCount;
   std::array<pelo::jpeg::Component*, pelo::jpeg::kMaxComponents> scan;
@@ -149,9 +152,10 @@ struct PELOJ_JDINFO {
   std::array<int32_t*, pelo::jpeg::kMaxMcuBlocks> blocks;
   int requantise;         // AC coefficients are brought to the reference steps while decoding
 
-  // Progressive pictures.
+  // Pictures in several scans.
   std::array<pelo::OsPtr<pelo::jpeg::ScanRecord>, pelo::jpeg::kMaxScans> scans;
-  size_t scanCount;
+  size_t scanCount;       // 0 while the header's scan alone is read
+  int endIsMarker;        // the source's end counts as EOI; otherwise decoding fails there
   uint32_t eobRun;        // blocks that an end-of-band code still covers (T.81 G.1.2.2)
   std::array<pelo::OsBuffer<int32_t>, pelo::jpeg::kMaxComponents> rowCoefficients;  // one iMCU row
 

@@ -80,6 +80,16 @@ bool read_huffman_tables(PELOJ_JDINFO& jd) {
   return true;
 }
 
+// Puts a table in its place. The one before it stays while a component that is still to be shown has it.
+void replace_quant_table(PELOJ_JDINFO& jd, OsPtr<QuantTable> table, size_t number) {
+  OsPtr<QuantTable>& place = jd.quant[number];
+  for (int c = 0; c < jd.componentCount; ++c) {
+    if (place && (*jd.components)[static_cast<size_t>(c)].table == place.get())
+      jd.replacedQuant[jd.replacedCount++] = std::move(place);
+  }
+  place = std::move(table);
+}
+
 // DQT (T.81 B.2.4.1), 8-bit tables.
 bool read_quant_tables(PELOJ_JDINFO& jd) {
   uint32_t left;
@@ -90,7 +100,7 @@ bool read_quant_tables(PELOJ_JDINFO& jd) {
     auto table = os_new<QuantTable>();
     if (!table) return false;
     for (size_t i = 0; i < 64; ++i) table->value[PELOJ_NATURAL_ORDER[i]] = bytes[1 + i];
-    jd.quant[bytes[0]] = std::move(table);
+    replace_quant_table(jd, std::move(table), bytes[0]);
     left -= 65;
   }
   jd.marker->sawDqt = 1;

@@ -4,10 +4,9 @@
 
 #include "codec/formats/jpeg/decoder/jd_info.h"
 
-// Finds SOI, reads up to the first scan header and settles the colour space. 200, or 201 with the
-// state's allocations released.
+// The headers of a picture: frame, tables, first scan, colour space. 200, or 201 with the state emptied.
 TAVIRPELO_API int PELOJ_ParseHeader(PELOJ_JDINFO* jdInfo, int unused);
 
-// Reads markers up to and including the next SOS. Returns the last marker code; *status is 200 when a
-// scan header was accepted, else 201.
+// Goes on to where the next scan's data begin. *status tells whether there are any (200) or the picture has
+// no further scan, or none that can be decoded (201); the answer is the marker that decided it.
 TAVIRPELO_API int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status);

@@ -1,5 +1,6 @@
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
 
+#include "codec/formats/jpeg/decoder/dequantise.h"
 #include "codec/formats/jpeg/decoder/mcu_steps.h"
 
 namespace pelo::jpeg {
@@ -114,7 +115,7 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
 
     BlockContext context{*entropy.blockAc[i], entropy.blockSkip[i], nullptr, jd.se};
     if constexpr (Member::kRequantise) {
-      context.correction = jd.quant[jd.scan[scanIndex]->quantTable]->correction.data();
+      context.correction = quant_table(jd, *jd.scan[scanIndex])->correction.data();
     }
     int last = 0;
     int k = jd.ss + 1;

@@ -10,12 +10,6 @@
 namespace pelo::jpeg {
 namespace {
 
-int fail(int error, const char* text) {
-  gTAVIRPELO_Error = error;
-  log_error(text);
-  return PELOJ_FAIL;
-}
-
 // Blocks of a component in one row of the coefficient store: whole MCUs of the frame, whatever the
 // current scan's are.
 size_t stored_blocks_wide(const PELOJ_JDINFO& jd, const Component& component) {
@@ -31,8 +25,6 @@ int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int
   return jd.rowCoefficients[component.index].data() + 64 * block;
 }
 
-namespace {
-
 bool allocate_store(PELOJ_JDINFO& jd) {
   for (int c = 0; c < jd.componentCount; ++c) {
     const auto index = static_cast<size_t>(c);
@@ -42,6 +34,8 @@ bool allocate_store(PELOJ_JDINFO& jd) {
   }
   return true;
 }
+
+namespace {
 
 // Points the MCU's blocks at their places in the store.
 void point_blocks(PELOJ_JDINFO& jd, int mcu, int mcuRow) {
@@ -58,6 +52,8 @@ void point_blocks(PELOJ_JDINFO& jd, int mcu, int mcuRow) {
 
 // One scan's part of the iMCU row; false when its data fails.
 bool decode_scan_row(PELOJ_JDINFO& jd) {
+  // Nothing more comes of a scan that ended: a few bytes must not cost a visit to every block.
+  if (jd.entropy->insufficient && jd.restartInterval == 0) return true;
   const auto decode = jd.ah != 0 ? PELOJ_ProgDecodeMcuRefine : PELOJ_ProgDecodeMcu;
   for (int row = 0; row < jd.mcuRowsPerImcu; ++row) {
     for (int mcu = 0; mcu < jd.mcusPerRow; ++mcu) {
@@ -78,53 +74,7 @@ void transform_row(PELOJ_JDINFO& jd, const Component& component, InverseDct tran
   }
 }
 
-// Later scans cannot change what a reduced transform reads of the components that are marked complete.
-struct Completeness {
-  std::array<bool, kMaxComponents> complete{};
-
-  void mark(const PELOJ_JDINFO& jd) {
-    const bool enough = (jd.scale == kHalf && jd.se > 18) || (jd.scale == kQuarter && jd.se >= 5);
-    if (enough) complete[static_cast<size_t>(jd.lastScanComponent)] = true;
-  }
-  bool all(int components) const {
-    for (int c = 0; c < components; ++c) {
-      if (!complete[static_cast<size_t>(c)]) return false;
-    }
-    return true;
-  }
-};
-
-// Prepares the scan whose header has just been read.
-int prepare_scan(PELOJ_JDINFO& jd) {
-  if (PELOJ_InitUpsampler(&jd) != PELOJ_OK) {
-    return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitUpsampler fail");
-  }
-  if (PELOJ_InitDecBeforeScan(&jd) != PELOJ_OK) {
-    return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitDecBeforeScan fail");
-  }
-  return PELOJ_OK;
-}
-
 }  // namespace
-
-int list_scans(PELOJ_JDINFO& jd) {
-  if (!allocate_store(jd)) return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
-  Completeness components;
-  while (jd.scanCount < kMaxScans) {
-    if (PELOJ_SetupScanInfo(&jd, &jd.scans[jd.scanCount]) != PELOJ_OK) {
-      return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
-    }
-    ++jd.scanCount;
-    components.mark(jd);
-    if (components.all(jd.componentCount)) break;
-    // The search for the next marker passes over the entropy-coded data of this scan.
-    int status;
-    PELOJ_ParseNextMarker(&jd, &status);
-    if (status != PELOJ_OK) break;
-    if (prepare_scan(jd) != PELOJ_OK) return PELOJ_FAIL;
-  }
-  return PELOJ_OK;
-}
 
 int decode_coefficient_row(PELOJ_JDINFO& jd) {
   for (OsBuffer<int32_t>& plane : jd.rowCoefficients) {
@@ -147,50 +97,6 @@ int decode_coefficient_row(PELOJ_JDINFO& jd) {
 
 using namespace pelo;
 using namespace pelo::jpeg;
-
-int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
-  *slot = os_new<ScanRecord>();
-  if (!*slot) return PELOJ_FAIL;
-  ScanRecord& record = **slot;
-  record.componentCount = jdInfo->scanComponentCount;
-  record.components = jdInfo->scan;
-  record.lastComponent = jdInfo->lastScanComponent;
-  record.ss = jdInfo->ss;
-  record.se = jdInfo->se;
-  record.ah = jdInfo->ah;
-  record.al = jdInfo->al;
-  record.restartInterval = jdInfo->restartInterval;
-  jdInfo->eobRun = 0;
-  PELOJ_SaveScanInfo(jdInfo, &record);
-  return PELOJ_OK;
-}
-
-void PELOJ_SaveScanInfo(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
-  record->entropy = *jdInfo->entropy;
-  record->sourcePosition = source_offset(*jdInfo->source);
-  record->eobRun = jdInfo->eobRun;
-  record->nextRestart = jdInfo->marker->nextRestart;
-  record->unreadMarker = jdInfo->unreadMarker;
-}
-
-int PELOJ_LoadScanInfo(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
-  if (!source_reposition(*jdInfo->source, record->sourcePosition)) return 0;
-  jdInfo->scanComponentCount = record->componentCount;
-  jdInfo->scan = record->components;
-  jdInfo->lastScanComponent = record->lastComponent;
-  jdInfo->ss = record->ss;
-  jdInfo->se = record->se;
-  jdInfo->ah = record->ah;
-  jdInfo->al = record->al;
-  jdInfo->restartInterval = record->restartInterval;
-  *jdInfo->entropy = record->entropy;
-  jdInfo->eobRun = record->eobRun;
-  jdInfo->marker->nextRestart = record->nextRestart;
-  jdInfo->unreadMarker = record->unreadMarker;
-  if (!set_scan_geometry(*jdInfo)) return 0;
-  PELOJ_SetupiMcu(jdInfo);
-  return 1;
-}
 
 int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo) {
   const int status = decode_coefficient_row(*jdInfo);

@@ -38,7 +38,10 @@ int PELOJ_ProcessRestartMarker(PELOJ_JDINFO* jdInfo) {
   if (real > 0) marker.discardedBytes += real / 8;
   entropy.bits = {};
 
-  if (jdInfo->unreadMarker == 0 && !scan_for_marker(*jdInfo)) return 0;
+  if (jdInfo->unreadMarker == 0 && !scan_for_marker(*jdInfo)) {
+    meet_end(*jdInfo);
+    if (jdInfo->unreadMarker == 0) return 0;
+  }
   if (jdInfo->unreadMarker == 0xD0 + marker.nextRestart) jdInfo->unreadMarker = 0;
   marker.nextRestart = (marker.nextRestart + 1) & 7;
   entropy.lastDc = {};

@@ -7,8 +7,7 @@
 
 namespace {
 
-// Source pixel (c, r) goes to column height - 1 - r of row c, or for the other way to column r of row
-// width - 1 - c, of a picture height pixels wide.
+// Through a second buffer: rows become columns, so that in place every pixel would chase another.
 int rotate(void* buffer, int width, int height, int outFormat, bool clockwise) {
   const bool known = outFormat == TAVIRPELO_RGB565 || outFormat == TAVIRPELO_RGB888 ||
                      outFormat == TAVIRPELO_RGB565_DITHER;

@@ -50,7 +50,7 @@ int process(PELOJ_JDINFO& jd, const RowDecoder& function, int* rowCounter, int r
 
 RowFunction row_function(const PELOJ_JDINFO& jd) {
   const bool full = jd.scale == kFull;
-  if (needs_all_scans(jd)) {
+  if (stores_coefficients(jd)) {
     return full ? PELOJ_ProgProcessData : PELOJ_ProgProcessData_resize;
   }
   return full ? PELOJ_ProcessData : PELOJ_ProcessData_resize;

@@ -18,20 +18,6 @@ constexpr int32_t kMaxDc = 1023, kMinDc = -1024;
 constexpr size_t kMaxBlockBits = 27 + 62 * 26 + 16;
 constexpr size_t kMaxMcuBytes = (kEncoderMcuBlocks * kMaxBlockBits + 2 * kBitWordSize) / 8 * 2;
 
-// Positions in zig-zag order of the coefficients that a nibble of the natural order names, by nibble.
-using NibbleTable = std::array<std::array<uint64_t, 16>, 16>;
-NibbleTable make_zigzag_bits() {
-  NibbleTable table{};
-  for (uint32_t k = 0; k < 64; ++k) {
-    const uint32_t natural = PELOJ_NATURAL_ORDER[k];
-    for (uint32_t set = 0; set < 16; ++set) {
-      if ((set >> (natural % 4) & 1) != 0) table[natural / 4][set] |= uint64_t{1} << k;
-    }
-  }
-  return table;
-}
-const NibbleTable kZigzagBits = make_zigzag_bits();
-
 // One bit for each of the coefficients that are not zero, by zig-zag position.
 inline uint64_t nonzero_positions(const CoefficientBlock& block) {
   alignas(16) std::array<uint8_t, 64> flags;

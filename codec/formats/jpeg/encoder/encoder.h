@@ -137,9 +137,9 @@ ELO_ENCODER* begin_bands(const TAVIRPELO_RAWINFO* image, ELO_DESTINATION* destin
                          const TAVIRPELO_ENCOPTION* options,
                          const pelo::jpeg::CodingParameters* parameters);
 
-// Encodes one MCU row from a band of planar 4:2:0 rows: 16 rows of Y, then 8 of Cb at 16 * width bytes
-// and 8 of Cr behind them, chroma rows of (width + 1) / 2. Rows of the last band that lie below the
-// image are not read. Stores the new row position (pixels, the height at the end) unless null; 1 or 0.
+// The next row of MCUs, from a planar 4:2:0 picture 16 rows high without gaps between its planes. What lies
+// below the image in the last one is not read. *position, where it is given, becomes the number of image
+// rows coded so far; 1 or 0.
 int encode_band(ELO_ENCODER* encoder, const uint8_t* band, int* position);
 
 // Ends the image, reports the working buffer and the bytes produced (either may be null), and frees the

@@ -1,0 +1,143 @@
+#include "codec/jpeg/decoder/scan_list.h"
+
+#include "codec/jpeg/decoder/markers.h"
+#include "codec/jpeg/decoder/progressive.h"
+#include "codec/jpeg/decoder/scan_setup.h"
+#include "codec/jpeg/decoder/upsample.h"
+#include "codec/jpeg/header_scan.h"
+#include "platform/android_log.h"
+
+namespace pelo::jpeg {
+namespace {
+
+int fail(int error, const char* text) {
+  gTAVIRPELO_Error = error;
+  log_error(text);
+  return PELOJ_FAIL;
+}
+
+// The components of which the scans so far hold all that will be shown.
+class Coverage {
+ public:
+  // Sequential scans hold their components whole. Later progressive scans cannot change what a reduced
+  // transform reads of a component whose band reached far enough.
+  void add_scan(const PELOJ_JDINFO& jd) {
+    if (!is_progressive(jd)) {
+      for (int i = 0; i < jd.scanComponentCount; ++i) complete(i, jd) = true;
+      return;
+    }
+    const bool enough = (jd.scale == kHalf && jd.se > 18) || (jd.scale == kQuarter && jd.se >= 5);
+    if (enough) complete_[static_cast<size_t>(jd.lastScanComponent)] = true;
+  }
+  // False for a sequential scan of components that are there already: the standard allows each once.
+  bool gains(const PELOJ_JDINFO& jd) {
+    if (is_progressive(jd)) return true;
+    for (int i = 0; i < jd.scanComponentCount; ++i) {
+      if (!complete(i, jd)) return true;
+    }
+    return false;
+  }
+  bool all(int components) const {
+    for (int c = 0; c < components; ++c) {
+      if (!complete_[static_cast<size_t>(c)]) return false;
+    }
+    return true;
+  }
+
+ private:
+  bool& complete(int scanIndex, const PELOJ_JDINFO& jd) {
+    return complete_[jd.scan[static_cast<size_t>(scanIndex)]->index];
+  }
+  std::array<bool, kMaxComponents> complete_{};
+};
+
+// Reads up to the header of the next scan worth listing; false when there is none. The search for a
+// marker passes over the entropy-coded data of the scans before it.
+bool find_scan(PELOJ_JDINFO& jd, Coverage& coverage) {
+  int status;
+  do {
+    PELOJ_ParseNextMarker(&jd, &status);
+  } while (status == PELOJ_OK && !coverage.gains(jd));
+  return status == PELOJ_OK;
+}
+
+// Prepares the scan whose header has just been read.
+int prepare_scan(PELOJ_JDINFO& jd) {
+  if (PELOJ_InitUpsampler(&jd) != PELOJ_OK) {
+    return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitUpsampler fail");
+  }
+  if (PELOJ_InitDecBeforeScan(&jd) != PELOJ_OK) {
+    return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitDecBeforeScan fail");
+  }
+  return PELOJ_OK;
+}
+
+}  // namespace
+
+int list_scans(PELOJ_JDINFO& jd) {
+  if (stores_coefficients(jd) && !allocate_store(jd)) {
+    return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
+  }
+  Coverage coverage;
+  while (jd.scanCount < kMaxScans) {
+    if (PELOJ_SetupScanInfo(&jd, &jd.scans[jd.scanCount]) != PELOJ_OK) {
+      return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
+    }
+    ++jd.scanCount;
+    coverage.add_scan(jd);
+    if (coverage.all(jd.componentCount) || !find_scan(jd, coverage)) break;
+    if (prepare_scan(jd) != PELOJ_OK) return PELOJ_FAIL;
+  }
+  // What the state says of a sequential picture's scan stays that of the first one.
+  if (is_progressive(jd) || PELOJ_LoadScanInfo(&jd, jd.scans[0].get())) return PELOJ_OK;
+  return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitDecBeforeScan fail");
+}
+
+}  // namespace pelo::jpeg
+
+using namespace pelo;
+using namespace pelo::jpeg;
+
+int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
+  *slot = os_new<ScanRecord>();
+  if (!*slot) return PELOJ_FAIL;
+  ScanRecord& record = **slot;
+  record.componentCount = jdInfo->scanComponentCount;
+  record.components = jdInfo->scan;
+  record.lastComponent = jdInfo->lastScanComponent;
+  record.ss = jdInfo->ss;
+  record.se = jdInfo->se;
+  record.ah = jdInfo->ah;
+  record.al = jdInfo->al;
+  record.restartInterval = jdInfo->restartInterval;
+  jdInfo->eobRun = 0;
+  PELOJ_SaveScanInfo(jdInfo, &record);
+  return PELOJ_OK;
+}
+
+void PELOJ_SaveScanInfo(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
+  record->entropy = *jdInfo->entropy;
+  record->sourcePosition = source_offset(*jdInfo->source);
+  record->eobRun = jdInfo->eobRun;
+  record->nextRestart = jdInfo->marker->nextRestart;
+  record->unreadMarker = jdInfo->unreadMarker;
+}
+
+int PELOJ_LoadScanInfo(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
+  if (!source_reposition(*jdInfo->source, record->sourcePosition)) return 0;
+  jdInfo->scanComponentCount = record->componentCount;
+  jdInfo->scan = record->components;
+  jdInfo->lastScanComponent = record->lastComponent;
+  jdInfo->ss = record->ss;
+  jdInfo->se = record->se;
+  jdInfo->ah = record->ah;
+  jdInfo->al = record->al;
+  jdInfo->restartInterval = record->restartInterval;
+  *jdInfo->entropy = record->entropy;
+  jdInfo->eobRun = record->eobRun;
+  jdInfo->marker->nextRestart = record->nextRestart;
+  jdInfo->unreadMarker = record->unreadMarker;
+  if (!set_scan_geometry(*jdInfo)) return 0;
+  PELOJ_SetupiMcu(jdInfo);
+  return 1;
+}
