@@ -86,18 +86,20 @@ bool resample(Record& record, Size target, const OutputGrid& grid) {
 
 bool plan_reduction(Record& record) {
   const Size reduced = reduced_size(record);
-  // Sampling straight into the output gives the same pixels, but for those that the image does not
-  // cover.
-  record.clears = is_reduced(record) && reduced == record.picture && record.store != nullptr;
-  if (reduced == record.picture || record.store == nullptr) return true;
+  if (record.store == nullptr || !is_reduced(record)) return true;
+  if (reduced == record.picture) {  // sampling straight into the output gives the same pixels
+    return record.plane.painted.allocate(static_cast<size_t>(record.picture.height));
+  }
   return set_sampling(record.sampling, record.screen, reduced) && record.plane.allocate(reduced);
 }
 
 // A picture that is not turned fills the whole box when that is smaller on both sides.
 bool finish_picture(Record& record, void* output) {
   const Size reduced = record.plane.size;
-  if (record.clears) clear_picture(record, output);
-  if (!record.plane.indices) return true;
+  if (!record.plane.indices) {
+    clear_unpainted_rows(record, output);
+    return true;
+  }
   const Size buffer = record.request.buffer;
   const bool upright = (record.option & TAVIRPELO_ROTATE_MASK) == TAVIRPELO_ROTATE_0;
   const bool tight = (record.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT;

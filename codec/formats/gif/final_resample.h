@@ -6,12 +6,12 @@
 
 namespace pelo::gif {
 
-// Prepares the plane of sampled indices when the picture is to be averaged, and has it cleared first
-// when it is sampled into the output. False when memory is short.
+// Prepares the plane of sampled indices when the picture is to be averaged, or the note of the rows that
+// are there when it is sampled into the output. False when memory is short.
 [[nodiscard]] bool plan_reduction(Record& record);
 
-// Averages the plane, if there is one, into the caller's buffer; clears a picture that got no row. False
-// when the caller ends the decode.
+// Averages the plane, if there is one, into the caller's buffer, or clears the rows that did not come.
+// False when the caller ends the decode.
 bool finish_picture(Record& record, void* output);
 
 }  // namespace pelo::gif

@@ -63,9 +63,27 @@ int rows_of_current(const Record& record) {
   return std::max(0, rows.end - rows.begin);
 }
 
+void clear_span(const Record& record, const RowSpan& span) {
+  store_span(record.store, span, [](int) { return Rgba{}; });
+}
+
+// The output rows of the current row, left and right of what the frame covers.
+void clear_beside_frame(Record& record, void* output) {
+  const Sampling& sampling = record.sampling;
+  const OutputGrid grid = grid_of(record, output);
+  const OutputRows rows = rows_of(sampling, record.currentRow);
+  for (int row = rows.begin; row < rows.end; ++row) {
+    record.plane.painted[static_cast<size_t>(row)] = 1;
+    clear_span(record, grid.span(row, 0, sampling.begin));
+    clear_span(record, grid.span(row, sampling.end, sampling.to.width - sampling.end));
+  }
+}
+
 bool write_still_row(Record& record, void* output) {
-  if (!may_write(record, rows_of_current(record))) return false;
-  if (record.clears) clear_picture(record, output);
+  const int rows = rows_of_current(record);
+  if (rows == 0) return true;
+  if (!may_write(record, rows)) return false;
+  if (record.plane.painted) clear_beside_frame(record, output);
   if (record.picture == record.screen) {
     PELOI_WriteGIFOneToOneRow(&record, output);
   } else {
@@ -85,11 +103,12 @@ bool may_write(Record& record, int rows) {
   return !record.ended;
 }
 
-void clear_picture(Record& record, void* output) {
-  record.clears = false;
+void clear_unpainted_rows(const Record& record, void* output) {
+  const OsBuffer<uint8_t>& painted = record.plane.painted;
   const OutputGrid grid = grid_of(record, output);
-  for (int row = 0; row < record.picture.height; ++row) {
-    store_span(record.store, grid.span(row, 0, record.picture.width), [](int) { return Rgba{}; });
+  for (size_t row = 0; row < painted.size(); ++row) {
+    if (painted[row] == 0)
+      clear_span(record, grid.span(static_cast<int64_t>(row), 0, record.picture.width));
   }
 }
 

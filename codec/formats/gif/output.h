@@ -17,8 +17,8 @@ void set_palette(Record& record);
 // Asks the caller before the next `rows` output rows, if any, and counts them. False ends the decode.
 [[nodiscard]] bool may_write(Record& record, int rows);
 
-// Makes every pixel of the picture zero bytes, once.
-void clear_picture(Record& record, void* output);
+// Makes the rows of a reduced picture that no image row was written to zero bytes.
+void clear_unpainted_rows(const Record& record, void* output);
 
 // True when some output is made of the current row.
 bool row_is_wanted(const Record& record);

@@ -56,7 +56,8 @@ struct OutputRows {
 struct IndexPlane {
   Size size;
   OsBuffer<uint8_t> indices;
-  OsBuffer<uint8_t> painted;  // per row: 1 once it is there
+  OsBuffer<uint8_t>
+      painted;  // per row: 1 once it is there; alone, of rows that go straight to the output
 
   // Both stay empty for an empty plane. False when it is too large or memory is short.
   [[nodiscard]] bool allocate(Size wanted);
@@ -104,7 +105,6 @@ struct Record : FormatState {
   IndexPlane plane;
   OsBuffer<uint8_t> line;  // indices of the current row and the rest of the string behind it
   int currentRow;          // on the screen
-  bool clears;             // the picture is to be cleared before its first row
   int rowsWritten;         // output rows of the image or frame
   bool ended;              // by the caller
   LzwState lzw;
