@@ -1,6 +1,6 @@
 #include "codec/formats/jpeg/decoder/dequantise.h"
 
-#include "codec/jpeg/decoder/scan_list.h"
+#include "codec/formats/jpeg/decoder/scan_list.h"
 
 namespace pelo::jpeg {
 namespace {

@@ -1,10 +1,10 @@
-#include "codec/jpeg/decoder/scan_list.h"
+#include "codec/formats/jpeg/decoder/scan_list.h"
 
-#include "codec/jpeg/decoder/markers.h"
-#include "codec/jpeg/decoder/progressive.h"
-#include "codec/jpeg/decoder/scan_setup.h"
-#include "codec/jpeg/decoder/upsample.h"
-#include "codec/jpeg/header_scan.h"
+#include "codec/formats/jpeg/decoder/markers.h"
+#include "codec/formats/jpeg/decoder/progressive.h"
+#include "codec/formats/jpeg/decoder/scan_setup.h"
+#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
 namespace pelo::jpeg {

@@ -3,7 +3,7 @@
 // is held does not grow with the picture's height.
 #pragma once
 
-#include "codec/jpeg/decoder/jd_info.h"
+#include "codec/formats/jpeg/decoder/jd_info.h"
 
 // Makes a record of the current scan header, entropy state and source position in the slot. 200 or 201.
 TAVIRPELO_API int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, pelo::OsPtr<pelo::jpeg::ScanRecord>* slot);
