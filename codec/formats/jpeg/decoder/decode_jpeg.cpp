@@ -1,4 +1,5 @@
 // The JPEG decode entry: an embedded thumbnail when the option word allows it, else the main picture.
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
@@ -85,7 +86,7 @@ bool decode(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const Request& req
         return true;
       }
       // What the thumbnail failed of says nothing about the main picture.
-      gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+      record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
     }
   }
   return decode_at(decInfo, source, 0, width, height, request);
@@ -94,7 +95,7 @@ bool decode(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const Request& req
 // A reader at the start of the object's source; false with a line in the log.
 bool open_source(TAVIRPELO_DECINFO& decInfo, BufferedSource& source) {
   if (!source.open(decInfo.pIO)) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_MEMORY;
+    record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_MEMORY);
     log_error("TAVIRPELO_DecodeJPEG : malloc Fail");
     return false;
   }
@@ -112,9 +113,9 @@ using namespace pelo;
 using namespace pelo::jpeg;
 
 int TAVIRPELO_DecodeJPEG(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight) {
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_NONE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr || outBuffer == nullptr) {
-    gTAVIRPELO_Error = TAVIRPELO_ERROR_NULL;
+    record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NULL);
     return 0;
   }
   if (reqWidth < 1 || reqHeight < 1) {

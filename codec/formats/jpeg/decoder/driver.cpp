@@ -1,3 +1,4 @@
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 
 #include "codec/formats/jpeg/decoder/convert.h"
@@ -110,7 +111,7 @@ int decode_rows(PELOJ_JDINFO& jd) {
   }
   if (!skip_rows(jd)) return 0;
   if (show_rows(jd) != PELOJ_FAIL || !stores_coefficients(jd)) return PELOJ_OK;
-  gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
+  record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_DECODE);
   log_error(jd.scale == kFull ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
                               : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");
   return 0;
@@ -155,7 +156,7 @@ int PELOJ_StartDecompression(PELOJ_JDINFO* jdInfo) {
 PELOJ_JDINFO* PELOJ_Initialize(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
   int error = TAVIRPELO_ERROR_NONE;
   Decoder decoder = start(*decInfo, source, *request, error);
-  if (error == TAVIRPELO_ERROR_MEMORY) gTAVIRPELO_Error = error;
+  if (error == TAVIRPELO_ERROR_MEMORY) record_error(ErrorWord::kDecoding, error);
   return decoder.release();
 }
 
@@ -163,7 +164,7 @@ int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_RE
   int error = TAVIRPELO_ERROR_DECODE;
   const Decoder decoder = start(*decInfo, source, *request, error);
   if (!decoder || !first_scan_suffices(*decoder)) {
-    gTAVIRPELO_Error = error;
+    record_error(ErrorWord::kDecoding, error);
     return fail("PELOJ_DecodeImage : PELOJ_Initialize fail");
   }
   return decode_rows(*decoder);

@@ -1,3 +1,4 @@
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/scan_list.h"
 
 #include "codec/formats/jpeg/decoder/markers.h"
@@ -11,7 +12,7 @@ namespace pelo::jpeg {
 namespace {
 
 int fail(int error, const char* text) {
-  gTAVIRPELO_Error = error;
+  record_error(ErrorWord::kDecoding, error);
   log_error(text);
   return PELOJ_FAIL;
 }

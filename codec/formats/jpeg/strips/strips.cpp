@@ -1,4 +1,5 @@
 // Decoding a JPEG band by band: the decode driver's steps with the caller's planes changing in between.
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/strips/strips.h"
 
 #include <memory>
@@ -87,7 +88,7 @@ int __elo_jpeg_dec_line_process(PELOJ_JDINFO* state, uint8_t* const* planes, int
   const bool progressive = state->marker->frameType == FrameType::kProgressive;
   const int status = show_rows(*state);
   if (status == PELOJ_FAIL) {
-    if (progressive) gTAVIRPELO_Error = TAVIRPELO_ERROR_DECODE;
+    if (progressive) record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_DECODE);
     release(state);
     return 0;
   }
