@@ -11,24 +11,43 @@ static_assert(sizeof(void*) != 4 ||
               (sizeof(PELOJ_SOURCE) == 24 && offsetof(PELOJ_SOURCE, consumed) == 4 &&
                offsetof(PELOJ_SOURCE, buffer) == 20));
 
+namespace pelo {
+namespace {
+
+// One read of up to `room` bytes behind the unread ones, which go to the buffer's start.
+bool read_behind(PELOJ_SOURCE& source, uint32_t room) {
+  std::memmove(source.buffer, source.buffer + source.pos, source.avail);
+  source.pos = 0;
+  const int count =
+      room == 0 ? 0 : TAVIRPELO_Read_IO(source.io, source.buffer + source.avail, static_cast<int>(room));
+  if (count <= 0) return false;
+  source.avail += static_cast<uint32_t>(count);
+  source.consumed += static_cast<uint32_t>(count);
+  return true;
+}
+
+bool has_room(const PELOJ_SOURCE& source, int64_t n) {
+  return source.avail + n <= kSourceBufferSize;
+}
+
+}  // namespace
+
+bool source_need(PELOJ_SOURCE& source, uint32_t n) {
+  if (source.avail < n && !has_room(source, int64_t{n} - source.avail)) return false;
+  while (source.avail < n) {
+    if (!read_behind(source, kSourceBufferSize - source.avail)) return false;
+  }
+  return true;
+}
+
+}  // namespace pelo
+
+// A single read, into the room that taken bytes left: what source_need does as often as it must.
 int PELOJ_CheckBuffer(PELOJ_SOURCE* source, int n) {
   if (source == nullptr || source->buffer == nullptr) return 0;
   if (int64_t{source->avail} >= n) return 2;
-  if (int64_t{source->avail} + n > kSourceBufferSize) return 0;
-
-  std::memmove(source->buffer, source->buffer + source->pos, source->avail);
-  source->pos = 0;
-  int result = 0;
-  while (int64_t{source->avail} < n) {
-    const uint32_t room = kSourceBufferSize - source->avail;
-    const int count =
-        TAVIRPELO_Read_IO(source->io, source->buffer + source->avail, static_cast<int>(room));
-    if (count <= 0) break;
-    source->avail += static_cast<uint32_t>(count);
-    source->consumed += static_cast<uint32_t>(count);
-    result = 1;
-  }
-  return result;
+  if (!has_room(*source, n)) return 0;
+  return read_behind(*source, source->avail == 0 ? kSourceBufferSize : source->pos) ? 1 : 0;
 }
 
 namespace pelo {
@@ -37,12 +56,6 @@ bool BufferedSource::open(TAVIRPELO_IO* io) {
   if (io == nullptr || !buffer_.allocate(kSourceBufferSize)) return false;
   source_ = PELOJ_SOURCE{io, 0, static_cast<uint32_t>(io->size), 0, 0, buffer_.data()};
   return true;
-}
-
-bool source_need(PELOJ_SOURCE& source, uint32_t n) {
-  if (n > kSourceBufferSize) return false;
-  return source.avail >= n ||
-         (PELOJ_CheckBuffer(&source, static_cast<int>(n)) != 0 && source.avail >= n);
 }
 
 bool source_skip(PELOJ_SOURCE& source, int64_t k) {

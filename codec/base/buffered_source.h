@@ -18,9 +18,8 @@ typedef struct PELOJ_SOURCE {
   uint8_t* buffer;    // 4096 bytes
 } PELOJ_SOURCE;
 
-// Makes n unread bytes available, in as many reads as the source needs for them: 2 already there, 1
-// after reads that delivered something (fewer than n in all when the source ends), 0 when it has no more
-// or n exceeds the buffer.
+// Makes n unread bytes available by one read at the most: 2 already there, 1 after a read that delivered
+// at least one byte (possibly fewer than n in all), 0 when there was nothing to read or no room for it.
 TAVIRPELO_API int PELOJ_CheckBuffer(PELOJ_SOURCE* source, int n);
 
 namespace pelo {
@@ -40,7 +39,7 @@ class BufferedSource {
   OsBuffer<uint8_t> buffer_;
 };
 
-// True when n unread bytes really are in the buffer.
+// True when n unread bytes are in the buffer, after as many reads as a source of short ones needs.
 [[nodiscard]] bool source_need(PELOJ_SOURCE& source, uint32_t n);
 
 // Consumes n bytes that source_need has promised; returns where they start.
@@ -52,7 +51,9 @@ inline const uint8_t* source_take(PELOJ_SOURCE& source, uint32_t n) {
 }
 
 // Source offset of the next unread byte.
-inline uint32_t source_offset(const PELOJ_SOURCE& source) { return source.consumed - source.avail; }
+inline uint32_t source_offset(const PELOJ_SOURCE& source) {
+  return source.consumed - source.avail;
+}
 
 // Skips k bytes forward, by a relative seek when they are not in the buffer. False for a negative k, a
 // target beyond 31 bits, or a seek that does not get there.

@@ -6,6 +6,7 @@
 #include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "codec/decode/one_call.h"
+#include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/image/crop.h"
 #include "tavirpelo/decode.h"
 
@@ -51,7 +52,7 @@ int decode_small(const char* path, void* outBuffer, int width, int height) {
   TAVIRPELO_DECINFO* decInfo =
       TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_FILE, const_cast<char*>(path), 0, TAVIRPELO_RGB565, 0);
   if (decInfo == nullptr) return 0;
-  const int result = TAVIRPELO_DecodeJPEG(decInfo, outBuffer, width, height);
+  const int result = jpeg::decode(decInfo, outBuffer, width, height);
   TAVIRPELO_DestroyDecInfo(decInfo);
   return result;
 }

@@ -7,6 +7,7 @@
 #include "codec/base/errors.h"
 #include "codec/formats/bmp/head.h"
 #include "codec/formats/gif/head.h"
+#include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/head.h"
 #include "codec/formats/png/head.h"
 #include "tavirpelo/decode.h"
@@ -18,7 +19,7 @@ constexpr const char* kStage = "format detection";
 
 // No two sniffs agree on a source, so the order does not matter.
 constexpr Format kFormats[] = {
-    {jpeg::sniff, jpeg::parse_head, TAVIRPELO_DecodeJPEG, TAVIRPELO_FORMAT_JPEG, 0},
+    {jpeg::sniff, jpeg::parse_head, jpeg::decode, TAVIRPELO_FORMAT_JPEG, 0},
     {png::sniff, png::parse_head, TAVIRPELOI_DecodePNG, TAVIRPELO_FORMAT_PNG, 0},
     {gif::sniff, gif::parse_head, TAVIRPELOI_DecodeGIF, TAVIRPELO_FORMAT_GIF,
      TAVIRPELO_FORMAT_ANIMATED_GIF},
@@ -76,7 +77,7 @@ const Format* format_of(int code) {
 
 int detect(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo) {
   // Shorter sources reach their format's own checks; the buffer is zero behind them.
-  if (PELOJ_CheckBuffer(&source, kSniffBytes) == 0) return cut_head(kStage);
+  if (!source_need(source, kSniffBytes) && source.avail == 0) return cut_head(kStage);
   const Start start(source);
   const uint8_t* head = source.buffer + source.pos;
   for (const Format& format : kFormats) {

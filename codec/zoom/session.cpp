@@ -20,7 +20,7 @@ TAVIRPELO_ZOOMINFO* begin(TAVIRPELO_DECINFO* decInfo, const Messages& messages) 
 
 bool read_size(TAVIRPELO_DECINFO& decInfo, Size& picture) {
   TAVIRPELO_HINFO header{};
-  if (PELOJ_GetHInfo(decInfo.pIO, &header) != 1) return false;
+  if (jpeg::header_info(decInfo.pIO, &header) != 1) return false;
   picture = {header.width, header.height};
   return picture.width > 0 && picture.height > 0;
 }

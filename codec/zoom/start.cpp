@@ -5,6 +5,7 @@
 #include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
+#include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/draw.h"
 #include "codec/zoom/layout.h"
@@ -101,7 +102,7 @@ void decode_later(TAVIRPELO_DECINFO& decInfo, const Preview& preview, int priori
 
 bool decode_now(TAVIRPELO_DECINFO& decInfo) {
   TAVIRPELO_ZOOMINFO& zoom = *decInfo.pZoomInfo;
-  if (TAVIRPELO_DecodeJPEG(&decInfo, zoom.pZoomImage, zoom.imageWidth, zoom.imageHeight) != 1) {
+  if (jpeg::decode(&decInfo, zoom.pZoomImage, zoom.imageWidth, zoom.imageHeight) != 1) {
     return false;
   }
   store_shared(zoom.decodeState, TAVIRPELO_ZOOM_DECODED);

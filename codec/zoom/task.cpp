@@ -1,6 +1,7 @@
 // The decode task, and a task layer for a platform without tasks.
 #include "codec/zoom/task.h"
 
+#include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/zoom/zoom.h"
 #include "tavirpelo/decode.h"
 
@@ -15,7 +16,7 @@ void decode(const TAVIRPELO_TASKMESSAGE& message) {
   if (message.width > 0 && message.width < kWidthLimit) {
     store_shared(zoom.decodeState, TAVIRPELO_ZOOM_DECODING);
     if (load_shared(zoom.stopRequest) == 0) {
-      TAVIRPELO_DecodeJPEG(message.decInfo, message.buffer, message.width, message.height);
+      jpeg::decode(message.decInfo, message.buffer, message.width, message.height);
     }
   }
   // Whatever became of the picture: the end of the zoom waits for this.

@@ -1,5 +1,6 @@
 // The JPEG header scans: sizes, marker rules, and thumbnails in every kind of segment, sound and
 // hostile.
+#include "codec/formats/jpeg/jpeg_abi.h"
 #include "codec/formats/jpeg/header_scan.h"
 
 #include <gtest/gtest.h>

@@ -67,7 +67,7 @@ TEST(Streams, LiesAndMissingCallbacks) {
   EXPECT_EQ(0, TAVIRPELO_Close_IO(nullptr));
 }
 
-// A refill reads on until it has what was asked for, behind the bytes that are there; when the stream
+// A reader reads on until it has what was asked for, behind the bytes that are there; when the stream
 // ends before, nobody may consume more than there are, and those stay readable.
 TEST(Streams, ShortReadsNeverInventBytes) {
   MemoryStream s{numbered(6000)};
@@ -76,6 +76,9 @@ TEST(Streams, ShortReadsNeverInventBytes) {
   pelo::BufferedSource source;
   ASSERT_TRUE(source.open(io));
   EXPECT_EQ(1, PELOJ_CheckBuffer(source.get(), 250));
+  EXPECT_EQ(100u, source->avail);  // one read, and no room in front of the unread bytes for another
+  EXPECT_EQ(0, PELOJ_CheckBuffer(source.get(), 250));
+  EXPECT_TRUE(pelo::source_need(*source.get(), 250));
   EXPECT_EQ(300u, source->avail);
   ASSERT_TRUE(pelo::source_skip(*source.get(), 60));
   ASSERT_TRUE(pelo::source_need(*source.get(), 3800));

@@ -2,9 +2,7 @@
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 int fail(const char* message) {
@@ -14,13 +12,13 @@ int fail(const char* message) {
 
 }  // namespace
 
-int PELOJ_GetHInfo(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
+int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
   if (io == nullptr || hinfo == nullptr) return 0;
   BufferedSource source;
   if (!source.open(io)) return fail("PELOJ_GetHInfo : malloc Fail");
   if (TAVIRPELO_Seek_IO(io, 0, SEEK_SET) < 0) return fail("PELOJ_GetHInfo : seek Fail");
   PELOJ_FILEHEADER header{};
-  if (PELOJ_ParseFileHeader(source.get(), kScanMode, &header) != PELOJ_OK) {
+  if (scan_file_header(source.get(), kScanMode, &header) != PELOJ_OK) {
     return fail("PELOJ_GetHInfo : PELOJ_SimpleParser Fail");
   }
 
@@ -30,7 +28,7 @@ int PELOJ_GetHInfo(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
     if (!source_reposition(*source.get(), header.thumbnail.offset)) {
       return fail("TAVIRPELO_DecodeJPEG : seek Fail");
     }
-    if (PELOJ_SimpleParser(source.get(), kScanMode, &small) != PELOJ_OK) small = {};
+    if (scan_size(source.get(), kScanMode, &small) != PELOJ_OK) small = {};
   }
   hinfo->width = header.width;
   hinfo->height = header.height;
@@ -40,3 +38,5 @@ int PELOJ_GetHInfo(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
   hinfo->thumbnailHeight = small.height;
   return 1;
 }
+
+}  // namespace pelo::jpeg

@@ -8,8 +8,7 @@
 #include "codec/formats/jpeg/header_scan_segments.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
+namespace pelo::jpeg {
 
 static_assert(sizeof(PELOJ_THUMBNAIL) == 40 && offsetof(PELOJ_THUMBNAIL, length) == 20 &&
               offsetof(PELOJ_THUMBNAIL, offset) == 32);
@@ -90,19 +89,21 @@ int scan(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result, const ScanPol
 
 }  // namespace
 
-bool pelo::jpeg::thumbnail_in_source(const PELOJ_THUMBNAIL& thumbnail, uint32_t sourceSize) {
+bool thumbnail_in_source(const PELOJ_THUMBNAIL& thumbnail, uint32_t sourceSize) {
   return thumbnail.present != 0 && thumbnail.offset != 0 &&
          uint64_t{thumbnail.offset} + thumbnail.length < sourceSize;
 }
 
-int PELOJ_ParseFileHeader(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
+int scan_file_header(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
   return scan(source, mode, result, kEverything);
 }
 
-int PELOJ_ParseExifThumbnail(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
+int scan_exif_thumbnail(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
   return scan(source, mode, result, kExifOnly);
 }
 
-int PELOJ_SimpleParser(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
+int scan_size(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result) {
   return scan(source, mode, result, kSizeOnly);
 }
+
+}  // namespace pelo::jpeg

@@ -1,4 +1,5 @@
-// Light scans that measure a JPEG without preparing a decode: size, progressive flag, embedded thumbnail.
+// Light scans that measure a JPEG without preparing a decode: size, progressive flag, embedded
+// thumbnail.
 #pragma once
 
 #include <cstdint>
@@ -12,10 +13,10 @@ enum { PELOJ_OK = 200, PELOJ_FAIL = 201 };
 
 // Thumbnail types (PELOJ_THUMBNAIL.type).
 enum {
-  PELOJ_THUMBNAIL_STRIP = 0,       // EXIF strip data
-  PELOJ_THUMBNAIL_PIXELS = 1,      // uncompressed pixels
+  PELOJ_THUMBNAIL_STRIP = 0,   // EXIF strip data
+  PELOJ_THUMBNAIL_PIXELS = 1,  // uncompressed pixels
   PELOJ_THUMBNAIL_JPEG = 6,
-  PELOJ_THUMBNAIL_PHOTOSHOP = 7    // JPEG inside a Photoshop resource
+  PELOJ_THUMBNAIL_PHOTOSHOP = 7  // JPEG inside a Photoshop resource
 };
 
 // An embedded thumbnail, ten 32-bit words, all 0 when none was found.
@@ -23,12 +24,12 @@ typedef struct PELOJ_THUMBNAIL {
   int32_t present;
   int32_t width;
   int32_t height;
-  int32_t type;           // for EXIF the Compression tag first
-  int32_t layout;         // 2 for 24-bit RGB; for EXIF PhotometricInterpretation
-  uint32_t length;        // bytes of thumbnail data
-  int32_t tag4173;        // EXIF tag 0x104D
-  int32_t planarConfig;   // EXIF tag 284
-  uint32_t offset;        // source offset of the data
+  int32_t type;          // for EXIF the Compression tag first
+  int32_t layout;        // 2 for 24-bit RGB; for EXIF PhotometricInterpretation
+  uint32_t length;       // bytes of thumbnail data
+  int32_t tag4173;       // EXIF tag 0x104D
+  int32_t planarConfig;  // EXIF tag 284
+  uint32_t offset;       // source offset of the data
   int32_t reserved;
 } PELOJ_THUMBNAIL;
 
@@ -41,17 +42,17 @@ typedef struct PELOJ_FILEHEADER {
 } PELOJ_FILEHEADER;
 static_assert(sizeof(PELOJ_FILEHEADER) == 13 * 4);
 
+namespace pelo::jpeg {
+
 // Each returns 200 at the first SOS, 201 for a refusal or when data runs out. `mode` is 2 or 8.
-// PELOJ_ParseExifThumbnail looks for EXIF thumbnails alone, PELOJ_SimpleParser fills only the first three
+// scan_exif_thumbnail looks for EXIF thumbnails alone, scan_size fills only the first three
 // words. A failed scan may have filled part of the record.
-TAVIRPELO_API int PELOJ_ParseFileHeader(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result);
-TAVIRPELO_API int PELOJ_ParseExifThumbnail(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result);
-TAVIRPELO_API int PELOJ_SimpleParser(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result);
+int scan_file_header(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result);
+int scan_exif_thumbnail(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result);
+int scan_size(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result);
 
 // The JPEG part of the header information; 1 or 0.
-TAVIRPELO_API int PELOJ_GetHInfo(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo);
-
-namespace pelo::jpeg {
+int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo);
 
 constexpr int kScanMode = 8;
 constexpr int kMaxSide = 5000;  // pixels, both directions

@@ -2,8 +2,8 @@
 #include <climits>
 #include <cstring>
 
-#include "codec/formats/jpeg/tiff.h"
 #include "codec/formats/jpeg/header_scan_segments.h"
+#include "codec/formats/jpeg/tiff.h"
 
 namespace pelo::jpeg {
 namespace {

@@ -7,8 +7,8 @@
 
 #include "tavirpelo/api.h"
 
-// The zig-zag sequence (T.81 Figure A.6) as places in a row-major block. A corrupt run can lead 16 places
-// beyond it: these are the last one again.
+// The zig-zag sequence (T.81 Figure A.6) as places in a row-major block. A corrupt run can lead 16
+// places beyond it: these are the last one again.
 TAVIRPELO_API const uint8_t PELOJ_NATURAL_ORDER[80];
 
 // EXTEND thresholds (T.81 F.12): 0 for size 0, 2^(s-1) for s = 1..15.
@@ -16,8 +16,8 @@ TAVIRPELO_API const int32_t PELOJ_HUFF_EXTEND_TEST[16];
 
 namespace pelo::jpeg {
 
-// Zig-zag positions, one bit each, of the coefficients that the nibble i of a row-major block names: bit b
-// of the nibble stands for place 4 i + b.
+// Zig-zag positions, one bit each, of the coefficients that the nibble i of a row-major block names: bit
+// b of the nibble stands for place 4 i + b.
 using ZigzagBits = std::array<std::array<uint64_t, 16>, 16>;
 extern const ZigzagBits kZigzagBits;
 
@@ -35,7 +35,7 @@ extern const std::array<uint8_t, 64> kChrominanceQuant;
 
 // A Huffman table as a DHT segment lists it: codes per length 1..16, then the symbols in code order.
 struct HuffmanSpec {
-  std::array<uint8_t, 17> counts;    // entry 0 unused
+  std::array<uint8_t, 17> counts;  // entry 0 unused
   std::array<uint8_t, 256> symbols;
 };
 

@@ -92,11 +92,7 @@ void close_bits(PELOJ_JDINFO& jd, const BitReader& reader) {
   jd.source->avail = static_cast<uint32_t>(reader.end - reader.next);
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-int PELOJ_ReadBits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
+int refill_bits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
   reader->state.bits = buffer;
   reader->state.left = bitsLeft;
   *reader = fill_by_bytes(*reader);
@@ -105,10 +101,12 @@ int PELOJ_ReadBits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed
   return reader->jd->unreadMarker != 0 ? 1 : 0;
 }
 
-int PELOJ_DecodeHuffMan(BitReader* reader, BitBuffer buffer, int bitsLeft, const DerivedTable* derived,
-                        int minBits) {
+int decode_code(BitReader* reader, BitBuffer buffer, int bitsLeft, const DerivedTable* derived,
+                int minBits) {
   reader->state.bits = buffer;
   reader->state.left = bitsLeft;
-  if (bitsLeft <= kMaxCodeLength && !PELOJ_ReadBits(reader, buffer, bitsLeft, minBits)) return -1;
+  if (bitsLeft <= kMaxCodeLength && !refill_bits(reader, buffer, bitsLeft, minBits)) return -1;
   return static_cast<int>(match_code(*reader, *derived, minBits < 1 ? 1 : minBits));
 }
+
+}  // namespace pelo::jpeg

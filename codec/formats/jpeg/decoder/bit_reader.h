@@ -63,7 +63,9 @@ void close_bits(PELOJ_JDINFO& jd, const BitReader& reader);
 BitReader fill_by_bytes(BitReader reader);
 
 // True when any byte of the word is 0xFF: the zero-byte test of A. Mycroft on the complement.
-constexpr bool has_ff(uint32_t word) { return ((~word - 0x01010101u) & word & 0x80808080u) != 0; }
+constexpr bool has_ff(uint32_t word) {
+  return ((~word - 0x01010101u) & word & 0x80808080u) != 0;
+}
 
 inline void BitReader::fill() {
   if (state.left >= kFilledBits) return;
@@ -94,14 +96,13 @@ inline uint32_t decode_symbol(BitReader& reader, const DerivedTable& table) {
   return decode_long_code(reader, table);
 }
 
-}  // namespace pelo::jpeg
-
 // Refills reader->state from the given buffer and count. 1: the state holds `needed` bits, or zeros in
 // place of those that a marker cut off; 0: the source ended and fewer than `needed` bits are real.
-TAVIRPELO_API int PELOJ_ReadBits(pelo::jpeg::BitReader* reader, pelo::jpeg::BitBuffer buffer, int bitsLeft,
-                                 int needed);
+int refill_bits(pelo::jpeg::BitReader* reader, pelo::jpeg::BitBuffer buffer, int bitsLeft, int needed);
 
 // Decodes one symbol from the given buffer and count, trying code lengths from minBits on; 0 for a code
 // longer than 16 bits, -1 when the source failed. The reader's state stands behind the code.
-TAVIRPELO_API int PELOJ_DecodeHuffMan(pelo::jpeg::BitReader* reader, pelo::jpeg::BitBuffer buffer,
-                                      int bitsLeft, const pelo::jpeg::DerivedTable* derived, int minBits);
+int decode_code(pelo::jpeg::BitReader* reader, pelo::jpeg::BitBuffer buffer, int bitsLeft,
+                const pelo::jpeg::DerivedTable* derived, int minBits);
+
+}  // namespace pelo::jpeg

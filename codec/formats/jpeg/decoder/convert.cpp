@@ -10,28 +10,28 @@ namespace {
 // What the channels of a full-grid row are, and the writers they go to.
 struct YccRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
-    PELOJ_YcbcrWriteOutput1to1(&jd, row.plane[0], row.plane[1], row.plane[2], count);
+    write_ycc_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    PELOJ_YcbcrWriteOutput(&jd, jd.accumulator.data(), jd.targetWidth);
+    write_ycc_sums(&jd, jd.accumulator.data(), jd.targetWidth);
   }
   static constexpr bool kGrey = false;
 };
 struct RgbRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
-    PELOJ_RGBWriteOutput1to1(&jd, row.plane[0], row.plane[1], row.plane[2], count);
+    write_rgb_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    PELOJ_RGBWriteOutput(&jd, jd.accumulator.data(), jd.targetWidth);
+    write_rgb_sums(&jd, jd.accumulator.data(), jd.targetWidth);
   }
   static constexpr bool kGrey = false;
 };
 struct GreyRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
-    PELOJ_GrayWriteOutput1to1(&jd, row.plane[0], count);
+    write_grey_row(&jd, row.plane[0], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    PELOJ_GrayWriteOutput(&jd, jd.accumulator.data(), jd.targetWidth);
+    write_grey_sums(&jd, jd.accumulator.data(), jd.targetWidth);
   }
   static constexpr bool kGrey = true;
 };
@@ -40,7 +40,8 @@ struct GreyRows {
 GridRow grid_row(const PELOJ_JDINFO& jd, int row) {
   GridRow grid{};
   for (int c = 0; c < jd.componentCount; ++c) {
-    grid.plane[c] = (*jd.components)[static_cast<size_t>(c)].colourRows[jd.readPosition + row] + jd.cropX;
+    grid.plane[c] =
+        (*jd.components)[static_cast<size_t>(c)].colourRows[jd.readPosition + row] + jd.cropX;
   }
   return grid;
 }
@@ -48,8 +49,7 @@ GridRow grid_row(const PELOJ_JDINFO& jd, int row) {
 // True when an input row holds the sample point with offset q of output row y:
 // 0 <= y * inH + q - i * outH < outH.
 bool holds_point(const PELOJ_JDINFO& jd, int inputRow, int outputRow, int q) {
-  const int64_t distance =
-      int64_t{outputRow} * jd.usedHeight + q - int64_t{inputRow} * jd.targetHeight;
+  const int64_t distance = int64_t{outputRow} * jd.usedHeight + q - int64_t{inputRow} * jd.targetHeight;
   return distance >= 0 && distance < jd.targetHeight;
 }
 bool holds_quarter(const PELOJ_JDINFO& jd, int outputRow) {
@@ -147,7 +147,7 @@ void convert_picking(PELOJ_JDINFO& jd, int rows) {
 }
 
 bool picks_centres(const PELOJ_JDINFO& jd) {
-  return jd.convert == PELOJ_DoFastYcbcrToRgb || jd.convert == PELOJ_DoFastYcbcrToUpscaleRgb;
+  return jd.convert == pick_ycc || jd.convert == pick_enlarging_ycc;
 }
 
 // Small pictures, coarse modes, and in mode 1 pictures that hardly shrink take the fast converter.
@@ -169,16 +169,16 @@ bool choose_converter(PELOJ_JDINFO& jd) {
   switch (jd.colourSpace) {
     case ColourSpace::kYcc:
       if (larger) {
-        jd.convert = jd.decMode >= 2 ? PELOJ_DoFastYcbcrToUpscaleRgb : PELOJ_DoYcbcrToUpscaleRgb;
+        jd.convert = jd.decMode >= 2 ? pick_enlarging_ycc : enlarge_ycc;
       } else {
-        jd.convert = wants_fast(jd) ? PELOJ_DoFastYcbcrToRgb : PELOJ_DoYcbcrToRgb;
+        jd.convert = wants_fast(jd) ? pick_ycc : average_ycc;
       }
       return true;
     case ColourSpace::kGrey:
-      jd.convert = larger ? PELOJ_DoGrayUpscaleConvert : PELOJ_DoGrayConvert;
+      jd.convert = larger ? enlarge_grey : average_grey;
       return true;
     case ColourSpace::kRgb:
-      jd.convert = larger ? PELOJ_DoRgbUpscaleConvert : PELOJ_DoRgbConvert;
+      jd.convert = larger ? enlarge_rgb : average_rgb;
       return true;
     default:
       return false;
@@ -203,25 +203,29 @@ bool prepare_resampling(PELOJ_JDINFO& jd) {
   return picks || jd.accumulator.allocate(width);
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows) { convert_averaging<YccRows>(*jdInfo, rows); }
-void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows) {
+void average_ycc(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_averaging<YccRows>(*jdInfo, rows);
+}
+void enlarge_ycc(PELOJ_JDINFO* jdInfo, int rows) {
   convert_enlarging<YccRows>(*jdInfo, rows);
 }
-void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows) {
-  convert_picking<PELOJ_FastYcbcrWriteOutput>(*jdInfo, rows);
+void pick_ycc(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_picking<write_picked_row>(*jdInfo, rows);
 }
-void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows) {
-  convert_picking<PELOJ_FastYcbcrUpscaleWriteOutput>(*jdInfo, rows);
+void pick_enlarging_ycc(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_picking<write_picked_enlarged_row>(*jdInfo, rows);
 }
-void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, int rows) { convert_averaging<GreyRows>(*jdInfo, rows); }
-void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows) {
+void average_grey(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_averaging<GreyRows>(*jdInfo, rows);
+}
+void enlarge_grey(PELOJ_JDINFO* jdInfo, int rows) {
   convert_enlarging<GreyRows>(*jdInfo, rows);
 }
-void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, int rows) { convert_averaging<RgbRows>(*jdInfo, rows); }
-void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows) {
+void average_rgb(PELOJ_JDINFO* jdInfo, int rows) {
+  convert_averaging<RgbRows>(*jdInfo, rows);
+}
+void enlarge_rgb(PELOJ_JDINFO* jdInfo, int rows) {
   convert_enlarging<RgbRows>(*jdInfo, rows);
 }
+
+}  // namespace pelo::jpeg

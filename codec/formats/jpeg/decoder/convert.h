@@ -7,20 +7,20 @@
 
 #include "codec/formats/jpeg/decoder/jd_info.h"
 
-// Each converts `rows` rows of the current row group from the read position on. The plain members and the
-// fast enlarging one finish their rows in one call; the averaging enlarging ones return after every output
-// row. All clear the continue flag when the input row is used up, and keep it, one row a call, when the
-// band of output rows is full before.
-TAVIRPELO_API void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows);
-
 namespace pelo::jpeg {
+
+// Each converts `rows` rows of the current row group from the read position on. The plain members and
+// the fast enlarging one finish their rows in one call; the averaging enlarging ones return after every
+// output row. All clear the continue flag when the input row is used up, and keep it, one row a call,
+// when the band of output rows is full before.
+void average_ycc(PELOJ_JDINFO* jdInfo, int rows);
+void enlarge_ycc(PELOJ_JDINFO* jdInfo, int rows);
+void pick_ycc(PELOJ_JDINFO* jdInfo, int rows);
+void pick_enlarging_ycc(PELOJ_JDINFO* jdInfo, int rows);
+void average_grey(PELOJ_JDINFO* jdInfo, int rows);
+void enlarge_grey(PELOJ_JDINFO* jdInfo, int rows);
+void average_rgb(PELOJ_JDINFO* jdInfo, int rows);
+void enlarge_rgb(PELOJ_JDINFO* jdInfo, int rows);
 
 // Picks the converter of the state's colour space, sizes and decode mode; false for a colour space that
 // has none.

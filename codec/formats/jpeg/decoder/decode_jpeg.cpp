@@ -16,7 +16,7 @@ struct Request {
 // The thumbnail's header scan; nothing is present when the file's own scan fails.
 PELOJ_FILEHEADER scan_header(PELOJ_SOURCE& source) {
   PELOJ_FILEHEADER header{};
-  if (PELOJ_ParseFileHeader(&source, kScanMode, &header) != PELOJ_OK) header = {};
+  if (scan_file_header(&source, kScanMode, &header) != PELOJ_OK) header = {};
   return header;
 }
 
@@ -27,9 +27,10 @@ bool large_enough(PELOJ_SOURCE& source, PELOJ_THUMBNAIL& thumbnail, const Reques
     return thumbnail.width != 0 && thumbnail.height != 0 && request.width < thumbnail.width &&
            request.height < thumbnail.height;
   }
-  if (thumbnail.type != PELOJ_THUMBNAIL_JPEG || !source_reposition(source, thumbnail.offset)) return false;
+  if (thumbnail.type != PELOJ_THUMBNAIL_JPEG || !source_reposition(source, thumbnail.offset))
+    return false;
   PELOJ_FILEHEADER header{};
-  if (PELOJ_ParseFileHeader(&source, kScanMode, &header) != PELOJ_OK) return false;
+  if (scan_file_header(&source, kScanMode, &header) != PELOJ_OK) return false;
   thumbnail.width = header.width;
   thumbnail.height = header.height;
   return header.width != 0 && header.height != 0 && request.width <= header.width &&
@@ -52,7 +53,7 @@ bool decode_at(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, uint32_t offset
   }
   decInfo.imageWidth = imageWidth;
   decInfo.imageHeight = imageHeight;
-  return PELOJ_ValorenDecodeFrame(&decInfo, &source, request.buffer, request.width, request.height) != 0;
+  return decode_frame(&decInfo, &source, request.buffer, request.width, request.height) != 0;
 }
 
 // The thumbnail turned to the main picture's orientation, when the two differ.
@@ -60,13 +61,14 @@ bool decode_turned(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const PELOJ
                    const Request& request) {
   const PELOJ_THUMBNAIL& thumbnail = header.thumbnail;
   const bool portrait = header.height > header.width;
-  const bool differs = portrait ? thumbnail.width > thumbnail.height : thumbnail.height > thumbnail.width;
+  const bool differs =
+      portrait ? thumbnail.width > thumbnail.height : thumbnail.height > thumbnail.width;
   if (!differs) {
     return decode_at(decInfo, source, thumbnail.offset, thumbnail.width, thumbnail.height, request);
   }
   const Request transposed{request.buffer, request.height, request.width};
   return decode_at(decInfo, source, thumbnail.offset, thumbnail.width, thumbnail.height, transposed) &&
-         PELOJ_RotateImage90(request.buffer, request.height, request.width, decInfo.outFormat) != 0;
+         rotate_buffer_90(request.buffer, request.height, request.width, decInfo.outFormat) != 0;
 }
 
 bool decode(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const Request& request) {
@@ -107,12 +109,7 @@ bool open_source(TAVIRPELO_DECINFO& decInfo, BufferedSource& source) {
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-int TAVIRPELO_DecodeJPEG(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight) {
+int decode(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight) {
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr || outBuffer == nullptr) {
     record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NULL);
@@ -129,9 +126,10 @@ int TAVIRPELO_DecodeJPEG(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWid
   return 0;
 }
 
-int PELOJ_DecodeThumbnail(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight,
-                          int* outWidth, int* outHeight) {
-  if (decInfo == nullptr || outBuffer == nullptr || outWidth == nullptr || outHeight == nullptr) return 0;
+int decode_thumbnail(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight,
+                     int* outWidth, int* outHeight) {
+  if (decInfo == nullptr || outBuffer == nullptr || outWidth == nullptr || outHeight == nullptr)
+    return 0;
   *outWidth = *outHeight = 0;
   if (reqWidth < 1 || reqHeight < 1) return 0;
   BufferedSource source;
@@ -141,17 +139,17 @@ int PELOJ_DecodeThumbnail(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWi
     decInfo->option = (decInfo->option & ~0xF00u) | TAVIRPELO_FIT_TIGHT;
     if (decode_at(*decInfo, *source.get(), thumbnail.offset, thumbnail.width, thumbnail.height,
                   {outBuffer, reqWidth, reqHeight})) {
-      return PELOJ_GetDecSize(decInfo, outWidth, outHeight);
+      return produced_size(decInfo, outWidth, outHeight);
     }
   }
   log_error("TAVIRPELO_DecodeJPEG : decode Fail");
   return 0;
 }
 
-int PELOJ_DecodeUncompressThumbnail(void) { return 1; }
-
-int PELOJ_GetDecSize(const TAVIRPELO_DECINFO* decInfo, int* width, int* height) {
+int produced_size(const TAVIRPELO_DECINFO* decInfo, int* width, int* height) {
   *width = decInfo->outWidth;
   *height = decInfo->outHeight;
   return 1;
 }
+
+}  // namespace pelo::jpeg

@@ -1,6 +1,6 @@
-#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/convert.h"
 #include "codec/formats/jpeg/decoder/decode_size.h"
 #include "codec/formats/jpeg/decoder/markers.h"
@@ -20,7 +20,9 @@ int fail(const char* text) {
   return PELOJ_FAIL;
 }
 
-int divide_up(int64_t a, int64_t b) { return static_cast<int>((a + b - 1) / b); }
+int divide_up(int64_t a, int64_t b) {
+  return static_cast<int>((a + b - 1) / b);
+}
 
 // Blocks and samples of a component in the picture (T.81 A.1.1, A.2.4).
 void lay_out(const PELOJ_JDINFO& jd, Component& component) {
@@ -50,7 +52,7 @@ void take_wishes(PELOJ_JDINFO& jd, TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* sou
 
 // Headers to output position; false with a line in the log.
 bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
-  const int parsed = PELOJ_ParseHeader(&jd, 0);
+  const int parsed = parse_header(&jd, 0);
   request.imageWidth = jd.imageWidth;
   request.imageHeight = jd.imageHeight;
   request.componentCount = jd.componentCount;
@@ -59,7 +61,7 @@ bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
     return log_error("PELOJ_Initialize : image width, hegiht is zero"), false;
   }
   choose_sizes(jd, jd.decInfo->option);
-  if (PELOJ_StartDecompression(&jd) != PELOJ_OK) {
+  if (start_decompression(&jd) != PELOJ_OK) {
     return log_error("PELOJ_Initialize : PELOJ_StartDecompression fail"), false;
   }
   jd.decInfo->outWidth = jd.outWidth;
@@ -118,12 +120,7 @@ int decode_rows(PELOJ_JDINFO& jd) {
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-void PELOJ_DeleteDecoderInfo(PELOJ_JDINFO* jdInfo) {
+void clear_decoder(PELOJ_JDINFO* jdInfo) {
   if (jdInfo == nullptr) return;
   const int width = jdInfo->imageWidth;
   const int height = jdInfo->imageHeight;
@@ -136,7 +133,7 @@ void PELOJ_DeleteDecoderInfo(PELOJ_JDINFO* jdInfo) {
   jdInfo->componentCount = components;
 }
 
-int PELOJ_StartDecompression(PELOJ_JDINFO* jdInfo) {
+int start_decompression(PELOJ_JDINFO* jdInfo) {
   if (!choose_converter(*jdInfo)) {
     return fail("PELOJ_StartDecompression : unsupported color space");
   }
@@ -144,23 +141,24 @@ int PELOJ_StartDecompression(PELOJ_JDINFO* jdInfo) {
     lay_out(*jdInfo, (*jdInfo->components)[static_cast<size_t>(c)]);
   }
   jdInfo->imcuRows = divide_up(jdInfo->imageHeight, 8 * jdInfo->vMax);
-  if (PELOJ_InitUpsampler(jdInfo) != PELOJ_OK) {
+  if (prepare_upsampling(jdInfo) != PELOJ_OK) {
     return fail("PELOJ_StartDecompression : PELOJ_InitUpsampler fail");
   }
-  if (PELOJ_InitDecBeforeScan(jdInfo) != PELOJ_OK) {
+  if (prepare_before_scan(jdInfo) != PELOJ_OK) {
     return fail("PELOJ_StartDecompression : PELOJ_InitDecBeforeScan fail");
   }
   return PELOJ_OK;
 }
 
-PELOJ_JDINFO* PELOJ_Initialize(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
+PELOJ_JDINFO* initialize_decoder(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source,
+                                 PELOJ_REQUEST* request) {
   int error = TAVIRPELO_ERROR_NONE;
   Decoder decoder = start(*decInfo, source, *request, error);
   if (error == TAVIRPELO_ERROR_MEMORY) record_error(ErrorWord::kDecoding, error);
   return decoder.release();
 }
 
-int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
+int decode_image(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request) {
   int error = TAVIRPELO_ERROR_DECODE;
   const Decoder decoder = start(*decInfo, source, *request, error);
   if (!decoder || !first_scan_suffices(*decoder)) {
@@ -170,10 +168,12 @@ int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_RE
   return decode_rows(*decoder);
 }
 
-int PELOJ_ValorenDecodeFrame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, void* outBuffer,
-                             int reqWidth, int reqHeight) {
+int decode_frame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, void* outBuffer, int reqWidth,
+                 int reqHeight) {
   PELOJ_REQUEST request{outBuffer, reqWidth, reqHeight, 0, 0, 0};
-  if (PELOJ_DecodeImage(decInfo, source, &request) == PELOJ_OK) return 1;
+  if (decode_image(decInfo, source, &request) == PELOJ_OK) return 1;
   log_error("PELOJ_ValorenDecodeFrame : PELOJ_DecodeImage fail");
   return 0;
 }
+
+}  // namespace pelo::jpeg

@@ -12,26 +12,33 @@ typedef struct PELOJ_REQUEST {
   int componentCount;
 } PELOJ_REQUEST;
 
-// Parses the headers, chooses sizes and scale and prepares the first scan. The state is the caller's: end
-// it with PELOJ_DeleteDecoderInfo and TAVIRPELO_OsFree (or pelo::jpeg::Decoder). Null on failure.
-TAVIRPELO_API PELOJ_JDINFO* PELOJ_Initialize(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source,
-                                             PELOJ_REQUEST* request);
+namespace pelo::jpeg {
+
+// Parses the headers, chooses sizes and scale and prepares the first scan. The state is the caller's:
+// end it with clear_decoder and TAVIRPELO_OsFree (or pelo::jpeg::Decoder). Null on failure.
+PELOJ_JDINFO* initialize_decoder(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source,
+                                 PELOJ_REQUEST* request);
 
 // Chooses the converter, lays out the components, prepares upsampler and scan. 200 or 201.
-TAVIRPELO_API int PELOJ_StartDecompression(PELOJ_JDINFO* jdInfo);
+int start_decompression(PELOJ_JDINFO* jdInfo);
 
 // Decodes a picture from the source's position. 200; 201; 0 when the data ends before the first wanted
 // row.
-TAVIRPELO_API int PELOJ_DecodeImage(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source,
-                                    PELOJ_REQUEST* request);
+int decode_image(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST* request);
 
 // The same for a caller's buffer; 1 or 0.
-TAVIRPELO_API int PELOJ_ValorenDecodeFrame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source,
-                                           void* outBuffer, int reqWidth, int reqHeight);
-
-namespace pelo::jpeg {
+int decode_frame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, void* outBuffer, int reqWidth,
+                 int reqHeight);
 
 // Owns a decoder state.
 using Decoder = OsPtr<PELOJ_JDINFO>;
+
+// Behind the given names of the public headers, which say what they do.
+int decode(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight);
+int decode_thumbnail(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHeight,
+                     int* outWidth, int* outHeight);
+int produced_size(const TAVIRPELO_DECINFO* decInfo, int* width, int* height);
+int rotate_buffer_90(void* buffer, int width, int height, int outFormat);
+int rotate_buffer_270(void* buffer, int width, int height, int outFormat);
 
 }  // namespace pelo::jpeg

@@ -81,13 +81,8 @@ bool build_skip_table(DerivedTable& table) {
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
-                            const DerivedTable** derivedOut, EntropyState* entropy) {
+int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedTable** derivedOut,
+                 EntropyState* entropy) {
   if (tableNumber < 0 || tableNumber > 3) return PELOJ_FAIL;
   const auto number = static_cast<size_t>(tableNumber);
   const HuffmanSpec* raw = isDC ? jdInfo->dcRaw[number] : jdInfo->acRaw[number];
@@ -115,3 +110,5 @@ int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
   jdInfo->derivedPool[jdInfo->derivedCount++] = std::move(table);
   return PELOJ_OK;
 }
+
+}  // namespace pelo::jpeg

@@ -28,8 +28,12 @@ constexpr int kSkipBits = 12;
 constexpr uint32_t kSkipSize = 1u << kSkipBits;
 using SkipTable = std::array<uint32_t, kSkipSize>;
 constexpr uint32_t kSkipEndOfBlock = 1u << 23;
-constexpr uint32_t skip_used(uint32_t entry) { return entry & 0xFFFF; }
-constexpr int skip_advance(uint32_t entry) { return static_cast<int>(entry >> 16 & 0x7F); }
+constexpr uint32_t skip_used(uint32_t entry) {
+  return entry & 0xFFFF;
+}
+constexpr int skip_advance(uint32_t entry) {
+  return static_cast<int>(entry >> 16 & 0x7F);
+}
 
 struct DerivedTable {
   std::array<int32_t, kMaxCodeLength + 2> maxcode;    // largest code of each length, -1 for none;
@@ -46,11 +50,10 @@ struct DerivedTable {
 
 struct EntropyState;
 
-}  // namespace pelo::jpeg
-
 // Makes the table of a class and number ready for a scan. It lives in the state's pool and goes to
 // *derivedOut, its skip table, where it has one, to `entropy`. 200; 201 when there is nothing to derive
 // from or memory is short; 0 when no encoder can have meant the table (T.81 C.2, F.1.2.1.1).
-TAVIRPELO_API int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
-                                          const pelo::jpeg::DerivedTable** derivedOut,
-                                          pelo::jpeg::EntropyState* entropy);
+int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
+                 const pelo::jpeg::DerivedTable** derivedOut, pelo::jpeg::EntropyState* entropy);
+
+}  // namespace pelo::jpeg

@@ -24,8 +24,8 @@ uint8_t idct_dc(int32_t multiplier, int32_t dc);
 
 }  // namespace pelo::jpeg
 
-#define PELOJ_IDCT(name)                                                                             \
-  TAVIRPELO_API void name(const uint8_t* range, const int32_t* multiplier, const int32_t* block,     \
+#define PELOJ_IDCT(name)                                                                         \
+  TAVIRPELO_API void name(const uint8_t* range, const int32_t* multiplier, const int32_t* block, \
                           uint8_t* const* rows, int column)
 
 // 8x8 samples; NByM reads the first M rows and N columns of coefficients, 2By2 chooses between 1By2 and

@@ -49,8 +49,8 @@ inline void store_samples(const Lanes (&x)[8], uint8_t* const* rows, int column)
   ShortLanes samples[8];
   for (int i = 0; i < 8; ++i) {
     Lanes v = (x[i] >> 5) + 128;
-    v &= ~(v >> 31);                // below 0
-    v |= (Lanes{} + 255 - v) >> 31; // above 255: all bits of the byte
+    v &= ~(v >> 31);                 // below 0
+    v |= (Lanes{} + 255 - v) >> 31;  // above 255: all bits of the byte
     samples[i] = __builtin_convertvector(v & 255, ShortLanes);
   }
   transpose(samples);
@@ -62,7 +62,8 @@ inline void store_samples(const Lanes (&x)[8], uint8_t* const* rows, int column)
 
 // Reads the first N x N coefficients.
 template <int N>
-void transform_square(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+void transform_square(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows,
+                      int column) {
   Lanes x[8];
   if (!dequantise_lanes<N>(multiplier, block, x)) {
     for (int r = 0; r < N; ++r) {
@@ -81,7 +82,8 @@ inline void fill_rows(uint8_t sample, uint8_t* const* rows, int column) {
 }
 
 // Rows that are flat each: there is no horizontal detail.
-void transform_column(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+void transform_column(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows,
+                      int column) {
   int32_t x[8] = {dequantise(block[0], multiplier[0]), dequantise(block[8], multiplier[8])};
   butterfly3(x);
   for (int r = 0; r < 8; ++r) std::memset(rows[r] + column, to_sample(x[r]), 8);
@@ -98,7 +100,9 @@ void transform_row(const int32_t* multiplier, const int32_t* block, uint8_t* con
 
 }  // namespace
 
-uint8_t idct_dc(int32_t multiplier, int32_t dc) { return to_sample(dequantise(dc, multiplier)); }
+uint8_t idct_dc(int32_t multiplier, int32_t dc) {
+  return to_sample(dequantise(dc, multiplier));
+}
 
 InverseDct idct_full(int lastPosition) {
   if (lastPosition == 0) return PELOJ_DoIdct1By1;

@@ -74,7 +74,8 @@ void PELOJ_DoIdct1x2For4x4(const uint8_t*, const int32_t* multiplier, const int3
 void PELOJ_DoIdct2x2For4x4(const uint8_t* range, const int32_t* multiplier, const int32_t* block,
                            uint8_t* const* rows, int column) {
   const bool noHorizontal = block[1] == 0 && block[9] == 0;
-  (noHorizontal ? PELOJ_DoIdct1x2For4x4 : PELOJ_DoIdct2x2AllFor4x4)(range, multiplier, block, rows, column);
+  (noHorizontal ? PELOJ_DoIdct1x2For4x4 : PELOJ_DoIdct2x2AllFor4x4)(range, multiplier, block, rows,
+                                                                    column);
 }
 void PELOJ_DoIdct1x1For4x4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
                            uint8_t* const* rows, int column) {

@@ -27,7 +27,9 @@ inline uint8_t clamp_byte(int32_t value) {
 }
 
 // A transform result as a sample: five fraction bits dropped, level shift.
-inline uint8_t to_sample(int32_t value) { return clamp_byte((value >> 5) + 128); }
+inline uint8_t to_sample(int32_t value) {
+  return clamp_byte((value >> 5) + 128);
+}
 
 // The last step of the 8-point transforms: even part plus and minus odd part.
 template <class Vector>

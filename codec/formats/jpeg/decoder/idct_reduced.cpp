@@ -61,8 +61,12 @@ inline void row_8to3(int32_t r0, int32_t r1, int32_t r2, uint8_t* out) {
   out[2] = mean(s - r1, u - w);
 }
 
-inline int32_t p_4to1(int32_t x) { return scaled(x, 473) - x; }
-inline int32_t q_4to1(int32_t x) { return scaled(x, 362) + x - scaled(x, 473); }
+inline int32_t p_4to1(int32_t x) {
+  return scaled(x, 473) - x;
+}
+inline int32_t q_4to1(int32_t x) {
+  return scaled(x, 362) + x - scaled(x, 473);
+}
 
 inline void row_4to1(int32_t a, int32_t b, uint8_t* out) {
   out[0] = mean(a - scaled(b, 277) + scaled(b, 473) - q_4to1(b), a + p_4to1(b));

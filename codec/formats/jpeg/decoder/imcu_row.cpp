@@ -89,8 +89,8 @@ template <class Size>
 bool decode_scan_rows(PELOJ_JDINFO& jd, DecodeMcu decode) {
   for (size_t i = 0; i < jd.scanCount; ++i) {
     ScanRecord* record = jd.scans[i].get();
-    if (!PELOJ_LoadScanInfo(&jd, record) || !decode_scan_row<Size>(jd, decode)) return false;
-    PELOJ_SaveScanInfo(&jd, record);
+    if (!load_scan(&jd, record) || !decode_scan_row<Size>(jd, decode)) return false;
+    save_scan(&jd, record);
   }
   return true;
 }
@@ -105,35 +105,33 @@ int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
     return PELOJ_ROW_FAIL;
   }
   if (++jd.imcuRow >= jd.imcuRows) return PELOJ_IMAGE_DONE;
-  PELOJ_SetupiMcu(&jd);
+  begin_imcu_row(&jd);
   return PELOJ_ROW_DONE;
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo) {
-  return decode_imcu_row<FullSize>(*jdInfo, jdInfo->requantise ? PELOJ_FastDecodeMcu : PELOJ_DecodeMcu,
+int decode_imcu_row(PELOJ_JDINFO* jdInfo) {
+  return decode_imcu_row<FullSize>(*jdInfo,
+                                   jdInfo->requantise ? decode_mcu_requantised : decode_mcu_full,
                                    "PELOJ_DecodeSingleiMcu : PELOJ_DecodeMcu fail");
 }
 
-int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo) {
+int decode_imcu_row_scaled(PELOJ_JDINFO* jdInfo) {
   if (jdInfo->scale == kHalf) {
-    return decode_imcu_row<HalfSize>(*jdInfo, PELOJ_DecodeMcu_2to1,
+    return decode_imcu_row<HalfSize>(*jdInfo, decode_mcu_half,
                                      "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_2to1 fail");
   }
   if (jdInfo->scale == kThreeEighths) {
-    return decode_imcu_row<ThreeEighthsSize>(*jdInfo, PELOJ_DecodeMcu_8to3,
-                                             "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_8to3 fail");
+    return decode_imcu_row<ThreeEighthsSize>(
+        *jdInfo, decode_mcu_three_eighths, "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_8to3 fail");
   }
   if (jdInfo->scale == kQuarter) {
-    return decode_imcu_row<QuarterSize>(*jdInfo, PELOJ_DecodeMcu_4to1,
+    return decode_imcu_row<QuarterSize>(*jdInfo, decode_mcu_quarter,
                                         "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_4to1 fail");
   }
   // A progressive picture's first scan is all that an eighth of its size needs.
-  return decode_imcu_row<EighthSize>(*jdInfo,
-                                     is_progressive(*jdInfo) ? PELOJ_ProgDecodeMcu : PELOJ_DecodeMcu8to1,
+  return decode_imcu_row<EighthSize>(*jdInfo, is_progressive(*jdInfo) ? decode_mcu_first : decode_mcu_dc,
                                      "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu8to1 fail");
 }
+
+}  // namespace pelo::jpeg

@@ -3,7 +3,11 @@
 
 #include "codec/formats/jpeg/decoder/jd_info.h"
 
+namespace pelo::jpeg {
+
 // Full size, and reduced scales. 100: done, more rows; 101: the last row, or the data ended within the
 // last 16 rows to be shown (then the row is not counted); 102: failed.
-TAVIRPELO_API int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo);
-TAVIRPELO_API int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo);
+int decode_imcu_row(PELOJ_JDINFO* jdInfo);
+int decode_imcu_row_scaled(PELOJ_JDINFO* jdInfo);
+
+}  // namespace pelo::jpeg

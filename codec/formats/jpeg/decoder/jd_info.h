@@ -1,5 +1,5 @@
 // The JPEG decoder's state for one picture: headers, tables, entropy state, sample rows, resampling and
-// the output position. Made by PELOJ_Initialize, emptied by PELOJ_DeleteDecoderInfo.
+// the output position. Made by initialize_decoder, emptied by clear_decoder.
 #pragma once
 
 #include <array>
@@ -30,46 +30,46 @@ enum class FrameType : uint8_t { kNone = 0, kBaseline = 1, kProgressive = 2 };
 struct OsFreeDelete {
   void operator()(void* block) const { TAVIRPELO_OsFree(block); }
 };
-// Row pointers and the samples behind them, one allocation (PELOJ_AllocSampleArry).
+// Row pointers and the samples behind them, one allocation (allocate_rows).
 using SampleRows = std::unique_ptr<uint8_t*, OsFreeDelete>;
 
 struct QuantTable {
-  std::array<uint16_t, 64> value;       // natural order
-  std::array<int32_t, 64> correction;   // zig-zag order, 8192 = 1.0: stored to reference step
+  std::array<uint16_t, 64> value;      // natural order
+  std::array<int32_t, 64> correction;  // zig-zag order, 8192 = 1.0: stored to reference step
 };
 
 // A component of the frame (T.81 B.2.2), and its layout in the picture.
 struct Component {
   uint8_t id;
-  uint8_t index;          // in frame order
-  uint8_t h, v;           // sampling factors
+  uint8_t index;  // in frame order
+  uint8_t h, v;   // sampling factors
   uint8_t quantTable;
   uint8_t dcTable, acTable;
   int blocksWide, blocksHigh;
   int downsampledWidth, downsampledHeight;  // samples
-  int scaledWidth;        // downsampled width at the decode scale
+  int scaledWidth;                          // downsampled width at the decode scale
   int mcuWidth, mcuHeight, mcuBlocks;       // blocks of one MCU of the current scan
   int lastColumnWidth, lastRowHeight;       // blocks of the last MCU inside the picture
   uint8_t hExpand, vExpand;                 // replication to the full grid
   void (*upsample)(PELOJ_JDINFO*, Component*, uint8_t**, uint8_t***);
-  QuantTable* table;      // sequential: the one that its scan found
-  std::array<int32_t, 64> multiplier;       // dequantisation, natural order
-  SampleRows samples;     // one iMCU row
-  SampleRows colour;      // replicated rows; empty when the samples are used as they are
-  uint8_t* colourRows[kMaxSampling];        // the current row group on the full grid
+  QuantTable* table;                   // sequential: the one that its scan found
+  std::array<int32_t, 64> multiplier;  // dequantisation, natural order
+  SampleRows samples;                  // one iMCU row
+  SampleRows colour;                   // replicated rows; empty when the samples are used as they are
+  uint8_t* colourRows[kMaxSampling];   // the current row group on the full grid
 };
 
 struct MarkerRecord {
   int32_t discardedBytes;
-  uint8_t nextRestart;    // n of the RSTn expected next
+  uint8_t nextRestart;  // n of the RSTn expected next
   FrameType frameType;
   uint8_t sawSos, sawDht, sawDqt, sawApp0, sawApp14;
-  uint8_t transform;      // last byte of the last APP14
+  uint8_t transform;  // last byte of the last APP14
   std::array<uint8_t, kMaxComponents> componentIds;
 };
 
 struct EntropyState {
-  uint8_t insufficient;   // zeros were consumed in place of data: MCUs stay flat until a restart
+  uint8_t insufficient;  // zeros were consumed in place of data: MCUs stay flat until a restart
   BitState bits;
   std::array<uint32_t, kMaxComponents> lastDc;  // by scan position; unsigned, as hostile sums wrap
   uint32_t restartsToGo;
@@ -124,7 +124,7 @@ struct PELOJ_JDINFO {
   int hMax, vMax;
   pelo::jpeg::ColourSpace colourSpace;
   int imageWidth, imageHeight;
-  int restartInterval;    // MCUs; 0: none
+  int restartInterval;  // MCUs; 0: none
   pelo::OsPtr<pelo::jpeg::MarkerRecord> marker;
   std::array<pelo::OsPtr<pelo::jpeg::QuantTable>, 4> quant;
   // Replaced between scans, but still some component's.
@@ -144,38 +144,38 @@ struct PELOJ_JDINFO {
 
   // Entropy decoding.
   pelo::OsPtr<pelo::jpeg::EntropyState> entropy;
-  uint8_t unreadMarker;   // second byte of a marker met in the data; 0: none
+  uint8_t unreadMarker;  // second byte of a marker met in the data; 0: none
   int mcuBlocks;
   std::array<uint8_t, pelo::jpeg::kMaxMcuBlocks> blockComponent;  // scan position
   std::array<uint8_t, pelo::jpeg::kMaxMcuBlocks> lastPosition;    // zig-zag, last non-zero coefficient
   pelo::OsBuffer<int32_t> coefficients;                           // one MCU
   std::array<int32_t*, pelo::jpeg::kMaxMcuBlocks> blocks;
-  int requantise;         // AC coefficients are brought to the reference steps while decoding
+  int requantise;  // AC coefficients are brought to the reference steps while decoding
 
   // Pictures in several scans.
   std::array<pelo::OsPtr<pelo::jpeg::ScanRecord>, pelo::jpeg::kMaxScans> scans;
-  size_t scanCount;       // 0 while the header's scan alone is read
-  int endIsMarker;        // the source's end counts as EOI; otherwise decoding fails there
-  uint32_t eobRun;        // blocks that an end-of-band code still covers (T.81 G.1.2.2)
+  size_t scanCount;  // 0 while the header's scan alone is read
+  int endIsMarker;   // the source's end counts as EOI; otherwise decoding fails there
+  uint32_t eobRun;   // blocks that an end-of-band code still covers (T.81 G.1.2.2)
   std::array<pelo::OsBuffer<int32_t>, pelo::jpeg::kMaxComponents> rowCoefficients;  // one iMCU row
 
   // Progress.
-  int mcusPerRow;         // of the current scan
-  int mcuRowsPerImcu;     // rows of MCUs in the current iMCU row
-  int imcuRows;           // in the picture
-  int imcuRow;            // decoded
-  int bufferFull;         // an iMCU row waits to be shown
+  int mcusPerRow;      // of the current scan
+  int mcuRowsPerImcu;  // rows of MCUs in the current iMCU row
+  int imcuRows;        // in the picture
+  int imcuRow;         // decoded
+  int bufferFull;      // an iMCU row waits to be shown
   int lastImcuDecoded;
-  int rowGroup;           // of that iMCU row, next to be replicated
-  int readPosition;       // rows of the current row group already converted
-  int rowsDone;           // full-grid rows handed to the converter, or skipped
-  int skipping;           // rows above the wanted region: no conversion
+  int rowGroup;      // of that iMCU row, next to be replicated
+  int readPosition;  // rows of the current row group already converted
+  int rowsDone;      // full-grid rows handed to the converter, or skipped
+  int skipping;      // rows above the wanted region: no conversion
 
   // Sizes.
   int bufferWidth, bufferHeight;
   int outWidth, outHeight;
   pelo::jpeg::Scale scale;
-  int exact;              // the scaled picture has the output size
+  int exact;  // the scaled picture has the output size
   int scaledWidth, scaledHeight;
   int usedWidth, usedHeight;
   int cropX, cropY;
@@ -183,12 +183,16 @@ struct PELOJ_JDINFO {
 
   // Conversion and output.
   void (*convert)(PELOJ_JDINFO*, int);
-  int continueFlag;       // the input row must still yield more output rows
+  int continueFlag;  // the input row must still yield more output rows
   int inputRow;
-  pelo::OsBuffer<uint32_t> accumulator;   // one output row of packed sums
-  pelo::OsBuffer<uint16_t> columns;       // sample columns of each output column
+  pelo::OsBuffer<uint32_t> accumulator;  // one output row of packed sums
+  pelo::OsBuffer<uint16_t> columns;      // sample columns of each output column
   pelo::jpeg::RowOutput output;
 };
 
+namespace pelo::jpeg {
+
 // Frees what the state owns and clears it; a second call does nothing.
-TAVIRPELO_API void PELOJ_DeleteDecoderInfo(PELOJ_JDINFO* jdInfo);
+void clear_decoder(PELOJ_JDINFO* jdInfo);
+
+}  // namespace pelo::jpeg

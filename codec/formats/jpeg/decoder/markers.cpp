@@ -7,9 +7,7 @@
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 using enum Marker;
@@ -178,14 +176,21 @@ bool read_scan(PELOJ_JDINFO& jd) {
 bool read_segment(PELOJ_JDINFO& jd, Marker code) {
   switch (code) {
     case kSof0:
-    case kSof2: return read_frame(jd, code);
-    case kDht: return read_huffman_tables(jd);
-    case kDqt: return read_quant_tables(jd);
-    case kDri: return read_restart_interval(jd);
-    case kSos: return read_scan(jd);
+    case kSof2:
+      return read_frame(jd, code);
+    case kDht:
+      return read_huffman_tables(jd);
+    case kDqt:
+      return read_quant_tables(jd);
+    case kDri:
+      return read_restart_interval(jd);
+    case kSos:
+      return read_scan(jd);
     case kDnl:
-    case kCom: return read_application(jd, code);
-    default: return code < kApp0 || code > kApp15 || read_application(jd, code);
+    case kCom:
+      return read_application(jd, code);
+    default:
+      return code < kApp0 || code > kApp15 || read_application(jd, code);
   }
 }
 
@@ -200,7 +205,8 @@ ColourSpace colour_space(const PELOJ_JDINFO& jd) {
     return marker.transform == 0 ? ColourSpace::kRgb : ColourSpace::kYcc;
   }
   using Ids = std::array<uint8_t, kMaxComponents>;
-  if (marker.componentIds == Ids{0, 1, 2} || marker.componentIds == Ids{1, 2, 3}) return ColourSpace::kYcc;
+  if (marker.componentIds == Ids{0, 1, 2} || marker.componentIds == Ids{1, 2, 3})
+    return ColourSpace::kYcc;
   return marker.componentIds == Ids{'R', 'G', 'B'} ? ColourSpace::kRgb : ColourSpace::kNone;
 }
 
@@ -209,7 +215,8 @@ bool parse_header(PELOJ_JDINFO& jd) {
   if (!jd.marker) return false;
   jd.marker->transform = 1;
   int status = PELOJ_FAIL;
-  if (!find_soi(*jd.source) || PELOJ_ParseNextMarker(&jd, &status) == static_cast<int>(kEoi) || status != PELOJ_OK) {
+  if (!find_soi(*jd.source) || parse_to_scan(&jd, &status) == static_cast<int>(kEoi) ||
+      status != PELOJ_OK) {
     return false;
   }
   jd.colourSpace = colour_space(jd);
@@ -219,7 +226,7 @@ bool parse_header(PELOJ_JDINFO& jd) {
 
 }  // namespace
 
-int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status) {
+int parse_to_scan(PELOJ_JDINFO* jdInfo, int* status) {
   *status = PELOJ_FAIL;
   uint8_t code = 0;
   while (next_marker(*jdInfo->source, code)) {
@@ -235,8 +242,10 @@ int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status) {
   return code;
 }
 
-int PELOJ_ParseHeader(PELOJ_JDINFO* jdInfo, int) {
+int parse_header(PELOJ_JDINFO* jdInfo, int) {
   if (parse_header(*jdInfo)) return PELOJ_OK;
-  PELOJ_DeleteDecoderInfo(jdInfo);
+  clear_decoder(jdInfo);
   return PELOJ_FAIL;
 }
+
+}  // namespace pelo::jpeg

@@ -4,9 +4,13 @@
 
 #include "codec/formats/jpeg/decoder/jd_info.h"
 
-// The headers of a picture: frame, tables, first scan, colour space. 200, or 201 with the state emptied.
-TAVIRPELO_API int PELOJ_ParseHeader(PELOJ_JDINFO* jdInfo, int unused);
+namespace pelo::jpeg {
 
-// Goes on to where the next scan's data begin. *status tells whether there are any (200) or the picture has
-// no further scan, or none that can be decoded (201); the answer is the marker that decided it.
-TAVIRPELO_API int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status);
+// The headers of a picture: frame, tables, first scan, colour space. 200, or 201 with the state emptied.
+int parse_header(PELOJ_JDINFO* jdInfo, int unused);
+
+// Goes on to where the next scan's data begin. *status tells whether there are any (200) or the picture
+// has no further scan, or none that can be decoded (201); the answer is the marker that decided it.
+int parse_to_scan(PELOJ_JDINFO* jdInfo, int* status);
+
+}  // namespace pelo::jpeg

@@ -6,8 +6,8 @@
 namespace pelo::jpeg {
 namespace {
 
-// What a member keeps: AC coefficients at zig-zag positions below kLimit; the rest of a block is skipped.
-// kRequantise brings values to the reference steps.
+// What a member keeps: AC coefficients at zig-zag positions below kLimit; the rest of a block is
+// skipped. kRequantise brings values to the reference steps.
 template <int Limit, bool Requantise = false>
 struct Keep {
   static constexpr int kLimit = Limit;
@@ -40,7 +40,8 @@ inline void store(const BlockContext& context, int32_t* block, int k, int32_t va
 // Decodes coefficients from position k on while it is below the member's limit. Returns the next
 // position, or 64 when the block has ended.
 template <class Member>
-inline int decode_kept(BitReader& reader, const BlockContext& context, int32_t* block, int k, int& last) {
+inline int decode_kept(BitReader& reader, const BlockContext& context, int32_t* block, int k,
+                       int& last) {
   const int end = Member::kWhole ? context.end + 1 : Member::kLimit;
   while (k < end) {
     reader.fill();
@@ -129,25 +130,23 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-int PELOJ_DecodeMcu(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_full(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return decode_mcu<Keep<64>>(*jdInfo, blocks);
 }
-int PELOJ_FastDecodeMcu(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_requantised(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return decode_mcu<Keep<64, true>>(*jdInfo, blocks);
 }
-int PELOJ_DecodeMcu_2to1(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_half(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return decode_mcu<Keep<19>>(*jdInfo, blocks);
 }
-int PELOJ_DecodeMcu_8to3(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_three_eighths(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return decode_mcu<Keep<9>>(*jdInfo, blocks);
 }
-int PELOJ_DecodeMcu_4to1(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_quarter(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return decode_mcu<Keep<5>>(*jdInfo, blocks);
 }
-int PELOJ_DecodeMcu8to1(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_dc(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return decode_mcu<Keep<1>>(*jdInfo, blocks);
 }
+
+}  // namespace pelo::jpeg

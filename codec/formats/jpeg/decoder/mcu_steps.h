@@ -23,7 +23,7 @@ inline int32_t decode_dc(BitReader& reader, const DerivedTable& table, uint32_t&
 // True when the MCU is to be decoded; otherwise `result` answers for it.
 inline bool begin_mcu(PELOJ_JDINFO& jd, int& result) {
   EntropyState& entropy = *jd.entropy;
-  if (jd.restartInterval != 0 && entropy.restartsToGo == 0 && !PELOJ_ProcessRestartMarker(&jd)) {
+  if (jd.restartInterval != 0 && entropy.restartsToGo == 0 && !process_restart(&jd)) {
     result = 0;
     return false;
   }

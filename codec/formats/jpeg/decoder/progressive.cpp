@@ -20,8 +20,8 @@ size_t stored_blocks_wide(const PELOJ_JDINFO& jd, const Component& component) {
 }  // namespace
 
 int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int column) {
-  const size_t block = static_cast<size_t>(row) * stored_blocks_wide(jd, component) +
-                       static_cast<size_t>(column);
+  const size_t block =
+      static_cast<size_t>(row) * stored_blocks_wide(jd, component) + static_cast<size_t>(column);
   return jd.rowCoefficients[component.index].data() + 64 * block;
 }
 
@@ -54,7 +54,7 @@ void point_blocks(PELOJ_JDINFO& jd, int mcu, int mcuRow) {
 bool decode_scan_row(PELOJ_JDINFO& jd) {
   // Nothing more comes of a scan that ended: a few bytes must not cost a visit to every block.
   if (jd.entropy->insufficient && jd.restartInterval == 0) return true;
-  const auto decode = jd.ah != 0 ? PELOJ_ProgDecodeMcuRefine : PELOJ_ProgDecodeMcu;
+  const auto decode = jd.ah != 0 ? decode_mcu_refine : decode_mcu_first;
   for (int row = 0; row < jd.mcuRowsPerImcu; ++row) {
     for (int mcu = 0; mcu < jd.mcusPerRow; ++mcu) {
       point_blocks(jd, mcu, row);
@@ -82,28 +82,23 @@ int decode_coefficient_row(PELOJ_JDINFO& jd) {
   }
   for (size_t i = 0; i < jd.scanCount; ++i) {
     ScanRecord* record = jd.scans[i].get();
-    if (!PELOJ_LoadScanInfo(&jd, record)) continue;
+    if (!load_scan(&jd, record)) continue;
     if (!decode_scan_row(jd)) {
       if (jd.usedHeight - jd.rowsDone < 16) return PELOJ_IMAGE_DONE;
       if (jd.ah == 0) log_error("PELOJ_ProgDecodeSingleiMcu : PELOJ_ProgDecodeMcu fail");
       return PELOJ_ROW_FAIL;
     }
-    PELOJ_SaveScanInfo(&jd, record);
+    save_scan(&jd, record);
   }
   return PELOJ_ROW_DONE;
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo) {
+int decode_progressive_row(PELOJ_JDINFO* jdInfo) {
   const int status = decode_coefficient_row(*jdInfo);
-  return status == PELOJ_ROW_DONE ? PELOJ_ProgIDct(jdInfo) : status;
+  return status == PELOJ_ROW_DONE ? transform_stored_row(jdInfo) : status;
 }
 
-int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo) {
+int transform_stored_row(PELOJ_JDINFO* jdInfo) {
   const InverseDct transform = jdInfo->scale == kFull   ? PELOJ_DoIdct
                                : jdInfo->scale == kHalf ? PELOJ_DoIdct_2to1
                                                         : PELOJ_DoIdct_4to1;
@@ -112,3 +107,5 @@ int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo) {
   }
   return ++jdInfo->imcuRow >= jdInfo->imcuRows ? PELOJ_IMAGE_DONE : PELOJ_ROW_DONE;
 }
+
+}  // namespace pelo::jpeg

@@ -4,17 +4,17 @@
 
 #include "codec/formats/jpeg/decoder/scan_list.h"
 
-// First pass and refinement of one MCU; 1, or 0 when the source failed.
-TAVIRPELO_API int PELOJ_ProgDecodeMcu(PELOJ_JDINFO* jdInfo, int32_t* const* blocks);
-TAVIRPELO_API int PELOJ_ProgDecodeMcuRefine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks);
+namespace pelo::jpeg {
 
-// All scans of the next iMCU row, then its inverse transform. As PELOJ_DecodeSingleiMcu.
-TAVIRPELO_API int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo);
+// First pass and refinement of one MCU; 1, or 0 when the source failed.
+int decode_mcu_first(PELOJ_JDINFO* jdInfo, int32_t* const* blocks);
+int decode_mcu_refine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks);
+
+// All scans of the next iMCU row, then its inverse transform. As decode_imcu_row.
+int decode_progressive_row(PELOJ_JDINFO* jdInfo);
 
 // Transforms the row's coefficients; 100, or 101 after the last row.
-TAVIRPELO_API int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo);
-
-namespace pelo::jpeg {
+int transform_stored_row(PELOJ_JDINFO* jdInfo);
 
 // False when that first scan is not a first pass over DC, without which the rest is nothing.
 inline bool first_scan_suffices(const PELOJ_JDINFO& jd) {

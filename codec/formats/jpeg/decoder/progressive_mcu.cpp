@@ -5,7 +5,9 @@
 namespace pelo::jpeg {
 namespace {
 
-int32_t shifted(int32_t value, int al) { return static_cast<int32_t>(static_cast<uint32_t>(value) << al); }
+int32_t shifted(int32_t value, int al) {
+  return static_cast<int32_t>(static_cast<uint32_t>(value) << al);
+}
 
 // The blocks that an end-of-band code with run category r covers, this one included.
 uint32_t eob_run(BitReader& reader, int r) {
@@ -102,11 +104,7 @@ void decode_dc_refine(PELOJ_JDINFO& jd, BitReader& reader, int32_t* const* block
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-int PELOJ_ProgDecodeMcu(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_first(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   int result;
   if (!begin_mcu(*jdInfo, result)) return result;
   BitReader reader = open_bits(*jdInfo);
@@ -118,7 +116,7 @@ int PELOJ_ProgDecodeMcu(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return end_mcu(*jdInfo, reader);
 }
 
-int PELOJ_ProgDecodeMcuRefine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
+int decode_mcu_refine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   int result;
   if (!begin_mcu(*jdInfo, result)) return result;
   BitReader reader = open_bits(*jdInfo);
@@ -129,3 +127,5 @@ int PELOJ_ProgDecodeMcuRefine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   }
   return end_mcu(*jdInfo, reader);
 }
+
+}  // namespace pelo::jpeg

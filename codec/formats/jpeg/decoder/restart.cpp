@@ -1,9 +1,7 @@
 // Restart markers of the entropy-coded data.
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 // Reads up to the next marker, which becomes the unread one. False at the end of the source.
@@ -31,7 +29,7 @@ bool scan_for_marker(PELOJ_JDINFO& jd) {
 
 }  // namespace
 
-int PELOJ_ProcessRestartMarker(PELOJ_JDINFO* jdInfo) {
+int process_restart(PELOJ_JDINFO* jdInfo) {
   EntropyState& entropy = *jdInfo->entropy;
   MarkerRecord& marker = *jdInfo->marker;
   const int real = entropy.bits.left - entropy.bits.invented;
@@ -50,3 +48,5 @@ int PELOJ_ProcessRestartMarker(PELOJ_JDINFO* jdInfo) {
   if (jdInfo->unreadMarker == 0) entropy.insufficient = 0;
   return 1;
 }
+
+}  // namespace pelo::jpeg

@@ -5,6 +5,7 @@
 #include "codec/pixel/packers.h"
 #include "tavirpelo/decode.h"
 
+namespace pelo::jpeg {
 namespace {
 
 // Through a second buffer: rows become columns, so that in place every pixel would chase another.
@@ -32,10 +33,12 @@ int rotate(void* buffer, int width, int height, int outFormat, bool clockwise) {
 
 }  // namespace
 
-int PELOJ_RotateImage90(void* buffer, int width, int height, int outFormat) {
+int rotate_buffer_90(void* buffer, int width, int height, int outFormat) {
   return rotate(buffer, width, height, outFormat, true);
 }
 
-int PELOJ_RotateImage270(void* buffer, int width, int height, int outFormat) {
+int rotate_buffer_270(void* buffer, int width, int height, int outFormat) {
   return rotate(buffer, width, height, outFormat, false);
 }
+
+}  // namespace pelo::jpeg

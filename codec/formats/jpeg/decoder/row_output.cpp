@@ -194,35 +194,33 @@ void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows) {
   output.rowStep = static_cast<ptrdiff_t>(int64_t{jd.bufferWidth} * size);
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-void PELOJ_YcbcrWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                                const uint8_t* cr, int count) {
+void write_ycc_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
+                   int count) {
   emit_row<YccModel>(*jdInfo, RowSource{{y, cb, cr}}, count);
 }
-void PELOJ_GrayWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count) {
+void write_grey_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count) {
   emit_row<GreyModel>(*jdInfo, RowSource{{y, y, y}}, count);
 }
-void PELOJ_RGBWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, const uint8_t* b,
-                              int count) {
+void write_rgb_row(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, const uint8_t* b,
+                   int count) {
   emit_row<RgbModel>(*jdInfo, RowSource{{r, g, b}}, count);
 }
-void PELOJ_FastYcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                                const uint8_t* cr, int count) {
+void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
+                      int count) {
   emit_row<YccModel>(*jdInfo, ColumnSource{{y, cb, cr}, jdInfo->columns.data()}, count);
 }
-void PELOJ_FastYcbcrUpscaleWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                                       const uint8_t* cr, int count) {
-  PELOJ_FastYcbcrWriteOutput(jdInfo, y, cb, cr, count);
+void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
+                               const uint8_t* cr, int count) {
+  write_picked_row(jdInfo, y, cb, cr, count);
 }
-void PELOJ_YcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
+void write_ycc_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
   emit_row<YccModel>(*jdInfo, SumSource{sums}, count);
 }
-void PELOJ_GrayWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
+void write_grey_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
   emit_row<GreyModel>(*jdInfo, SumSource{sums}, count);
 }
-void PELOJ_RGBWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
+void write_rgb_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
   emit_row<RgbModel>(*jdInfo, SumSource{sums}, count);
 }
+
+}  // namespace pelo::jpeg

@@ -26,30 +26,30 @@ struct RowOutput {
   PackRow pack;
 };
 
-// Sets the output position and the packer of the state's format, rotation and target size; `buffer` holds
-// bufferWidth x bufferHeight pixels, or exactly the picture when the fitting is tight.
+// Sets the output position and the packer of the state's format, rotation and target size; `buffer`
+// holds bufferWidth x bufferHeight pixels, or exactly the picture when the fitting is tight.
 void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option);
 
-// Sends the next `rows` rows to planes of their own, unrotated and bufferWidth wide; formats of one plane
-// use the first. A null plane writes nothing.
+// Sends the next `rows` rows to planes of their own, unrotated and bufferWidth wide; formats of one
+// plane use the first. A null plane writes nothing.
 void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows);
 
-}  // namespace pelo::jpeg
-
 // One-row writers: `count` samples a row of each channel, one pixel each.
-TAVIRPELO_API void PELOJ_YcbcrWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                                              const uint8_t* cr, int count);
-TAVIRPELO_API void PELOJ_GrayWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count);
-TAVIRPELO_API void PELOJ_RGBWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g,
-                                            const uint8_t* b, int count);
+void write_ycc_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
+                   int count);
+void write_grey_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count);
+void write_rgb_row(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, const uint8_t* b,
+                   int count);
 
 // The sample nearest to each output column's centre; `count` is the number of output columns.
-TAVIRPELO_API void PELOJ_FastYcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                                              const uint8_t* cr, int count);
-TAVIRPELO_API void PELOJ_FastYcbcrUpscaleWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y,
-                                                     const uint8_t* cb, const uint8_t* cr, int count);
+void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
+                      int count);
+void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
+                               const uint8_t* cr, int count);
 
 // Accumulator writers: `count` packed sums of four samples (codec/pixel/lanes.h).
-TAVIRPELO_API void PELOJ_YcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
-TAVIRPELO_API void PELOJ_GrayWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
-TAVIRPELO_API void PELOJ_RGBWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
+void write_ycc_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
+void write_grey_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
+void write_rgb_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
+
+}  // namespace pelo::jpeg

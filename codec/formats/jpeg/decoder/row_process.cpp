@@ -40,7 +40,7 @@ int process(PELOJ_JDINFO& jd, const RowDecoder& function, int* rowCounter, int r
     status = fill_sample_rows(jd, function);
     if (status == PELOJ_FAIL || !jd.bufferFull) return status;
   }
-  (jd.skipping ? PELOJ_SkipRowUpsample : PELOJ_SetupUpsample)(&jd, rowCounter, rowsWanted);
+  (jd.skipping ? skip_rows_unconverted : convert_rows)(&jd, rowCounter, rowsWanted);
   if (jd.rowGroup < jd.scale.block_size()) return 0;
   jd.bufferFull = 0;
   return jd.lastImcuDecoded ? PELOJ_IMAGE_DONE : 0;
@@ -51,9 +51,9 @@ int process(PELOJ_JDINFO& jd, const RowDecoder& function, int* rowCounter, int r
 RowFunction row_function(const PELOJ_JDINFO& jd) {
   const bool full = jd.scale == kFull;
   if (stores_coefficients(jd)) {
-    return full ? PELOJ_ProgProcessData : PELOJ_ProgProcessData_resize;
+    return full ? process_progressive_rows : process_progressive_rows_scaled;
   }
-  return full ? PELOJ_ProcessData : PELOJ_ProcessData_resize;
+  return full ? process_rows : process_rows_scaled;
 }
 
 int show_rows(PELOJ_JDINFO& jd) {
@@ -68,35 +68,32 @@ int show_rows(PELOJ_JDINFO& jd) {
   return jd.rowsDone < jd.usedHeight && jd.output.emitted < jd.output.limit ? 0 : PELOJ_IMAGE_DONE;
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int process_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
   return process(*jdInfo,
-                 {PELOJ_DecodeSingleiMcu, "PELOJ_ProcessData : pJDInfo->CheckFn fail",
+                 {decode_imcu_row, "PELOJ_ProcessData : pJDInfo->CheckFn fail",
                   "PELOJ_ProcessData : PELOJ_DecodeSingleiMcu fail"},
                  rowCounter, rowsWanted);
 }
 
-int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int process_rows_scaled(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
   return process(*jdInfo,
-                 {PELOJ_DecodeSingleiMcu_resize, "PELOJ_ProcessData_resize : pJDInfo->CheckFn fail",
+                 {decode_imcu_row_scaled, "PELOJ_ProcessData_resize : pJDInfo->CheckFn fail",
                   "PELOJ_ProcessData_resize : PELOJ_DecodeSingleiMcu_resize fail"},
                  rowCounter, rowsWanted);
 }
 
-int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int process_progressive_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
   return process(*jdInfo,
-                 {PELOJ_ProgDecodeSingleiMcu, "PELOJ_ProgProcessData : pJDInfo->CheckFn fail",
+                 {decode_progressive_row, "PELOJ_ProgProcessData : pJDInfo->CheckFn fail",
                   "PELOJ_ProgCompleteProcessData : PELOJ_ProgIDct fail"},
                  rowCounter, rowsWanted);
 }
 
-int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int process_progressive_rows_scaled(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
   return process(*jdInfo,
-                 {PELOJ_ProgDecodeSingleiMcu,
-                  "PELOJ_ProgCompleteProcessData_resize : pJDInfo->CheckFn fail",
+                 {decode_progressive_row, "PELOJ_ProgCompleteProcessData_resize : pJDInfo->CheckFn fail",
                   "PELOJ_ProgCompleteProcessData_resize : PELOJ_ProgIDct fail"},
                  rowCounter, rowsWanted);
 }
+
+}  // namespace pelo::jpeg

@@ -1,6 +1,6 @@
-#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/scan_list.h"
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/markers.h"
 #include "codec/formats/jpeg/decoder/progressive.h"
 #include "codec/formats/jpeg/decoder/scan_setup.h"
@@ -57,17 +57,17 @@ class Coverage {
 bool find_scan(PELOJ_JDINFO& jd, Coverage& coverage) {
   int status;
   do {
-    PELOJ_ParseNextMarker(&jd, &status);
+    parse_to_scan(&jd, &status);
   } while (status == PELOJ_OK && !coverage.gains(jd));
   return status == PELOJ_OK;
 }
 
 // Prepares the scan whose header has just been read.
 int prepare_scan(PELOJ_JDINFO& jd) {
-  if (PELOJ_InitUpsampler(&jd) != PELOJ_OK) {
+  if (prepare_upsampling(&jd) != PELOJ_OK) {
     return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitUpsampler fail");
   }
-  if (PELOJ_InitDecBeforeScan(&jd) != PELOJ_OK) {
+  if (prepare_before_scan(&jd) != PELOJ_OK) {
     return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitDecBeforeScan fail");
   }
   return PELOJ_OK;
@@ -81,7 +81,7 @@ int list_scans(PELOJ_JDINFO& jd) {
   }
   Coverage coverage;
   while (jd.scanCount < kMaxScans) {
-    if (PELOJ_SetupScanInfo(&jd, &jd.scans[jd.scanCount]) != PELOJ_OK) {
+    if (make_scan_record(&jd, &jd.scans[jd.scanCount]) != PELOJ_OK) {
       return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
     }
     ++jd.scanCount;
@@ -90,16 +90,11 @@ int list_scans(PELOJ_JDINFO& jd) {
     if (prepare_scan(jd) != PELOJ_OK) return PELOJ_FAIL;
   }
   // What the state says of a sequential picture's scan stays that of the first one.
-  if (is_progressive(jd) || PELOJ_LoadScanInfo(&jd, jd.scans[0].get())) return PELOJ_OK;
+  if (is_progressive(jd) || load_scan(&jd, jd.scans[0].get())) return PELOJ_OK;
   return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitDecBeforeScan fail");
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
+int make_scan_record(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
   *slot = os_new<ScanRecord>();
   if (!*slot) return PELOJ_FAIL;
   ScanRecord& record = **slot;
@@ -112,11 +107,11 @@ int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
   record.al = jdInfo->al;
   record.restartInterval = jdInfo->restartInterval;
   jdInfo->eobRun = 0;
-  PELOJ_SaveScanInfo(jdInfo, &record);
+  save_scan(jdInfo, &record);
   return PELOJ_OK;
 }
 
-void PELOJ_SaveScanInfo(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
+void save_scan(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
   record->entropy = *jdInfo->entropy;
   record->sourcePosition = source_offset(*jdInfo->source);
   record->eobRun = jdInfo->eobRun;
@@ -124,7 +119,7 @@ void PELOJ_SaveScanInfo(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
   record->unreadMarker = jdInfo->unreadMarker;
 }
 
-int PELOJ_LoadScanInfo(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
+int load_scan(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
   if (!source_reposition(*jdInfo->source, record->sourcePosition)) return 0;
   jdInfo->scanComponentCount = record->componentCount;
   jdInfo->scan = record->components;
@@ -139,6 +134,8 @@ int PELOJ_LoadScanInfo(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
   jdInfo->marker->nextRestart = record->nextRestart;
   jdInfo->unreadMarker = record->unreadMarker;
   if (!set_scan_geometry(*jdInfo)) return 0;
-  PELOJ_SetupiMcu(jdInfo);
+  begin_imcu_row(jdInfo);
   return 1;
 }
+
+}  // namespace pelo::jpeg

@@ -5,16 +5,16 @@
 
 #include "codec/formats/jpeg/decoder/jd_info.h"
 
+namespace pelo::jpeg {
+
 // Makes a record of the current scan header, entropy state and source position in the slot. 200 or 201.
-TAVIRPELO_API int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, pelo::OsPtr<pelo::jpeg::ScanRecord>* slot);
+int make_scan_record(PELOJ_JDINFO* jdInfo, pelo::OsPtr<pelo::jpeg::ScanRecord>* slot);
 
 // Keeps where the scan's decoding stands.
-TAVIRPELO_API void PELOJ_SaveScanInfo(PELOJ_JDINFO* jdInfo, pelo::jpeg::ScanRecord* record);
+void save_scan(PELOJ_JDINFO* jdInfo, pelo::jpeg::ScanRecord* record);
 
 // Goes on with a scan. 1, or 0 with nothing changed when its data cannot be reached.
-TAVIRPELO_API int PELOJ_LoadScanInfo(PELOJ_JDINFO* jdInfo, const pelo::jpeg::ScanRecord* record);
-
-namespace pelo::jpeg {
+int load_scan(PELOJ_JDINFO* jdInfo, const pelo::jpeg::ScanRecord* record);
 
 inline bool is_progressive(const PELOJ_JDINFO& jd) {
   return jd.marker->frameType == FrameType::kProgressive;

@@ -25,15 +25,18 @@ bool add_blocks(PELOJ_JDINFO& jd, int scanIndex, const Component& component) {
 
 // Which classes of tables a scan decodes with: all of them in sequential scans, one in progressive ones,
 // none where single DC bits are refined.
-bool uses_dc(const PELOJ_JDINFO& jd) { return jd.ss == 0 && jd.ah == 0; }
-bool uses_ac(const PELOJ_JDINFO& jd) { return jd.se > 0; }
+bool uses_dc(const PELOJ_JDINFO& jd) {
+  return jd.ss == 0 && jd.ah == 0;
+}
+bool uses_ac(const PELOJ_JDINFO& jd) {
+  return jd.se > 0;
+}
 
 // Derives a table number unless this scan has it already.
 bool derive(PELOJ_JDINFO& jd, bool isDc, uint8_t number) {
   if (number > 3) return false;
   const DerivedTable*& table = isDc ? jd.entropy->dc[number] : jd.entropy->ac[number];
-  return table != nullptr ||
-         PELOJ_PrepareDerivedTbl(&jd, isDc, number, &table, jd.entropy.get()) == PELOJ_OK;
+  return table != nullptr || derive_table(&jd, isDc, number, &table, jd.entropy.get()) == PELOJ_OK;
 }
 
 bool derive_tables(PELOJ_JDINFO& jd) {
@@ -68,7 +71,8 @@ bool allocate_blocks(PELOJ_JDINFO& jd) {
 bool set_scan_geometry(PELOJ_JDINFO& jd) {
   jd.mcuBlocks = 0;
   const bool interleaved = jd.scanComponentCount > 1;
-  jd.mcusPerRow = interleaved ? (jd.imageWidth + 8 * jd.hMax - 1) / (8 * jd.hMax) : jd.scan[0]->blocksWide;
+  jd.mcusPerRow =
+      interleaved ? (jd.imageWidth + 8 * jd.hMax - 1) / (8 * jd.hMax) : jd.scan[0]->blocksWide;
   for (int i = 0; i < jd.scanComponentCount; ++i) {
     Component& component = *jd.scan[static_cast<size_t>(i)];
     component.mcuWidth = interleaved ? component.h : 1;
@@ -82,12 +86,7 @@ bool set_scan_geometry(PELOJ_JDINFO& jd) {
   return true;
 }
 
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-int PELOJ_SetupScan(PELOJ_JDINFO* jdInfo) {
+int set_up_scan(PELOJ_JDINFO* jdInfo) {
   if (!jdInfo->entropy) {
     jdInfo->entropy = os_new<EntropyState>();
     if (!jdInfo->entropy) return fail("PELOJ_SetupScan : malloc fail");
@@ -106,18 +105,19 @@ int PELOJ_SetupScan(PELOJ_JDINFO* jdInfo) {
   return PELOJ_OK;
 }
 
-void PELOJ_SetupiMcu(PELOJ_JDINFO* jdInfo) {
+void begin_imcu_row(PELOJ_JDINFO* jdInfo) {
   const Component& first = *jdInfo->scan[0];
-  jdInfo->mcuRowsPerImcu =
-      jdInfo->scanComponentCount > 1
-          ? 1
-          : std::min<int>(first.v, first.blocksHigh - jdInfo->imcuRow * first.v);
+  jdInfo->mcuRowsPerImcu = jdInfo->scanComponentCount > 1
+                               ? 1
+                               : std::min<int>(first.v, first.blocksHigh - jdInfo->imcuRow * first.v);
 }
 
-int PELOJ_InitDecBeforeScan(PELOJ_JDINFO* jdInfo) {
-  if (PELOJ_SetupScan(jdInfo) != PELOJ_OK) return fail("PELOJ_InitDecBeforeScan : PELOJ_SetupScan fail");
+int prepare_before_scan(PELOJ_JDINFO* jdInfo) {
+  if (set_up_scan(jdInfo) != PELOJ_OK) return fail("PELOJ_InitDecBeforeScan : PELOJ_SetupScan fail");
   if (!prepare_multipliers(*jdInfo)) return fail("PELOJ_InitDecBeforeScan : no quntaze table");
   if (!allocate_blocks(*jdInfo)) return fail("PELOJ_InitDecBeforeScan : malloc fail");
-  PELOJ_SetupiMcu(jdInfo);
+  begin_imcu_row(jdInfo);
   return PELOJ_OK;
 }
+
+}  // namespace pelo::jpeg

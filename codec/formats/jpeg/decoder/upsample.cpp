@@ -51,13 +51,13 @@ bool choose_method(const PELOJ_JDINFO& jd, Component& component) {
   component.hExpand = static_cast<uint8_t>(jd.hMax / h);
   component.vExpand = static_cast<uint8_t>(jd.vMax / v);
   if (component.hExpand == 1 && component.vExpand == 1) {
-    component.upsample = PELOJ_DoFullsizeUpsample;
+    component.upsample = use_rows_as_they_are;
   } else if (component.hExpand == 2 && component.vExpand == 1) {
-    component.upsample = PELOJ_DoH2V1Upsample;
+    component.upsample = replicate_h2v1;
   } else if (component.hExpand == 2 && component.vExpand == 2 && component.downsampledWidth >= 2) {
-    component.upsample = PELOJ_DoH2V2Upsample;
+    component.upsample = replicate_h2v2;
   } else {
-    component.upsample = PELOJ_DoIntegralUpsample;
+    component.upsample = replicate_integral;
   }
   return true;
 }
@@ -68,26 +68,20 @@ int fail(const char* text) {
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
-
-using namespace pelo;
-using namespace pelo::jpeg;
-
-void PELOJ_DoFullsizeUpsample(PELOJ_JDINFO* jdInfo, Component*, uint8_t** input, uint8_t*** slot) {
+void use_rows_as_they_are(PELOJ_JDINFO* jdInfo, Component*, uint8_t** input, uint8_t*** slot) {
   std::copy_n(input, jdInfo->vMax, *slot);
 }
-void PELOJ_DoH2V1Upsample(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
+void replicate_h2v1(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
   expand_rows(*jdInfo, *component, input, *slot);
 }
-void PELOJ_DoH2V2Upsample(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
+void replicate_h2v2(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
   expand_rows(*jdInfo, *component, input, *slot);
 }
-void PELOJ_DoIntegralUpsample(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input,
-                              uint8_t*** slot) {
+void replicate_integral(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
   expand_rows(*jdInfo, *component, input, *slot);
 }
 
-void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
+void convert_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
   if (jdInfo->readPosition >= jdInfo->vMax) replicate_row_group(*jdInfo);
   const int rows = std::min(jdInfo->vMax - jdInfo->readPosition, capacity - *rowCounter);
   jdInfo->continueFlag = 1;
@@ -100,14 +94,14 @@ void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
   advance(*jdInfo, rows);
 }
 
-void PELOJ_SkipRowUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
+void skip_rows_unconverted(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
   if (jdInfo->readPosition >= jdInfo->vMax) replicate_row_group(*jdInfo);
   const int rows = std::min(jdInfo->vMax - jdInfo->readPosition, capacity - *rowCounter);
   *rowCounter += rows;
   advance(*jdInfo, rows);
 }
 
-uint8_t** PELOJ_AllocSampleArry(int width, int rows) {
+uint8_t** allocate_rows(int width, int rows) {
   if (width < 1 || rows < 1) return nullptr;
   const auto stride = static_cast<size_t>(width);
   const auto count = static_cast<size_t>(rows);
@@ -126,7 +120,7 @@ uint8_t** PELOJ_AllocSampleArry(int width, int rows) {
   return pointers;
 }
 
-int PELOJ_InitUpsampler(PELOJ_JDINFO* jdInfo) {
+int prepare_upsampling(PELOJ_JDINFO* jdInfo) {
   const int blockSize = jdInfo->scale.block_size();
   const int mcus = (jdInfo->imageWidth + 8 * jdInfo->hMax - 1) / (8 * jdInfo->hMax);
   for (int c = 0; c < jdInfo->componentCount; ++c) {
@@ -134,13 +128,14 @@ int PELOJ_InitUpsampler(PELOJ_JDINFO* jdInfo) {
     if (!choose_method(*jdInfo, component)) return fail("PELOJ_InitUpsampler : invalid sampling");
     if (component.samples) continue;  // prepared for an earlier scan
     // Whole MCUs wide: blocks beyond the last column are written too.
-    component.samples.reset(
-        PELOJ_AllocSampleArry(mcus * component.h * blockSize, component.v * blockSize));
+    component.samples.reset(allocate_rows(mcus * component.h * blockSize, component.v * blockSize));
     if (!component.samples) return fail("PELOJ_InitUpsampler : PELOJ_AllocSampleArry fail");
-    if (component.upsample == PELOJ_DoFullsizeUpsample) continue;
-    component.colour.reset(PELOJ_AllocSampleArry(component.scaledWidth * component.hExpand, component.v));
+    if (component.upsample == use_rows_as_they_are) continue;
+    component.colour.reset(allocate_rows(component.scaledWidth * component.hExpand, component.v));
     if (!component.colour) return fail("PELOJ_InitUpsampler : PELOJ_AllocSampleArry fail");
   }
   jdInfo->readPosition = jdInfo->vMax;
   return PELOJ_OK;
 }
+
+}  // namespace pelo::jpeg

@@ -1,18 +1,16 @@
 // Decoding a JPEG band by band: the decode driver's steps with the caller's planes changing in between.
-#include "codec/base/errors.h"
 #include "codec/formats/jpeg/strips/strips.h"
 
 #include <memory>
 #include <utility>
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/decoder/progressive.h"
 #include "codec/formats/jpeg/decoder/row_process.h"
 #include "codec/formats/jpeg/header_scan.h"
 
-using namespace pelo;
-using namespace pelo::jpeg;
-
+namespace pelo::jpeg {
 namespace {
 
 struct DeleteSource {
@@ -38,20 +36,20 @@ Decoder start_driver(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* source, int width
   PELOJ_REQUEST request{nullptr, width, height, 0, 0, 0};
   const uint32_t option = decInfo.option | TAVIRPELO_FIT_STRETCH;
   decInfo.option = option & ~uint32_t{TAVIRPELO_ROTATE_MASK};
-  Decoder state(PELOJ_Initialize(&decInfo, source, &request));
+  Decoder state(initialize_decoder(&decInfo, source, &request));
   decInfo.option = option;
   return state;
 }
 
 bool prepare_scans(PELOJ_JDINFO& state) {
-  if (needs_all_scans(state)) return __elo_jpeg_dec_line_init_progressive(&state) == PELOJ_OK;
+  if (needs_all_scans(state)) return list_strip_scans(&state) == PELOJ_OK;
   return first_scan_suffices(state);
 }
 
 // Frees what a complete picture no longer needs. A cleared state counts as complete.
 void release_buffers(PELOJ_JDINFO& state) {
   PELOJ_SOURCE* source = state.source;
-  PELOJ_DeleteDecoderInfo(&state);
+  clear_decoder(&state);
   state.source = source;
 }
 
@@ -62,8 +60,7 @@ void release(PELOJ_JDINFO* state) {
 
 }  // namespace
 
-PELOJ_JDINFO* __elo_jpeg_dec_line_init(TAVIRPELO_DECINFO* decInfo, int width, int height,
-                                       int outFormat) {
+PELOJ_JDINFO* begin_strips(TAVIRPELO_DECINFO* decInfo, int width, int height, int outFormat) {
   if (decInfo == nullptr || width < 1 || height < 1) return nullptr;
   if (TAVIRPELO_Seek_IO(decInfo->pIO, 0, SEEK_SET) < 0) return nullptr;
   OwnedSource source = new_source(decInfo->pIO);
@@ -76,11 +73,11 @@ PELOJ_JDINFO* __elo_jpeg_dec_line_init(TAVIRPELO_DECINFO* decInfo, int width, in
   return state.release();
 }
 
-int __elo_jpeg_dec_line_init_progressive(PELOJ_JDINFO* state) {
+int list_strip_scans(PELOJ_JDINFO* state) {
   return list_scans(*state);
 }
 
-int __elo_jpeg_dec_line_process(PELOJ_JDINFO* state, uint8_t* const* planes, int rows) {
+int decode_strip(PELOJ_JDINFO* state, uint8_t* const* planes, int rows) {
   if (state == nullptr) return 0;
   // Stretching never crops, so that no rows have to be passed before the first one.
   if (rows < 1 || state->rowsDone >= state->usedHeight) return 1;
@@ -99,6 +96,8 @@ int __elo_jpeg_dec_line_process(PELOJ_JDINFO* state, uint8_t* const* planes, int
   return 1;
 }
 
-void __elo_jpeg_dec_line_finish(PELOJ_JDINFO* state) {
+void end_strips(PELOJ_JDINFO* state) {
   if (state != nullptr) release(state);
 }
+
+}  // namespace pelo::jpeg

@@ -31,7 +31,7 @@ bool CoefficientSource::open(int ioType, void* source, int size, int width, int 
   decInfo_.reset(
       TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_YUV420, TAVIRPELO_THUMBNAIL_NEVER));
   if (!decInfo_) return false;
-  decoder_.reset(__elo_jpeg_dec_line_init(decInfo_.get(), std::max(width, 1), std::max(height, 1),
+  decoder_.reset(begin_strips(decInfo_.get(), std::max(width, 1), std::max(height, 1),
                                           TAVIRPELO_YUV420));
   if (!decoder_ || !accepted()) return false;
   lay_out();
@@ -75,7 +75,7 @@ bool CoefficientSource::read_row(CoefficientBlock* blocks) {
 bool CoefficientSource::read_baseline_row(CoefficientBlock* blocks) {
   std::memset(blocks, 0, grid_.row_blocks() * sizeof(CoefficientBlock));
   for (int mcu = 0; mcu < grid_.across; ++mcu, blocks += grid_.blocks) {
-    if (!PELOJ_DecodeMcu(decoder_.get(), mcu_blocks(blocks, grid_.blocks).data())) {
+    if (!decode_mcu_full(decoder_.get(), mcu_blocks(blocks, grid_.blocks).data())) {
       TAVIRPELO_PrintMessage("__ValorenJpgDecodeSingleiMcu : PELOJ_DecodeMcu fail");
       return false;
     }
@@ -87,7 +87,7 @@ bool CoefficientSource::skip_row() {
   std::array<CoefficientBlock, kMaxMcuBlocks> unread;
   const McuBlocks blocks = mcu_blocks(unread.data(), grid_.blocks);
   for (int mcu = 0; mcu < grid_.across; ++mcu) {
-    if (!PELOJ_DecodeMcu8to1(decoder_.get(), blocks.data())) {
+    if (!decode_mcu_dc(decoder_.get(), blocks.data())) {
       TAVIRPELO_PrintMessage("__ValorenJpgDecodeSingleiMcuSkip : PELOJ_DecodeMcu8to1 fail");
       return false;
     }

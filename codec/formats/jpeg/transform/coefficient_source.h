@@ -41,7 +41,7 @@ class CoefficientSource {
     void operator()(TAVIRPELO_DECINFO* d) const { TAVIRPELO_DestroyDecInfo(d); }
   };
   struct FinishDecoder {
-    void operator()(PELOJ_JDINFO* d) const { __elo_jpeg_dec_line_finish(d); }
+    void operator()(PELOJ_JDINFO* d) const { end_strips(d); }
   };
 
   bool accepted() const;

@@ -132,13 +132,13 @@ struct Band {
 bool code_bands(PELOJ_JDINFO* decoder, ELO_ENCODER* encoder, Band& band, int height) {
   for (int row = 0; row < height; row += 16) {
     band.clear();
-    if (!__elo_jpeg_dec_line_process(decoder, band.planes, std::min(16, height - row))) return false;
+    if (!decode_strip(decoder, band.planes, std::min(16, height - row))) return false;
     if (!encode_band(encoder, band.bytes.data(), nullptr)) {
-      __elo_jpeg_dec_line_finish(decoder);
+      end_strips(decoder);
       return false;
     }
   }
-  __elo_jpeg_dec_line_finish(decoder);
+  end_strips(decoder);
   return true;
 }
 
@@ -236,14 +236,14 @@ int resize_within(void* source, int size, int kind, int width, int height, const
   const Frame frame = open({kind, source, size});
   Band band;
   if (frame == nullptr || !band.allocate(width)) return 0;
-  PELOJ_JDINFO* decoder = __elo_jpeg_dec_line_init(frame.get(), width, height, TAVIRPELO_YUV420);
+  PELOJ_JDINFO* decoder = begin_strips(frame.get(), width, height, TAVIRPELO_YUV420);
   if (decoder == nullptr) return 0;
   const TAVIRPELO_RAWINFO image = planar(width, height);
   const TAVIRPELO_ENCOPTION options{50, app1, 0};
   ELO_ENCODER* encoder =
       planar_source(*decoder) ? begin_bands(&image, destination, &options, nullptr) : nullptr;
   if (encoder == nullptr) {
-    __elo_jpeg_dec_line_finish(decoder);
+    end_strips(decoder);
     return 0;
   }
   const bool coded = code_bands(decoder, encoder, band, height);
