@@ -5,6 +5,7 @@
 #include <cstring>
 #include <vector>
 
+#include "codec/formats/png/png_abi.h"
 #include "codec/base/byte_order.h"
 #include "codec/pixel/packers.h"
 #include "codec/formats/png/crc32.h"

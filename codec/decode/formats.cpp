@@ -5,11 +5,14 @@
 #include <iterator>
 
 #include "codec/base/errors.h"
+#include "codec/formats/bmp/bmp_record.h"
 #include "codec/formats/bmp/head.h"
+#include "codec/formats/gif/driver.h"
 #include "codec/formats/gif/head.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/head.h"
 #include "codec/formats/png/head.h"
+#include "codec/formats/png/png_driver.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo {
@@ -20,11 +23,11 @@ constexpr const char* kStage = "format detection";
 // No two sniffs agree on a source, so the order does not matter.
 constexpr Format kFormats[] = {
     {jpeg::sniff, jpeg::parse_head, jpeg::decode, TAVIRPELO_FORMAT_JPEG, 0},
-    {png::sniff, png::parse_head, TAVIRPELOI_DecodePNG, TAVIRPELO_FORMAT_PNG, 0},
-    {gif::sniff, gif::parse_head, TAVIRPELOI_DecodeGIF, TAVIRPELO_FORMAT_GIF,
+    {png::sniff, png::parse_head, png::decode, TAVIRPELO_FORMAT_PNG, 0},
+    {gif::sniff, gif::parse_head, gif::decode, TAVIRPELO_FORMAT_GIF,
      TAVIRPELO_FORMAT_ANIMATED_GIF},
-    {bmp::sniff, bmp::parse_head, TAVIRPELOI_DecodeBMP, TAVIRPELO_FORMAT_BMP, 0},
-    {bmp::sniff_wbmp, bmp::parse_wbmp_head, TAVIRPELOI_DecodeWBMP, TAVIRPELO_FORMAT_WBMP, 0},
+    {bmp::sniff, bmp::parse_head, bmp::decode, TAVIRPELO_FORMAT_BMP, 0},
+    {bmp::sniff_wbmp, bmp::parse_wbmp_head, bmp::decode_wbmp, TAVIRPELO_FORMAT_WBMP, 0},
 };
 
 // Files that people take for pictures which we read: the bytes at a place in their heads.

@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "codec/base/errors.h"
+#include "codec/formats/gif/driver.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo {
@@ -65,12 +66,12 @@ int decode_frame(const PictureSource& source, const TAVIRPELO_RAWINFO& raw, uint
   int result = 0;
   if ((*handle)->outFormat == format) {
     const auto width = static_cast<int>(raw.width), height = static_cast<int>(raw.height);
-    result = TAVIRPELOI_DecodeAGIF(*handle, raw.pData, width, height);
+    result = gif::decode_frame(*handle, raw.pData, width, height);
   } else {
     refuse(Reason::kRequestChanged, "animation");
   }
   if (result != 0 && result != kNoFurtherFrame) return 1;
-  TAVIRPELOI_AborAGIF(*handle);
+  gif::abort_animation(*handle);
   TAVIRPELO_DestroyDecInfo(*handle);
   *handle = nullptr;
   return result;

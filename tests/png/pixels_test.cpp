@@ -1,4 +1,5 @@
 // Pixels of every colour type, depth and interlacing, in every output format, size and placement.
+#include "codec/formats/png/png_abi.h"
 #include "tests/png/png_decode.h"
 
 namespace tests {

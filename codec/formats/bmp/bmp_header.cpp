@@ -3,10 +3,10 @@
 #include <climits>
 #include <cstring>
 
-#include "codec/formats/bmp/bmp_record.h"
 #include "codec/base/axis_stepper.h"
 #include "codec/base/byte_order.h"
 #include "codec/base/geometry.h"
+#include "codec/formats/bmp/bmp_record.h"
 #include "codec/pixel/packers.h"
 
 namespace pelo::bmp {
@@ -164,11 +164,7 @@ bool prepare_rows(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
 }
 
 }  // namespace
-}  // namespace pelo::bmp
-
-using namespace pelo::bmp;
-
-PELOI_BMPRECORD* PELOI_BMP_Initialize(TAVIRPELO_DECINFO* decInfo, int width, int height, void* output) {
+PELOI_BMPRECORD* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, void* output) {
   auto record = pelo::os_new<PELOI_BMPRECORD>();
   if (record == nullptr || decInfo->pIO == nullptr || !read_headers(*record, decInfo->pIO))
     return nullptr;
@@ -191,11 +187,13 @@ PELOI_BMPRECORD* PELOI_BMP_Initialize(TAVIRPELO_DECINFO* decInfo, int width, int
   return record.release();
 }
 
-void PELOI_BMP_DeleteDecInfo(PELOI_BMPRECORD* record) {
+void delete_record(PELOI_BMPRECORD* record) {
   pelo::OsDelete{}(record);
 }
 
-int PELOI_BMP_DestroyBMP(TAVIRPELO_DECINFO* decInfo) {
+int release(TAVIRPELO_DECINFO* decInfo) {
   pelo::release_state<PELOI_BMPRECORD>(*decInfo);
   return 1;
 }
+
+}  // namespace pelo::bmp

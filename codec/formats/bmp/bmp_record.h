@@ -4,9 +4,9 @@
 #include <array>
 #include <cstdint>
 
-#include "codec/formats/bmp/row_reader.h"
 #include "codec/base/format_state.h"
 #include "codec/base/output_grid.h"
+#include "codec/formats/bmp/row_reader.h"
 #include "tavirpelo/decode.h"
 
 // What pixels of up to 16 bits mean.
@@ -46,54 +46,45 @@ typedef struct PELOI_BMPRECORD : pelo::FormatState {
       accumulators;  // of one output row: B, G, R, A in bits 0-7, 8-15, 16-23, 24-31
 } PELOI_BMPRECORD;
 
+namespace pelo::bmp {
+
 // Reads and checks headers and palette, and places the picture. The object's source is at its start.
 // Null on failure.
-TAVIRPELO_API PELOI_BMPRECORD* PELOI_BMP_Initialize(TAVIRPELO_DECINFO* decInfo, int width, int height,
-                                                    void* output);
+PELOI_BMPRECORD* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, void* output);
 
 // Frees a record; null is ignored.
-TAVIRPELO_API void PELOI_BMP_DeleteDecInfo(PELOI_BMPRECORD* record);
+void delete_record(PELOI_BMPRECORD* record);
 
 // Frees the object's record, if it holds one; 1.
-TAVIRPELO_API int PELOI_BMP_DestroyBMP(TAVIRPELO_DECINFO* decInfo);
+int release(TAVIRPELO_DECINFO* decInfo);
 
-// Decode the next `rows` output rows. 1, 5 when the source could not give a row before its end, or 0
+// How pixels of a bit count are read: the only things that differ between the members of the family.
+struct Depth {
+  int bits;
+  // One file row of `width` pixels, `pixelStep` bytes apart, in an output format (0, 1, 5 to 8; others
+  // write nothing).
+  void (*write)(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
+                const PELOI_BMPCOLOURS* colours);
+  // Adds a quarter of pixels [first, end) of a row, whose bytes begin with the first, to the
+  // accumulators.
+  void (*add)(PELOI_BMPRECORD& record, const uint8_t* bytes, int64_t first, int64_t end);
+  // A row of finished accumulator words.
+  void (*write_averages)(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pixelStep,
+                         int format);
+};
+
+// The depth with so many bits a pixel, or null.
+const Depth* depth_of(int bits);
+
+// Decodes the next `rows` output rows. 1, 5 when the source could not give a row before its end, or 0
 // when the caller ends the decode.
-TAVIRPELO_API int PELOI_BMP_Decode1bitBMP(PELOI_BMPRECORD* record, int rows);
-TAVIRPELO_API int PELOI_BMP_Decode4bitBMP(PELOI_BMPRECORD* record, int rows);
-TAVIRPELO_API int PELOI_BMP_Decode8bitBMP(PELOI_BMPRECORD* record, int rows);
-TAVIRPELO_API int PELOI_BMP_Decode16bitBMP(PELOI_BMPRECORD* record, int rows);
-TAVIRPELO_API int PELOI_BMP_Decode24bitBMP(PELOI_BMPRECORD* record, int rows);
-TAVIRPELO_API int PELOI_BMP_Decode32bitBMP(PELOI_BMPRECORD* record, int rows);
-
-// Write one file row of `width` pixels, `pixelStep` bytes apart, in an output format (0, 1, 5 to 8;
-// others write nothing).
-TAVIRPELO_API void PELOI_BMP_Write1bitOutput(const uint8_t* row, uint8_t* output, int width,
-                                             ptrdiff_t pixelStep, int format,
-                                             const PELOI_BMPCOLOURS* colours);
-TAVIRPELO_API void PELOI_BMP_Write4bitOutput(const uint8_t* row, uint8_t* output, int width,
-                                             ptrdiff_t pixelStep, int format,
-                                             const PELOI_BMPCOLOURS* colours);
-TAVIRPELO_API void PELOI_BMP_Write8bitOutput(const uint8_t* row, uint8_t* output, int width,
-                                             ptrdiff_t pixelStep, int format,
-                                             const PELOI_BMPCOLOURS* colours);
-TAVIRPELO_API void PELOI_BMP_Write16bitOutput(const uint8_t* row, uint8_t* output, int width,
-                                              ptrdiff_t pixelStep, int format,
-                                              const PELOI_BMPCOLOURS* colours);
-TAVIRPELO_API void PELOI_BMP_Write24bitOutput(const uint8_t* row, uint8_t* output, int width,
-                                              ptrdiff_t pixelStep, int format,
-                                              const PELOI_BMPCOLOURS* colours);
-TAVIRPELO_API void PELOI_BMP_Write32bitOutput(const uint8_t* row, uint8_t* output, int width,
-                                              ptrdiff_t pixelStep, int format,
-                                              const PELOI_BMPCOLOURS* colours);
+int decode_rows(PELOI_BMPRECORD& record, int rows, const Depth& depth);
 
 // Write one row of finished accumulator words, opaque or with their alpha.
-TAVIRPELO_API void PELOI_BMP_WriteResizedOutput(const uint32_t* accumulatorRow, uint8_t* output,
-                                                int outWidth, ptrdiff_t pixelStep, int format);
-TAVIRPELO_API void PELOI_BMP_WriteResizedOutputWithAlpha(const uint32_t* accumulatorRow, uint8_t* output,
-                                                         int outWidth, ptrdiff_t pixelStep, int format);
-
-namespace pelo::bmp {
+void write_opaque_words(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
+                        ptrdiff_t pixelStep, int format);
+void write_alpha_words(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
+                       ptrdiff_t pixelStep, int format);
 
 // Output formats that BMP pictures are written in.
 constexpr bool writes(int format) {
@@ -105,5 +96,13 @@ constexpr bool writes(int format) {
 constexpr int64_t row_size(int64_t width, int64_t bitCount) {
   return (width * bitCount + 31) / 32 * 4;
 }
+
+// Behind the given names of the public headers, which say what they do.
+int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+int decode_rows_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines);
+int decode_lines(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines);
+int decode_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+int abort(TAVIRPELO_DECINFO* decInfo);
+int decode_wbmp(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
 
 }  // namespace pelo::bmp

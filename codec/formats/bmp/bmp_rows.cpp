@@ -4,6 +4,7 @@
 // pixel's span, in the rows at these points of its row. Points are counted from the last image row up,
 // as rows stand in an ordinary file, so that a top-down file gives the same picture.
 #include <algorithm>
+#include <iterator>
 
 #include "codec/base/byte_order.h"
 #include "codec/base/row_progress.h"
@@ -59,10 +60,10 @@ void store_pixels(uint8_t* output, int count, ptrdiff_t pixelStep, Pixel pixel) 
 
 template <class Source>
 void write_row(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
-               const PELOI_BMPCOLOURS& colours) {
+               const PELOI_BMPCOLOURS* colours) {
   visit_layout(format, [&](auto layout) {
     store_pixels<decltype(layout)>(output, width, pixelStep, [&](size_t x, uint8_t* rgba) {
-      Source::pixel(colours, row, x, rgba);
+      Source::pixel(*colours, row, x, rgba);
     });
   });
 }
@@ -107,15 +108,6 @@ void write_words(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pi
   });
 }
 
-// How a bit count is decoded.
-struct Family {
-  void (*write)(const uint8_t* row, uint8_t* output, int width, ptrdiff_t pixelStep, int format,
-                const PELOI_BMPCOLOURS* colours);
-  void (*add)(PELOI_BMPRECORD& record, const uint8_t* bytes, int64_t first, int64_t end);
-  void (*writeResized)(const uint32_t* words, uint8_t* output, int width, ptrdiff_t pixelStep,
-                       int format);
-};
-
 // Row `up` counted from the last image row.
 int64_t row_from_below(const PELOI_BMPRECORD& record, int64_t up) {
   return record.topDown ? record.height - 1 - up : up;
@@ -123,14 +115,14 @@ int64_t row_from_below(const PELOI_BMPRECORD& record, int64_t up) {
 
 // Output row `up`, counted from the last. False when the source lacks a row of it, which then keeps what
 // the buffer held.
-bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Family& family) {
+bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Depth& depth) {
   const RowSpan span = record.grid.span(record.outHeight - 1 - up, 0, record.outWidth);
   if (record.oneToOne) {
     return record.reader.for_pieces(
         row_from_below(record, up), [&](const uint8_t* bytes, int64_t first, int64_t count) {
           const auto visible = static_cast<int>(std::min(count, span.count - first));
-          family.write(bytes, span.first + first * span.step, visible, span.step, record.outFormat,
-                       &record.colours);
+          depth.write(bytes, span.first + first * span.step, visible, span.step, record.outFormat,
+                      &record.colours);
         });
   }
   std::fill_n(record.accumulators.data(), record.outWidth, 0u);
@@ -139,15 +131,34 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Family& family) {
     const int64_t row = row_from_below(record, (phase + up * record.height) / record.outHeight);
     const bool there =
         record.reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
-          family.add(record, bytes, first, first + count);
+          depth.add(record, bytes, first, first + count);
         });
     if (!there) return false;
   }
-  family.writeResized(record.accumulators.data(), span.first, span.count, span.step, record.outFormat);
+  depth.write_averages(record.accumulators.data(), span.first, span.count, span.step, record.outFormat);
   return true;
 }
 
-int decode_rows(PELOI_BMPRECORD& record, int rows, const Family& family) {
+template <class Source>
+constexpr Depth depth(int bits, bool keepsAlpha = false) {
+  return {bits, write_row<Source>, add_pixels<Source>,
+          keepsAlpha ? write_alpha_words : write_opaque_words};
+}
+
+constexpr Depth kDepths[] = {
+    depth<PaletteSource<1>>(1), depth<PaletteSource<4>>(4), depth<PaletteSource<8>>(8),
+    depth<FieldSource>(16),     depth<ByteSource<3>>(24),   depth<ByteSource<4>>(32, true),
+};
+
+}  // namespace
+
+const Depth* depth_of(int bits) {
+  const auto* found = std::find_if(std::begin(kDepths), std::end(kDepths),
+                                   [bits](const Depth& candidate) { return candidate.bits == bits; });
+  return found == std::end(kDepths) ? nullptr : found;
+}
+
+int decode_rows(PELOI_BMPRECORD& record, int rows, const Depth& depth) {
   constexpr int kShort = 5;
   const int count = std::min(rows, record.outHeight - record.rowsDone);
   const int done = record.rowsDone;
@@ -157,40 +168,18 @@ int decode_rows(PELOI_BMPRECORD& record, int rows, const Family& family) {
   bool complete = true;
   for (int i = 0; i < count; ++i) {
     if (!caller_agrees(record.decInfo, done + i)) return 0;
-    complete &= decode_row(record, lowest + (record.topDown ? count - 1 - i : i), family);
+    complete &= decode_row(record, lowest + (record.topDown ? count - 1 - i : i), depth);
   }
   return complete || record.reader.at_end() ? 1 : kShort;
 }
 
-}  // namespace
-}  // namespace pelo::bmp
-
-using namespace pelo::bmp;
-
-void PELOI_BMP_WriteResizedOutput(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
-                                  ptrdiff_t pixelStep, int format) {
+void write_opaque_words(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
+                        ptrdiff_t pixelStep, int format) {
   write_words<false>(accumulatorRow, output, outWidth, pixelStep, format);
 }
-void PELOI_BMP_WriteResizedOutputWithAlpha(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
-                                           ptrdiff_t pixelStep, int format) {
+void write_alpha_words(const uint32_t* accumulatorRow, uint8_t* output, int outWidth,
+                       ptrdiff_t pixelStep, int format) {
   write_words<true>(accumulatorRow, output, outWidth, pixelStep, format);
 }
 
-// A member of the family: its row writer and its row decoder.
-#define PELOI_BMP_MEMBER(bits, Source, writeResized)                                          \
-  void PELOI_BMP_Write##bits##bitOutput(const uint8_t* row, uint8_t* output, int width,       \
-                                        ptrdiff_t pixelStep, int format,                      \
-                                        const PELOI_BMPCOLOURS* colours) {                    \
-    write_row<Source>(row, output, width, pixelStep, format, *colours);                       \
-  }                                                                                           \
-  int PELOI_BMP_Decode##bits##bitBMP(PELOI_BMPRECORD* record, int rows) {                     \
-    return decode_rows(*record, rows,                                                         \
-                       {PELOI_BMP_Write##bits##bitOutput, add_pixels<Source>, writeResized}); \
-  }
-PELOI_BMP_MEMBER(1, PaletteSource<1>, PELOI_BMP_WriteResizedOutput)
-PELOI_BMP_MEMBER(4, PaletteSource<4>, PELOI_BMP_WriteResizedOutput)
-PELOI_BMP_MEMBER(8, PaletteSource<8>, PELOI_BMP_WriteResizedOutput)
-PELOI_BMP_MEMBER(16, FieldSource, PELOI_BMP_WriteResizedOutput)
-PELOI_BMP_MEMBER(24, ByteSource<3>, PELOI_BMP_WriteResizedOutput)
-PELOI_BMP_MEMBER(32, ByteSource<4>, PELOI_BMP_WriteResizedOutputWithAlpha)
-#undef PELOI_BMP_MEMBER
+}  // namespace pelo::bmp

@@ -34,9 +34,9 @@ struct Wbmp {
 bool read_integer(const uint8_t* data, int size, int* position, uint32_t& value) {
   uint8_t packed[kMaxGroups];
   int groups = 0;
-  PELOI_WBMPdecodeMultibyte(data, size, position, &groups, packed);
+  collect_groups(data, size, position, &groups, packed);
   if (groups > kMaxIntGroups) return false;
-  value = PELOI_WBMPgetMultibyte2Int(packed, groups, groups);
+  value = number_of_groups(packed, groups, groups);
   return true;
 }
 
@@ -140,12 +140,7 @@ bool write_resized(TAVIRPELO_DECINFO* decInfo, const Wbmp& wbmp, RowReader& read
 }
 
 }  // namespace
-}  // namespace pelo::bmp
-
-using namespace pelo::bmp;
-
-void PELOI_WBMPdecodeMultibyte(const uint8_t* data, int size, int* position, int* groupCount,
-                               uint8_t* packed) {
+void collect_groups(const uint8_t* data, int size, int* position, int* groupCount, uint8_t* packed) {
   *groupCount = 0;
   std::memset(packed, 0, kMaxGroups);
   bool more = true;
@@ -159,20 +154,20 @@ void PELOI_WBMPdecodeMultibyte(const uint8_t* data, int size, int* position, int
   }
 }
 
-uint64_t PELOI_WBMPpow(uint64_t base, int exponent) {
+uint64_t power(uint64_t base, int exponent) {
   uint64_t power = 1;
   for (int i = 0; i < exponent; ++i) power *= base;
   return power;
 }
 
-uint32_t PELOI_WBMPgetMultibyte2Int(const uint8_t* packed, int byteCount, int shift) {
+uint32_t number_of_groups(const uint8_t* packed, int byteCount, int shift) {
   if (byteCount > 8 || shift > 63) return 0;
   uint64_t value = 0;
   for (int i = 0; i < byteCount; ++i) value = value << 8 | packed[i];
-  return static_cast<uint32_t>(value / PELOI_WBMPpow(2, shift));
+  return static_cast<uint32_t>(value / power(2, shift));
 }
 
-int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+int decode_wbmp(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   if (decInfo == nullptr || decInfo->pIO == nullptr || output == nullptr || width < 0 || height < 0)
     return 0;
   TAVIRPELO_IO* io = decInfo->pIO;
@@ -200,3 +195,5 @@ int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   return plain ? write_plain(decInfo, reader, grid, out, format)
                : write_resized(decInfo, wbmp, reader, grid, out, format);
 }
+
+}  // namespace pelo::bmp

@@ -10,9 +10,7 @@
 #include "codec/formats/gif/parse.h"
 #include "tavirpelo/decode.h"
 
-using namespace pelo;
-using namespace pelo::gif;
-
+namespace pelo::gif {
 namespace {
 
 constexpr int kRestoreBackground = 2;
@@ -56,7 +54,7 @@ int start_frame(Record& record, void* output) {
   record.rowsWritten = 0;
   if (!write_canvas_rows(record, output, 0, record.frame.top)) return kFailure;
   record.inImage = true;
-  return PELOI_DecodeGIFImageIter(record.reader.source, &record, output, 1);
+  return decode_image_step(record.reader.source, &record, output, 1);
 }
 
 // The frame's last step: the rows below the image, and what comes next.
@@ -64,18 +62,16 @@ int finish_frame(Record& record, void* output) {
   const int below = record.frame.top + record.frame.height;
   if (!write_canvas_rows(record, output, below, record.screen.height)) return kFailure;
   record.inImage = false;
-  return PELOI_SeekImageData(record.reader.source, &record);
+  return seek_image(record.reader.source, &record);
 }
 
 int step(Record& record, void* output) {
   if (!record.inImage) return start_frame(record, output);
-  const int result = PELOI_DecodeGIFImageIter(record.reader.source, &record, output, 0);
+  const int result = decode_image_step(record.reader.source, &record, output, 0);
   return result == kDone ? finish_frame(record, output) : result;
 }
 
 }  // namespace
-
-namespace pelo::gif {
 
 bool create_canvas(Record& record) {
   const int64_t pixels = int64_t{record.screen.width} * record.screen.height;
@@ -85,9 +81,7 @@ bool create_canvas(Record& record) {
          record.frameRow.allocate(static_cast<size_t>(record.screen.width));
 }
 
-}  // namespace pelo::gif
-
-int PELOI_MakeFrameLineBuffer(Record* record) {
+int compose_row(Record* record) {
   if (record->currentRow >= record->screen.height || record->screen.width == 0) return 1;
   const int width = record->screen.width;
   const int left = std::min(record->frame.left, width);
@@ -107,7 +101,7 @@ int PELOI_MakeFrameLineBuffer(Record* record) {
   return 1;
 }
 
-int TAVIRPELOI_DecodeAGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+int decode_frame_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   Record* record = continue_or_start(decInfo, output, width, height, Mode::kAnimated);
   if (record == nullptr) return kFailure;
   const int result = step(*record, output);
@@ -115,14 +109,16 @@ int TAVIRPELOI_DecodeAGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int widt
   return result;
 }
 
-int TAVIRPELOI_DecodeAGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+int decode_frame(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   int result;
   do {
-    result = TAVIRPELOI_DecodeAGIFIter(decInfo, output, width, height);
+    result = decode_frame_step(decInfo, output, width, height);
   } while (result == kMore);
   return result;
 }
 
-int TAVIRPELOI_AborAGIF(TAVIRPELO_DECINFO* decInfo) {
-  return TAVIRPELOI_AbortGIFIter(decInfo);
+int abort_animation(TAVIRPELO_DECINFO* decInfo) {
+  return abort(decInfo);
 }
+
+}  // namespace pelo::gif

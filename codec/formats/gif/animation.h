@@ -9,8 +9,8 @@ namespace pelo::gif {
 // An unpainted canvas for the record's screen. False when it is too large or memory is short.
 [[nodiscard]] bool create_canvas(Record& record);
 
-}  // namespace pelo::gif
-
 // Composes the image row in the line buffer onto the current screen row, and points the row source at
 // what is to be shown. 1.
-TAVIRPELO_API int PELOI_MakeFrameLineBuffer(pelo::gif::Record* record);
+int compose_row(pelo::gif::Record* record);
+
+}  // namespace pelo::gif

@@ -8,9 +8,7 @@
 #include "codec/formats/gif/parse.h"
 #include "tavirpelo/decode.h"
 
-using namespace pelo;
-using namespace pelo::gif;
-
+namespace pelo::gif {
 namespace {
 
 bool valid(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
@@ -31,11 +29,10 @@ bool prepare(Record& record) {
 
 // A record that stands at the first image's data; null on failure.
 OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, void* output, int width, int height, Mode mode) {
-  OsPtr<Record> record(PELOI_InitializeGIF(&decInfo, width, height, mode == Mode::kAnimated, output));
+  OsPtr<Record> record(make_record(&decInfo, width, height, mode == Mode::kAnimated, output));
   if (record == nullptr) return nullptr;
   record->request.mode = mode;
-  if (PELOI_SeekImageData(decInfo.pIO, record.get()) != kImageFollows || !prepare(*record))
-    return nullptr;
+  if (seek_image(decInfo.pIO, record.get()) != kImageFollows || !prepare(*record)) return nullptr;
   decInfo.outWidth = record->picture.width;
   decInfo.outHeight = record->picture.height;
   return record;
@@ -46,8 +43,6 @@ bool foreign_state(const TAVIRPELO_DECINFO& decInfo) {
 }
 
 }  // namespace
-
-namespace pelo::gif {
 
 Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode) {
   if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return nullptr;
@@ -62,12 +57,9 @@ Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
   return held_state<Record>(*decInfo);
 }
 
-}  // namespace pelo::gif
-
-Record* PELOI_InitializeGIF(TAVIRPELO_DECINFO* decInfo, int width, int height, int animated,
-                            void* output) {
+Record* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, int animated, void* output) {
   if (!valid(decInfo, output, width, height)) return nullptr;
-  OsPtr<Record> record(PELOI_CreateGIFDecoderInfo());
+  OsPtr<Record> record(new_record());
   if (record == nullptr) return nullptr;
   decInfo->scaleDenom = 1;
   record->decInfo = decInfo;
@@ -77,7 +69,7 @@ Record* PELOI_InitializeGIF(TAVIRPELO_DECINFO* decInfo, int width, int height, i
                      decInfo->outFormat,
                      decInfo->option};
   record->store = gif_storer(decInfo->outFormat);
-  if (!PELOI_ParseGIFHeader(decInfo->pIO, record.get())) return nullptr;
+  if (!parse_header(decInfo->pIO, record.get())) return nullptr;
   if (!set_geometry(*record, decInfo->option)) return nullptr;
   if (record->animated && !create_canvas(*record)) return nullptr;
   decInfo->imageWidth = record->screen.width;
@@ -87,32 +79,31 @@ Record* PELOI_InitializeGIF(TAVIRPELO_DECINFO* decInfo, int width, int height, i
   return record.release();
 }
 
-int TAVIRPELOI_DecodeGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return kFailure;
   release_state<Record>(*decInfo);
   const auto record = start(*decInfo, output, width, height, Mode::kWhole);
   if (record == nullptr) return kFailure;
-  const int result = PELOI_DecodeGIFImage(decInfo->pIO, record.get(), output);
+  const int result = decode_image(decInfo->pIO, record.get(), output);
   if (record->ended || !finish_picture(*record, output)) return kFailure;
   return result;
 }
 
-int TAVIRPELOI_DecodeGIFLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
-                             int lines) {
+int decode_lines(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
   if (lines < 1) return kFailure;
   const bool first = decInfo != nullptr && decInfo->pFormatInfo == nullptr;
   Record* record = continue_or_start(decInfo, output, width, height, Mode::kLines);
   if (record == nullptr) return kFailure;
-  const int result = PELOI_DecodeGIFImageLine(decInfo->pIO, record, output, lines, first);
+  const int result = decode_image_lines(decInfo->pIO, record, output, lines, first);
   if (result != kMore) release_state<Record>(*decInfo);
   return result == kFailure ? kFailure : kDone;
 }
 
-int TAVIRPELOI_DecodeGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+int decode_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   const bool first = decInfo != nullptr && decInfo->pFormatInfo == nullptr;
   Record* record = continue_or_start(decInfo, output, width, height, Mode::kIterative);
   if (record == nullptr) return kFailure;
-  const int result = PELOI_DecodeGIFImageIter(decInfo->pIO, record, output, first);
+  const int result = decode_image_step(decInfo->pIO, record, output, first);
   if (result == kMore) return kMore;
   // Damaged data end the image as its last row does.
   const bool done = !first && !record->ended && finish_picture(*record, output);
@@ -120,8 +111,10 @@ int TAVIRPELOI_DecodeGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width
   return done ? kDone : kFailure;
 }
 
-int TAVIRPELOI_AbortGIFIter(TAVIRPELO_DECINFO* decInfo) {
+int abort(TAVIRPELO_DECINFO* decInfo) {
   if (decInfo == nullptr || foreign_state(*decInfo)) return 0;
   release_state<Record>(*decInfo);
   return 1;
 }
+
+}  // namespace pelo::gif

@@ -12,9 +12,18 @@ namespace pelo::gif {
 // decoder's state is left alone and answered with null.
 Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode);
 
-}  // namespace pelo::gif
-
 // A record for the object's source with header read and output geometry computed; null for null
 // arguments, negative sizes, a source that is no GIF, a canvas that is too large, or short memory.
-TAVIRPELO_API pelo::gif::Record* PELOI_InitializeGIF(TAVIRPELO_DECINFO* decInfo, int width, int height,
-                                                     int animated, void* output);
+pelo::gif::Record* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, int animated,
+                               void* output);
+
+// Behind the given names of the public headers, which say what they do.
+int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+int decode_lines(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines);
+int decode_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+int abort(TAVIRPELO_DECINFO* decInfo);
+int decode_frame(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+int decode_frame_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+int abort_animation(TAVIRPELO_DECINFO* decInfo);
+
+}  // namespace pelo::gif

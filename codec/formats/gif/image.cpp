@@ -9,9 +9,7 @@
 #include "codec/formats/gif/lzw.h"
 #include "codec/formats/gif/output.h"
 
-using namespace pelo;
-using namespace pelo::gif;
-
+namespace pelo::gif {
 namespace {
 
 constexpr int kRowsOfBatch = 16;
@@ -32,9 +30,9 @@ int end_of_data(Record& record, Supply supply) {
 
 // Hands the row in the line buffer on; `consumed` stays 0 when the row is needed again.
 bool deliver_row(Record& record, void* output, int& consumed) {
-  if (record.lines > 0) return PELOI_GIFMakeOut1Row(&record, output, &consumed);
-  if (record.animated && !PELOI_MakeFrameLineBuffer(&record)) return false;
-  return PELOI_WriteTheLine(&record, output);
+  if (record.lines > 0) return write_output_row(&record, output, &consumed);
+  if (record.animated && !compose_row(&record)) return false;
+  return write_line(&record, output);
 }
 
 // The loop of every mode: goes on until `rowLimit` image rows or, by lines, the call's output rows are
@@ -80,8 +78,6 @@ bool start_lines(Record& record, void* output) {
 
 }  // namespace
 
-namespace pelo::gif {
-
 bool begin_image(Record& record) {
   if (record.frame.width == 0) record.frame.height = 0;
   record.currentRow = record.frame.top;
@@ -92,20 +88,18 @@ bool begin_image(Record& record) {
   return start_lzw(record);
 }
 
-}  // namespace pelo::gif
-
-int PELOI_DecodeGIFImage(TAVIRPELO_IO* source, Record* record, void* output) {
+int decode_image(TAVIRPELO_IO* source, Record* record, void* output) {
   record->reader.source = source;
   return begin_image(*record) ? decode_rows(*record, output, INT_MAX) : kFailure;
 }
 
-int PELOI_DecodeGIFImageIter(TAVIRPELO_IO* source, Record* record, void* output, int start) {
+int decode_image_step(TAVIRPELO_IO* source, Record* record, void* output, int start) {
   record->reader.source = source;
   if (start == 1) return begin_image(*record) ? kMore : kFailure;
   return decode_rows(*record, output, kRowsOfBatch);
 }
 
-int PELOI_DecodeGIFImageLine(TAVIRPELO_IO* source, Record* record, void* output, int lines, int start) {
+int decode_image_lines(TAVIRPELO_IO* source, Record* record, void* output, int lines, int start) {
   record->reader.source = source;
   if (start == 1 && !start_lines(*record, output)) return kFailure;
   record->lines = lines;
@@ -118,3 +112,5 @@ int PELOI_DecodeGIFImageLine(TAVIRPELO_IO* source, Record* record, void* output,
   if (record->imageDone && !emit_plane_rows(*record, output)) return kFailure;
   return record->lineRow < record->picture.height ? kMore : kDone;
 }
+
+}  // namespace pelo::gif

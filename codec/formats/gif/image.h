@@ -15,18 +15,17 @@ constexpr int kMore = 4;
 // memory is short.
 [[nodiscard]] bool begin_image(Record& record);
 
-}  // namespace pelo::gif
-
-// Each decodes the image that PELOI_SeekImageData found. 1 when its rows are done or its data end early
+// Each decodes the image that seek_image found. 1 when its rows are done or its data end early
 // (the rest keeps what the output holds), 0 for damaged data, a minimum code size above 11, data that
 // end before the source does, or when memory is short.
-TAVIRPELO_API int PELOI_DecodeGIFImage(TAVIRPELO_IO* source, pelo::gif::Record* record, void* output);
+int decode_image(TAVIRPELO_IO* source, pelo::gif::Record* record, void* output);
 
 // Decodes 16 more image rows, 4 while there are more; with `start` 1 only prepares, and answers 4.
-TAVIRPELO_API int PELOI_DecodeGIFImageIter(TAVIRPELO_IO* source, pelo::gif::Record* record, void* output,
-                                           int start);
+int decode_image_step(TAVIRPELO_IO* source, pelo::gif::Record* record, void* output, int start);
 
 // Writes the next `lines` output rows to the start of `output`, 4 while there are more; `start` 1
 // prepares first. An interlaced image is decoded whole then, into a plane of its indices.
-TAVIRPELO_API int PELOI_DecodeGIFImageLine(TAVIRPELO_IO* source, pelo::gif::Record* record, void* output,
-                                           int lines, int start);
+int decode_image_lines(TAVIRPELO_IO* source, pelo::gif::Record* record, void* output, int lines,
+                       int start);
+
+}  // namespace pelo::gif

@@ -2,10 +2,9 @@
 
 #include <cstring>
 
-using namespace pelo;
-using namespace pelo::gif;
+namespace pelo::gif {
 
-int PELOI_InitializeTransTBL(int minimumCodeSize, TranslationTable* table) {
+int init_table(int minimumCodeSize, TranslationTable* table) {
   if (minimumCodeSize < 0 || minimumCodeSize > kMaxMinimumCodeSize) return 0;
   const uint32_t count = (1u << minimumCodeSize) + 2;
   for (uint32_t code = 0; code < count; ++code) {
@@ -15,7 +14,6 @@ int PELOI_InitializeTransTBL(int minimumCodeSize, TranslationTable* table) {
   return 1;
 }
 
-namespace pelo::gif {
 namespace {
 
 struct Block {
@@ -59,7 +57,7 @@ inline void clear_table(const Record& record, LzwState& s) {
 // clear code; codes that stood for nothing start no strings.
 inline void add_entry(TranslationTable& table, LzwState& s, uint8_t character) {
   if (s.previous >= s.nextCode || s.nextCode >= kCodes) return;
-  PELOI_AddToTranslationTable(s.previous, character, s.nextCode, &table);
+  add_entry(s.previous, character, s.nextCode, &table);
   ++s.nextCode;
   if (s.nextCode >= 1u << s.codeSize && s.codeSize < kMaxCodeSize) ++s.codeSize;
 }
@@ -93,10 +91,9 @@ inline bool unknown_code(const Record& record, LzwState& s, uint32_t code, Piece
 inline int write_piece(const Record& record, LzwState& s, uint8_t* line, const Piece& piece) {
   int error = 0;
   int first = piece.last;
-  if (piece.code != kNoCode)
-    first = PELOI_TranslateCode(piece.code, &record.table, s.fill, line, &error);
+  if (piece.code != kNoCode) first = translate(piece.code, &record.table, s.fill, line, &error);
   if (error != 0) return -1;
-  if (piece.hasLast) PELOI_WriteCharacter(piece.last, s.fill + piece.length - 1, line);
+  if (piece.hasLast) write_index(piece.last, s.fill + piece.length - 1, line);
   s.fill += piece.length;
   return first;
 }
@@ -159,7 +156,7 @@ void compact(Record& record) {
 }  // namespace
 
 bool start_lzw(Record& record) {
-  if (!PELOI_InitializeTransTBL(record.minimumCodeSize, &record.table)) return false;
+  if (!init_table(record.minimumCodeSize, &record.table)) return false;
   const int needed = record.frame.width + kMaxString + kStringSlack;
   if (record.line.size() < static_cast<size_t>(needed) &&
       !record.line.allocate(static_cast<size_t>(needed))) {

@@ -10,9 +10,7 @@
 #include "codec/pixel/lanes.h"
 #include "codec/pixel/packers.h"
 
-using namespace pelo;
-using namespace pelo::gif;
-
+namespace pelo::gif {
 namespace {
 
 // The picture columns that the frame covers, in one row of the picture.
@@ -85,16 +83,14 @@ bool write_still_row(Record& record, void* output) {
   if (!may_write(record, rows)) return false;
   if (record.plane.painted) clear_beside_frame(record, output);
   if (record.picture == record.screen) {
-    PELOI_WriteGIFOneToOneRow(&record, output);
+    write_row(&record, output);
   } else {
-    PELOI_DownsizeGIFRow(&record, output);
+    write_sampled_rows(&record, output);
   }
   return true;
 }
 
 }  // namespace
-
-namespace pelo::gif {
 
 bool may_write(Record& record, int rows) {
   if (rows < 1) return true;
@@ -143,22 +139,20 @@ void write_plane_row(const Record& record, int planeRow, const OutputGrid& grid,
 bool write_screen_row(Record& record, void* output) {
   if (!may_write(record, rows_of_current(record))) return false;
   if (record.picture == record.screen) {
-    PELOI_WriteAGIFOneToOneRow(&record, output);
+    write_screen_pixels(&record, output);
   } else {
-    PELOI_DownsizeAGIFRow(&record, output);
+    write_sampled_screen(&record, output);
   }
   return true;
 }
 
-}  // namespace pelo::gif
-
-int PELOI_WriteGIFOneToOneRow(Record* record, void* output) {
+int write_row(Record* record, void* output) {
   if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
   write_sampled_row(*record, grid_of(*record, output), record->currentRow);
   return 1;
 }
 
-int PELOI_DownsizeGIFRow(Record* record, void* output) {
+int write_sampled_rows(Record* record, void* output) {
   if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
   const OutputGrid grid = grid_of(*record, output);
   const OutputRows rows = rows_of(record->sampling, record->currentRow);
@@ -166,14 +160,14 @@ int PELOI_DownsizeGIFRow(Record* record, void* output) {
   return 1;
 }
 
-int PELOI_WriteAGIFOneToOneRow(Record* record, void* output) {
+int write_screen_pixels(Record* record, void* output) {
   if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
   const RowSpan span = grid_of(*record, output).span(record->currentRow, 0, record->picture.width);
   store_colours(record->store, record->rowSource + span.skip, span.count, span.first, span.step);
   return 1;
 }
 
-int PELOI_DownsizeAGIFRow(Record* record, void* output) {
+int write_sampled_screen(Record* record, void* output) {
   if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
   if (!record->sampling.columns) return 1;  // an empty picture
   const OutputGrid grid = grid_of(*record, output);
@@ -187,7 +181,7 @@ int PELOI_DownsizeAGIFRow(Record* record, void* output) {
   return 1;
 }
 
-int PELOI_WriteTheLine(Record* record, void* output) {
+int write_line(Record* record, void* output) {
   bool goesOn = true;
   if (record->animated) {
     goesOn = write_screen_row(*record, output);
@@ -199,7 +193,7 @@ int PELOI_WriteTheLine(Record* record, void* output) {
   return goesOn && advance_row(*record);
 }
 
-int PELOI_GIFMakeOut1Row(Record* record, void* output, int* consumed) {
+int write_output_row(Record* record, void* output, int* consumed) {
   const OutputRows rows = rows_of(record->sampling, record->currentRow);
   if (record->lineRow < rows.end) {
     if (!may_write(*record, 1)) return 0;
@@ -213,3 +207,5 @@ int PELOI_GIFMakeOut1Row(Record* record, void* output, int* consumed) {
   *consumed = record->lineRow >= rows.end;
   return *consumed == 0 || advance_row(*record);
 }
+
+}  // namespace pelo::gif

@@ -29,19 +29,19 @@ void write_plane_row(const Record& record, int planeRow, const OutputGrid& grid,
 // Writes the current screen row from the row source. False when the caller ends the decode.
 [[nodiscard]] bool write_screen_row(Record& record, void* output);
 
-}  // namespace pelo::gif
-
 // Each writes the current row of an image (its indices stand in the line buffer) or of an animation's
 // screen; rows below the screen are ignored. 1.
-TAVIRPELO_API int PELOI_WriteGIFOneToOneRow(pelo::gif::Record* record, void* output);
-TAVIRPELO_API int PELOI_DownsizeGIFRow(pelo::gif::Record* record, void* output);
-TAVIRPELO_API int PELOI_WriteAGIFOneToOneRow(pelo::gif::Record* record, void* output);
-TAVIRPELO_API int PELOI_DownsizeAGIFRow(pelo::gif::Record* record, void* output);
+int write_row(pelo::gif::Record* record, void* output);
+int write_sampled_rows(pelo::gif::Record* record, void* output);
+int write_screen_pixels(pelo::gif::Record* record, void* output);
+int write_sampled_screen(pelo::gif::Record* record, void* output);
 
 // Writes the current row where the record's mode wants it and moves on to the next image row. 1, or 0
 // when the caller ends the decode or there is no such interlace pass.
-TAVIRPELO_API int PELOI_WriteTheLine(pelo::gif::Record* record, void* output);
+int write_line(pelo::gif::Record* record, void* output);
 
 // Line mode: writes the next output row, unrotated, when it is made of the current image row. *consumed
 // becomes 1 when no further output row is; the current row has then moved on. Answers as the one above.
-TAVIRPELO_API int PELOI_GIFMakeOut1Row(pelo::gif::Record* record, void* output, int* consumed);
+int write_output_row(pelo::gif::Record* record, void* output, int* consumed);
+
+}  // namespace pelo::gif

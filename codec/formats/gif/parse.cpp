@@ -5,9 +5,7 @@
 #include "codec/base/byte_order.h"
 #include "codec/pixel/lanes.h"
 
-using namespace pelo;
-using namespace pelo::gif;
-
+namespace pelo::gif {
 namespace {
 
 constexpr uint8_t kImageSeparator = 0x2C;
@@ -34,7 +32,7 @@ bool read_table(Reader& reader, uint8_t flags, uint32_t* table) {
   const uint8_t* bytes = take(reader, 3 * count);
   if (bytes == nullptr) return false;
   std::fill_n(table, 256, 0u);
-  PELOI_MakeColorTable(bytes, count, table);
+  pack_table(bytes, count, table);
   return true;
 }
 
@@ -84,13 +82,13 @@ bool read_image_descriptor(Record& record) {
 
 }  // namespace
 
-void PELOI_MakeColorTable(const uint8_t* rgbBytes, int count, uint32_t* table) {
+void pack_table(const uint8_t* rgbBytes, int count, uint32_t* table) {
   for (int i = 0; i < count; ++i, rgbBytes += 3) {
     table[i] = pack_lanes(rgbBytes[0], rgbBytes[1], rgbBytes[2]);
   }
 }
 
-int PELOI_ParseGIFHeader(TAVIRPELO_IO* source, Record* record) {
+int parse_header(TAVIRPELO_IO* source, Record* record) {
   Reader& reader = record->reader;
   reader.source = source;
   reader.remaining = 0;
@@ -103,7 +101,7 @@ int PELOI_ParseGIFHeader(TAVIRPELO_IO* source, Record* record) {
   return (flags & 0x80) == 0 || read_table(reader, flags, record->globalTable);
 }
 
-int PELOI_SeekImageData(TAVIRPELO_IO* source, Record* record) {
+int seek_image(TAVIRPELO_IO* source, Record* record) {
   record->reader.source = source;
   for (;;) {
     const uint8_t* introducer = take(record->reader, 1);
@@ -121,3 +119,5 @@ int PELOI_SeekImageData(TAVIRPELO_IO* source, Record* record) {
     }
   }
 }
+
+}  // namespace pelo::gif

@@ -2,10 +2,9 @@
 
 #include <cstring>
 
-using namespace pelo::gif;
+namespace pelo::gif {
 
-int PELOI_CheckBuffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining,
-                      uint8_t** cursor) {
+int fill_buffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining, uint8_t** cursor) {
   if (*remaining >= need) return 1;
   if (need > kReaderBytes) return 0;
   if (*remaining > 0) std::memmove(buffer, *cursor, static_cast<size_t>(*remaining));
@@ -18,10 +17,8 @@ int PELOI_CheckBuffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* rema
   return 1;
 }
 
-namespace pelo::gif {
-
 const uint8_t* take(Reader& reader, int n) {
-  if (!PELOI_CheckBuffer(n, reader.source, reader.buffer, &reader.remaining, &reader.cursor)) {
+  if (!fill_buffer(n, reader.source, reader.buffer, &reader.remaining, &reader.cursor)) {
     reader.remaining = 0;  // the rest of what was cut is no block
     return nullptr;
   }

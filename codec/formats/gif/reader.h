@@ -24,9 +24,8 @@ const uint8_t* take(Reader& reader, int n);
 // Consumes data sub-blocks up to and with the empty one; false when the source ends before.
 [[nodiscard]] bool skip_sub_blocks(Reader& reader);
 
-}  // namespace pelo::gif
-
 // Makes `need` bytes stand at *cursor, moving unread ones to the buffer's start and reading behind them.
 // 1, or 0 when the source ends before.
-TAVIRPELO_API int PELOI_CheckBuffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining,
-                                    uint8_t** cursor);
+int fill_buffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining, uint8_t** cursor);
+
+}  // namespace pelo::gif

@@ -1,9 +1,8 @@
 #include "codec/formats/gif/record.h"
 
-using namespace pelo;
-using namespace pelo::gif;
+namespace pelo::gif {
 
-Record* PELOI_CreateGIFDecoderInfo(void) {
+Record* new_record(void) {
   auto record = os_new<Record>();
   if (record == nullptr) return nullptr;
   record->kind = Record::kKind;
@@ -11,11 +10,9 @@ Record* PELOI_CreateGIFDecoderInfo(void) {
   return record.release();
 }
 
-void PELOI_DelGIFDecoderInfo(Record* record) {
+void delete_record(Record* record) {
   OsDelete{}(record);
 }
-
-namespace pelo::gif {
 
 bool IndexPlane::allocate(Size wanted) {
   size = wanted;

@@ -121,10 +121,10 @@ struct Record : FormatState {
   bool inImage;             // animation: image rows are being decoded
 };
 
-}  // namespace pelo::gif
-
 // An empty record; null when memory is short.
-TAVIRPELO_API pelo::gif::Record* PELOI_CreateGIFDecoderInfo(void);
+pelo::gif::Record* new_record(void);
 
 // Frees a record and all it owns; null is ignored.
-TAVIRPELO_API void PELOI_DelGIFDecoderInfo(pelo::gif::Record* record);
+void delete_record(pelo::gif::Record* record);
+
+}  // namespace pelo::gif

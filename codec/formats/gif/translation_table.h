@@ -29,32 +29,29 @@ struct TranslationTable {
   Entry entries[kCodes];
 };
 
-}  // namespace pelo::gif
-
 // Writes one index.
-TAVIRPELO_API void PELOI_WriteCharacter(uint32_t character, int position, uint8_t* lineBuffer);
+void write_index(uint32_t character, int position, uint8_t* lineBuffer);
 
 // Writes the string of a code from `position` on, and up to kStringSlack bytes of anything behind it;
 // returns its first index. *errorFlag becomes 1 for a code that cannot exist.
-TAVIRPELO_API uint8_t PELOI_TranslateCode(uint32_t code, const pelo::gif::TranslationTable* table,
-                                          int position, uint8_t* lineBuffer, int* errorFlag);
+uint8_t translate(uint32_t code, const TranslationTable* table, int position, uint8_t* lineBuffer,
+                  int* errorFlag);
 
 // Makes `code` stand for the string of `prefix` (an existing code) with one more index.
-TAVIRPELO_API void PELOI_AddToTranslationTable(uint32_t prefix, uint8_t character, uint32_t code,
-                                               pelo::gif::TranslationTable* table);
+void add_entry(uint32_t prefix, uint8_t character, uint32_t code, TranslationTable* table);
 
 // Fills in the codes 0 to 2^minimumCodeSize + 1, each of one index. 1, or 0 for a size above 11.
-TAVIRPELO_API int PELOI_InitializeTransTBL(int minimumCodeSize, pelo::gif::TranslationTable* table);
+int init_table(int minimumCodeSize, TranslationTable* table);
 
-// The first three run once a code, so they are inline; `used` keeps them among the exported functions.
+// The first three run once a code, so they are inline.
 
-[[gnu::used]] inline void PELOI_WriteCharacter(uint32_t character, int position, uint8_t* lineBuffer) {
+inline void write_index(uint32_t character, int position, uint8_t* lineBuffer) {
   lineBuffer[position] = static_cast<uint8_t>(character);
 }
 
-[[gnu::used]] inline uint8_t PELOI_TranslateCode(uint32_t code, const pelo::gif::TranslationTable* table,
-                                                 int position, uint8_t* lineBuffer, int* errorFlag) {
-  if (code >= pelo::gif::kCodes) {
+inline uint8_t translate(uint32_t code, const TranslationTable* table, int position, uint8_t* lineBuffer,
+                         int* errorFlag) {
+  if (code >= kCodes) {
     *errorFlag = 1;
     return 0;
   }
@@ -62,14 +59,13 @@ TAVIRPELO_API int PELOI_InitializeTransTBL(int minimumCodeSize, pelo::gif::Trans
   const uint8_t first = entry->first;
   for (int offset = (entry->length + 7) & ~7; offset > 0;) {
     offset -= 8;
-    pelo::store_le64(lineBuffer + position + offset, entry->tail);
+    store_le64(lineBuffer + position + offset, entry->tail);
     entry = &table->entries[entry->before];
   }
   return first;
 }
 
-[[gnu::used]] inline void PELOI_AddToTranslationTable(uint32_t prefix, uint8_t character, uint32_t code,
-                                                      pelo::gif::TranslationTable* table) {
+inline void add_entry(uint32_t prefix, uint8_t character, uint32_t code, TranslationTable* table) {
   const auto& old = table->entries[prefix];
   auto& entry = table->entries[code];
   const int inTail = old.length & 7;  // 0: the last group is full
@@ -78,3 +74,5 @@ TAVIRPELO_API int PELOI_InitializeTransTBL(int minimumCodeSize, pelo::gif::Trans
   entry.length = static_cast<uint16_t>(old.length + 1);
   entry.first = old.first;
 }
+
+}  // namespace pelo::gif

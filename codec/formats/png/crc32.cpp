@@ -42,8 +42,8 @@ uint32_t crc32_update(uint32_t crc, const uint8_t* data, size_t size) {
   return crc;
 }
 
-}  // namespace pelo::png
-
-uint32_t __PELOI_PngCrc32(const uint8_t* data, uint32_t length) {
+uint32_t crc32(const uint8_t* data, uint32_t length) {
   return ~pelo::png::crc32_update(pelo::png::kCrcPreset, data, length);
 }
+
+}  // namespace pelo::png

@@ -13,7 +13,7 @@ constexpr uint32_t kCrcPreset = 0xFFFFFFFF;
 // The register after `size` more bytes. The checksum is the complement of the last register.
 uint32_t crc32_update(uint32_t crc, const uint8_t* data, size_t size);
 
-}  // namespace pelo::png
-
 // The checksum of a byte array.
-TAVIRPELO_API uint32_t __PELOI_PngCrc32(const uint8_t* data, uint32_t length);
+uint32_t crc32(const uint8_t* data, uint32_t length);
+
+}  // namespace pelo::png

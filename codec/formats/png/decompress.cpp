@@ -6,7 +6,6 @@
 #include "codec/base/byte_order.h"
 #include "codec/formats/png/crc32.h"
 #include "codec/formats/png/png_context.h"
-#include "codec/formats/png/unused_helpers.h"
 
 namespace pelo::png {
 namespace {
@@ -29,7 +28,7 @@ bool merge_chunks(PELOI_PNGCONTEXT& context) {
   }
   const auto length = static_cast<uint32_t>(info.idatLength);
   store_be32(data - 8, length);
-  store_be32(out, __PELOI_PngCrc32(data - 4, length + 4));
+  store_be32(out, crc32(data - 4, length + 4));
   std::memcpy(out + 4, kEmptyIend, sizeof kEmptyIend);
   info.idat[0].length = length;
   info.idatCount = 1;
@@ -49,7 +48,7 @@ Result open_memory_input(PELOI_PNGCONTEXT& context) {
 bool refill(void* opaque) {
   auto* context = static_cast<PELOI_PNGCONTEXT*>(opaque);
   PELOI_PNGREADBUFFER& reader = context->reader;
-  if (__checkbuffer_util1_multiPELOI_IDAT(context, &reader, context->idatEntry) != 1) return false;
+  if (refill_from_chunks(context, &reader, context->idatEntry) != 1) return false;
   InflateInput& input = context->inflater.input();
   input.next = reader.base + reader.cursor;
   input.end = input.next + reader.remaining;
@@ -114,16 +113,11 @@ int inflate_image(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInpu
 int inflate_interlaced(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput openInput) {
   const int result = inflate_image(context, total, openInput);
   if (result != kDone || !context.output.wholeImage) return result;
-  return __PELOI_WriteOutputDataFromINTBuffer(&context) ? kDone : kFailed;
+  return write_gathered_image(&context) ? kDone : kFailed;
 }
 
 }  // namespace
-}  // namespace pelo::png
-
-using namespace pelo::png;
-
-int __checkbuffer_util1_multiPELOI_IDAT(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer,
-                                        uint32_t entryIndex) {
+int refill_from_chunks(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer, uint32_t entryIndex) {
   PELOI_PNGINFO& info = context->info;
   while (entryIndex < info.idatCount && info.idat[entryIndex].length == 0) ++entryIndex;
   context->idatEntry = entryIndex;
@@ -146,15 +140,17 @@ int __checkbuffer_util1_multiPELOI_IDAT(PELOI_PNGCONTEXT* context, PELOI_PNGREAD
   return 1;
 }
 
-int _PELOI_PngInflateZStreamData(PELOI_PNGCONTEXT* context, uint32_t* total) {
+int inflate_memory(PELOI_PNGCONTEXT* context, uint32_t* total) {
   return inflate_image(*context, total, open_memory_input);
 }
-int _PELOI_PngInflateZStreamData_streamming(PELOI_PNGCONTEXT* context, uint32_t* total) {
+int inflate_stream(PELOI_PNGCONTEXT* context, uint32_t* total) {
   return inflate_image(*context, total, open_stream_input);
 }
-int _PELOI_PngInflateZStreamDataInterlaced(PELOI_PNGCONTEXT* context, uint32_t* total) {
+int inflate_interlaced_memory(PELOI_PNGCONTEXT* context, uint32_t* total) {
   return inflate_interlaced(*context, total, open_memory_input);
 }
-int _PELOI_PngInflateZStreamDataInterlaced_streamming(PELOI_PNGCONTEXT* context, uint32_t* total) {
+int inflate_interlaced_stream(PELOI_PNGCONTEXT* context, uint32_t* total) {
   return inflate_interlaced(*context, total, open_stream_input);
 }
+
+}  // namespace pelo::png

@@ -148,17 +148,17 @@ class TableBuilder {
 };
 
 }  // namespace
-}  // namespace pelo::png
-
-const uint32_t* __PELOI_PngBuildHuffmanTable(const uint8_t* lengths, int count, int alphabet,
-                                             PELOI_PNGHUFFMANPOOL* pool) {
+const uint32_t* build_table(const uint8_t* lengths, int count, int alphabet,
+                            PELOI_PNGHUFFMANPOOL* pool) {
   using namespace pelo::png;
   if (count < 0 || static_cast<size_t>(count) > kMaxSymbols || alphabet < 0 || alphabet > 2)
     return nullptr;
   return TableBuilder(*pool, static_cast<Alphabet>(alphabet)).build(lengths, static_cast<size_t>(count));
 }
 
-void PELOI_FreePNGHuffmanMemory(PELOI_PNGHUFFMANPOOL** pool) {
+void free_table(PELOI_PNGHUFFMANPOOL** pool) {
   TAVIRPELO_OsFree(*pool);
   *pool = nullptr;
 }
+
+}  // namespace pelo::png

@@ -54,12 +54,15 @@ typedef struct PELOI_PNGHUFFMANPOOL {
   std::array<uint32_t, pelo::png::kPoolEntries> entries;
 } PELOI_PNGHUFFMANPOOL;
 
+namespace pelo::png {
+
 // Builds the table of `count` symbols (at most 288) whose code lengths are given (0 to 15; 0 unused) in
 // the pool. Alphabet 0 literal/length, 1 distance, 2 code length. Returns its root; null when the
 // lengths are over-subscribed or the pool is full. Incomplete sets are accepted: their unassigned codes
 // lead to invalid entries.
-TAVIRPELO_API const uint32_t* __PELOI_PngBuildHuffmanTable(const uint8_t* lengths, int count,
-                                                           int alphabet, PELOI_PNGHUFFMANPOOL* pool);
+const uint32_t* build_table(const uint8_t* lengths, int count, int alphabet, PELOI_PNGHUFFMANPOOL* pool);
 
 // Frees a pool and clears its slot.
-TAVIRPELO_API void PELOI_FreePNGHuffmanMemory(PELOI_PNGHUFFMANPOOL** pool);
+void free_table(PELOI_PNGHUFFMANPOOL** pool);
+
+}  // namespace pelo::png

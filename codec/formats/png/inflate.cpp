@@ -173,9 +173,9 @@ Inflater::Step Inflater::fixed_tables() {
     std::fill(lengths.begin() + 144, lengths.begin() + 256, uint8_t{9});
     std::fill(lengths.begin() + 256, lengths.begin() + 280, uint8_t{7});
     std::fill(lengths.begin() + 280, lengths.end(), uint8_t{8});
-    fixedLiterals_ = __PELOI_PngBuildHuffmanTable(lengths.data(), 288, 0, fixedPool_.get());
+    fixedLiterals_ = build_table(lengths.data(), 288, 0, fixedPool_.get());
     std::fill(lengths.begin(), lengths.begin() + 30, uint8_t{5});
-    fixedDistances_ = __PELOI_PngBuildHuffmanTable(lengths.data(), 30, 1, fixedPool_.get());
+    fixedDistances_ = build_table(lengths.data(), 30, 1, fixedPool_.get());
   }
   literals_ = fixedLiterals_;
   distances_ = fixedDistances_;
@@ -195,15 +195,15 @@ Inflater::Step Inflater::dynamic_tables() {
   }
   PELOI_PNGHUFFMANPOOL* pool = dynamicPool_.get();
   pool->used = 0;
-  const uint32_t* table = __PELOI_PngBuildHuffmanTable(lengths.data(), 19, 2, pool);
+  const uint32_t* table = build_table(lengths.data(), 19, 2, pool);
   if (table == nullptr) return Step::kCorrupt;
   const auto literalCount = static_cast<int>(hlit + 257);
   const auto distanceCount = static_cast<int>(hdist + 1);
   const Step step = read_code_lengths(lengths, static_cast<size_t>(literalCount + distanceCount), table);
   if (step != Step::kNext) return step;
   pool->used = 0;
-  literals_ = __PELOI_PngBuildHuffmanTable(lengths.data(), literalCount, 0, pool);
-  distances_ = __PELOI_PngBuildHuffmanTable(lengths.data() + literalCount, distanceCount, 1, pool);
+  literals_ = build_table(lengths.data(), literalCount, 0, pool);
+  distances_ = build_table(lengths.data() + literalCount, distanceCount, 1, pool);
   return literals_ != nullptr && distances_ != nullptr ? Step::kNext : Step::kCorrupt;
 }
 

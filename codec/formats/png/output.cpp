@@ -9,10 +9,10 @@
 
 #include "codec/base/byte_order.h"
 #include "codec/base/row_progress.h"
+#include "codec/formats/png/png_context.h"
 #include "codec/pixel/blend.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_runs.h"
-#include "codec/formats/png/png_context.h"
 
 namespace pelo::png {
 namespace {
@@ -283,11 +283,7 @@ StoreRgba gathered_storer(const PELOI_PNGCONTEXT& context) {
 }
 
 }  // namespace
-}  // namespace pelo::png
-
-using namespace pelo::png;
-
-void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context) {
+void write_output_row(PELOI_PNGCONTEXT* context) {
   if (!has_output_row(*context)) return;
   OutputState& output = context->output;
   const uint8_t* row = context->scanline.finished;
@@ -300,7 +296,7 @@ void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context) {
   output.rows.advance();
 }
 
-int __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context) {
+int write_gathered_image(PELOI_PNGCONTEXT* context) {
   OutputState& output = context->output;
   if (output.store == nullptr) return 1;
   const pelo::StoreRgba store = gathered_storer(*context);
@@ -313,3 +309,5 @@ int __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context) {
   }
   return 1;
 }
+
+}  // namespace pelo::png

@@ -76,8 +76,8 @@ bool accepted(const PELOI_PNGINFO& info) {
 int parse_ihdr(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
   if (length != 13 || !need(buffer, length)) return kFailed;
   const uint8_t* p = take(buffer, length);
-  info.width = __PELOI_PngGetUINT32(p);
-  info.height = __PELOI_PngGetUINT32(p + 4);
+  info.width = load_uint32(p);
+  info.height = load_uint32(p + 4);
   info.bitDepth = p[8];
   info.colourType = p[9];
   const uint8_t compression = p[10], filter = p[11];
@@ -109,7 +109,7 @@ int parse_plte(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length
 }
 
 int parse_trns(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
-  if (__PELOI_PngParseTRNSbKGd(&info, &buffer, length, kTrns, &info.colourKey) != 1) return kFailed;
+  if (parse_transparency(&info, &buffer, length, kTrns, &info.colourKey) != 1) return kFailed;
   info.ancillaryFlags |= kTrnsRead;
   return kDone;
 }
@@ -145,8 +145,8 @@ ReadChunk reader_of(uint32_t type) {
 bool read_chunk_head(PELOI_PNGREADBUFFER& buffer, Chunk& chunk) {
   if (!need(buffer, 8)) return false;
   const uint8_t* head = take(buffer, 8);
-  chunk.length = __PELOI_PngGetUINT32(head);
-  chunk.type = __PELOI_PngGetUINT32(head + 4);
+  chunk.length = load_uint32(head);
+  chunk.type = load_uint32(head + 4);
   chunk.data = tell(buffer);
   return chunk.length <= buffer.limit;
 }
@@ -180,16 +180,12 @@ uint16_t grey_key(uint32_t value, uint8_t depth) {
 }
 
 }  // namespace
-}  // namespace pelo::png
-
-using namespace pelo::png;
-
-uint32_t __PELOI_PngGetUINT32(const uint8_t* bytes) {
+uint32_t load_uint32(const uint8_t* bytes) {
   return pelo::load_be32(bytes);
 }
 
-int __PELOI_PngParseTRNSbKGd(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer, uint32_t length, uint32_t,
-                             std::array<uint16_t, 3>* colourKey) {
+int parse_transparency(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer, uint32_t length, uint32_t,
+                       std::array<uint16_t, 3>* colourKey) {
   constexpr int kNoHeader = 3, kNotAllowed = 6;
   if ((info->criticalFlags & kIhdrRead) == 0) return kNoHeader;
   switch (info->colourType) {
@@ -215,7 +211,7 @@ int __PELOI_PngParseTRNSbKGd(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer, u
   }
 }
 
-int __PELOI_PngParserMain(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer) {
+int parse_chunks(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer) {
   info->idatCount = 0;
   info->ancillaryFlags = 0;
   for (const uint8_t byte : kSignature) {
@@ -228,3 +224,5 @@ int __PELOI_PngParserMain(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer) {
   } while (chunk.length != 0);
   return kDone;
 }
+
+}  // namespace pelo::png

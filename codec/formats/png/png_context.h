@@ -6,10 +6,10 @@
 #include "codec/base/axis_stepper.h"
 #include "codec/base/format_state.h"
 #include "codec/base/output_grid.h"
-#include "codec/pixel/rgba_store.h"
 #include "codec/formats/png/expand.h"
 #include "codec/formats/png/inflate.h"
 #include "codec/formats/png/png_info.h"
+#include "codec/pixel/rgba_store.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::png {
@@ -81,35 +81,31 @@ typedef struct PELOI_PNGCONTEXT : pelo::FormatState {
   TAVIRPELO_DECINFO* decInfo;  // of the current call
 } PELOI_PNGCONTEXT;
 
+namespace pelo::png {
+
 // Undoes one scanline's filter in place; its type stands in the byte before `row`.
-TAVIRPELO_API void __PELOI_PngReadFilterRow(PELOI_PNGCONTEXT* context, uint8_t* row,
-                                            const uint8_t* previousRow, size_t rowBytes);
+void unfilter_row(PELOI_PNGCONTEXT* context, uint8_t* row, const uint8_t* previousRow, size_t rowBytes);
 
 // Writes the next output row that the finished scanline gives, if there is one.
-TAVIRPELO_API void __PELOI_PngWriteDataToOutputBuffer(PELOI_PNGCONTEXT* context);
+void write_output_row(PELOI_PNGCONTEXT* context);
 
 // Writes the gathered whole image, rotated, into the output. 1, or 0 when it is cancelled between rows.
-TAVIRPELO_API int __PELOI_WriteOutputDataFromINTBuffer(PELOI_PNGCONTEXT* context);
+int write_gathered_image(PELOI_PNGCONTEXT* context);
 
 // Sets the pass's size in the information record, and answers the bytes of its rows (0 when it is
 // empty).
-TAVIRPELO_API uint32_t getPassRowBytes(PELOI_PNGCONTEXT* context, uint32_t fullWidth,
-                                       uint32_t fullHeight, int pass);
+uint32_t set_pass_size(PELOI_PNGCONTEXT* context, uint32_t fullWidth, uint32_t fullHeight, int pass);
 
 // Reads the next piece of the image data, at most 4096 bytes and never beyond the chunk of `entryIndex`
 // or, when that is used up, the next. 1, or 0 when there is none.
-TAVIRPELO_API int __checkbuffer_util1_multiPELOI_IDAT(PELOI_PNGCONTEXT* context,
-                                                      PELOI_PNGREADBUFFER* buffer, uint32_t entryIndex);
+int refill_from_chunks(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer, uint32_t entryIndex);
 
 // Decompress and write until the image ends or the mode says stop: a Result. `total` receives the number
 // of bytes decompressed so far.
-TAVIRPELO_API int _PELOI_PngInflateZStreamData(PELOI_PNGCONTEXT* context, uint32_t* total);
-TAVIRPELO_API int _PELOI_PngInflateZStreamData_streamming(PELOI_PNGCONTEXT* context, uint32_t* total);
-TAVIRPELO_API int _PELOI_PngInflateZStreamDataInterlaced(PELOI_PNGCONTEXT* context, uint32_t* total);
-TAVIRPELO_API int _PELOI_PngInflateZStreamDataInterlaced_streamming(PELOI_PNGCONTEXT* context,
-                                                                    uint32_t* total);
-
-namespace pelo::png {
+int inflate_memory(PELOI_PNGCONTEXT* context, uint32_t* total);
+int inflate_stream(PELOI_PNGCONTEXT* context, uint32_t* total);
+int inflate_interlaced_memory(PELOI_PNGCONTEXT* context, uint32_t* total);
+int inflate_interlaced_stream(PELOI_PNGCONTEXT* context, uint32_t* total);
 
 // ---- scanlines.cpp ----
 

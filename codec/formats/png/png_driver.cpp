@@ -6,7 +6,7 @@ namespace {
 // The state of a first call: reader, header, output.
 Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
   if (!open_read_buffer(context.reader, decInfo.pIO)) return kNoMemory;
-  if (__PELOI_PngParserMain(&context.info, &context.reader) != kDone) return kUnreadable;
+  if (parse_chunks(&context.info, &context.reader) != kDone) return kUnreadable;
   const PELOI_PNGINFO& info = context.info;
   if (info.width == 0 || info.height == 0 || info.idatCount == 0) return kUnreadable;
   if (info.colourType == kPalette && (info.criticalFlags & kPlteRead) == 0) return kUnreadable;
@@ -33,9 +33,8 @@ Result obtain(TAVIRPELO_DECINFO& decInfo, const Request& request, PELOI_PNGCONTE
 
 int decompress(PELOI_PNGCONTEXT& context) {
   using Decompress = int (*)(PELOI_PNGCONTEXT*, uint32_t*);
-  constexpr Decompress kVariants[2][2] = {
-      {_PELOI_PngInflateZStreamData, _PELOI_PngInflateZStreamData_streamming},
-      {_PELOI_PngInflateZStreamDataInterlaced, _PELOI_PngInflateZStreamDataInterlaced_streamming}};
+  constexpr Decompress kVariants[2][2] = {{inflate_memory, inflate_stream},
+                                          {inflate_interlaced_memory, inflate_interlaced_stream}};
   const size_t interlaced = context.info.interlace != 0 ? 1 : 0;
   const size_t streaming = is_memory(context.reader) ? 0 : 1;
   uint32_t total = 0;
@@ -73,58 +72,55 @@ int start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int l
   if (!usable(decInfo, output, width, height) || lines < 0) return 0;
   decInfo->scaleDenom = 1;
   decInfo->pngIterFlag = iterFlag;
-  return public_result(PELOI_FastImgDecodePng(decInfo, output, width, height, lines));
+  return public_result(decode_request(decInfo, output, width, height, lines));
 }
 
 }  // namespace
-}  // namespace pelo::png
-
-using namespace pelo::png;
-
-int PELOI_FastImgDecodePng(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
+int decode_request(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
   const Request request{width, height, decInfo->outFormat, decInfo->option};
   const int result = decode(*decInfo, output, request, lines);
-  if (result != kMore) PELOI_DestroyDecodePng(decInfo);
+  if (result != kMore) release(decInfo);
   return result;
 }
 
-int PELOI_DestroyDecodePng(TAVIRPELO_DECINFO* decInfo) {
+int release(TAVIRPELO_DECINFO* decInfo) {
   pelo::release_state<PELOI_PNGCONTEXT>(*decInfo);
   return 1;
 }
 
-int PELOI_GetAlphaTrFlag(TAVIRPELO_DECINFO* decInfo) {
+int needs_alpha(TAVIRPELO_DECINFO* decInfo) {
   if (decInfo == nullptr || decInfo->pIO == nullptr) return 0;
   const auto context = pelo::os_new<PELOI_PNGCONTEXT>();
   if (context == nullptr || !open_read_buffer(context->reader, decInfo->pIO)) return 0;
   // What was read before a failure decides.
-  static_cast<void>(__PELOI_PngParserMain(&context->info, &context->reader));
-  PELOI_DestroyDecodePng(decInfo);
+  static_cast<void>(parse_chunks(&context->info, &context->reader));
+  release(decInfo);
   const bool carriesAlpha = (context->info.colourType & 4) != 0;
   return carriesAlpha || (context->info.ancillaryFlags & kTrnsRead) != 0;
 }
 
-int TAVIRPELOI_DecodePNG(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   if (decInfo == nullptr) return 0;
-  PELOI_DestroyDecodePng(decInfo);
+  release(decInfo);
   return start(decInfo, output, width, height, 0, 0);
 }
 
-int TAVIRPELOI_DecodePNGLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
-                             int lines) {
+int decode_lines(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
   return start(decInfo, output, width, height, lines, 0);
 }
 
-int TAVIRPELOI_DecodePNGIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+int decode_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   return start(decInfo, output, width, height, 0, 1);
 }
 
-int TAVIRPELOI_DestroyPNGInfo(TAVIRPELO_DECINFO* decInfo) {
+int end_decode(TAVIRPELO_DECINFO* decInfo) {
   if (decInfo == nullptr) return 0;
-  PELOI_DestroyDecodePng(decInfo);
+  release(decInfo);
   return decInfo->pFormatInfo == nullptr;
 }
 
-int TAVIRPELOI_AbortPNGIter(TAVIRPELO_DECINFO* decInfo) {
-  return TAVIRPELOI_DestroyPNGInfo(decInfo);
+int abort(TAVIRPELO_DECINFO* decInfo) {
+  return end_decode(decInfo);
 }
+
+}  // namespace pelo::png

@@ -57,16 +57,19 @@ typedef struct PELOI_PNGINFO {
   uint32_t idatCount;
 } PELOI_PNGINFO;
 
+namespace pelo::png {
+
 // Reads the chunks from the source's start to the first empty chunk; their data are checked, not
 // decompressed. A Result: 1, 6 (a checksum differs), 7, 8.
-TAVIRPELO_API int __PELOI_PngParserMain(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer);
+int parse_chunks(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer);
 
 // Reads the `length` bytes of a tRNS chunk at the cursor into the palette's alpha or the colour key. 1;
 // 3 before any IHDR; 6 for a colour type or length that allows none; 8 when the read fails or there are
 // more values than palette entries. The chunk type is not looked at.
-TAVIRPELO_API int __PELOI_PngParseTRNSbKGd(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer,
-                                           uint32_t length, uint32_t chunkType,
-                                           std::array<uint16_t, 3>* colourKey);
+int parse_transparency(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer, uint32_t length,
+                       uint32_t chunkType, std::array<uint16_t, 3>* colourKey);
 
 // A big-endian 32-bit value.
-TAVIRPELO_API uint32_t __PELOI_PngGetUINT32(const uint8_t* bytes);
+uint32_t load_uint32(const uint8_t* bytes);
+
+}  // namespace pelo::png

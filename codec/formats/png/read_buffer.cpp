@@ -41,8 +41,8 @@ bool open_read_buffer(PELOI_PNGREADBUFFER& buffer, TAVIRPELO_IO* source) {
 bool need(PELOI_PNGREADBUFFER& buffer, uint32_t n) {
   while (buffer.remaining < n) {
     const uint32_t missing = n - buffer.remaining;
-    const int result = buffer.remaining == 0 ? __checkbuffer_util1(&buffer, missing)
-                                             : __checkbuffer_util2(&buffer, missing);
+    const int result =
+        buffer.remaining == 0 ? refill_empty(&buffer, missing) : refill_behind(&buffer, missing);
     if (result != 1) return false;
   }
   return true;
@@ -63,19 +63,17 @@ bool move_to(PELOI_PNGREADBUFFER& buffer, int64_t position) {
   return true;
 }
 
-}  // namespace pelo::png
-
-using namespace pelo::png;
-
-int __checkbuffer_util1(PELOI_PNGREADBUFFER* buffer, uint32_t need) {
+int refill_empty(PELOI_PNGREADBUFFER* buffer, uint32_t need) {
   if (need > kReadWindow || is_memory(*buffer)) return kReadFailed;
   buffer->remaining = 0;
   return fill(*buffer, kReadWindow);
 }
 
-int __checkbuffer_util2(PELOI_PNGREADBUFFER* buffer, uint32_t need) {
+int refill_behind(PELOI_PNGREADBUFFER* buffer, uint32_t need) {
   if (is_memory(*buffer) || need > kReadWindow - std::min(buffer->remaining, kReadWindow))
     return kReadFailed;
   std::memmove(buffer->base, buffer->base + buffer->cursor, buffer->remaining);
   return fill(*buffer, kReadWindow - buffer->remaining);
 }
+
+}  // namespace pelo::png

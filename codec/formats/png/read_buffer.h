@@ -18,14 +18,14 @@ typedef struct PELOI_PNGREADBUFFER {
   pelo::OsBuffer<uint8_t> window;
 } PELOI_PNGREADBUFFER;
 
+namespace pelo::png {
+
 // Refills an empty buffer; 1, or 11 when `need` exceeds 4096, the source is memory or has no more.
-TAVIRPELO_API int __checkbuffer_util1(PELOI_PNGREADBUFFER* buffer, uint32_t need);
+int refill_empty(PELOI_PNGREADBUFFER* buffer, uint32_t need);
 
 // Moves the unread bytes to the base and fills the rest; 1, or 11 when `need` more bytes exceed 4096,
 // the source is memory or has no more.
-TAVIRPELO_API int __checkbuffer_util2(PELOI_PNGREADBUFFER* buffer, uint32_t need);
-
-namespace pelo::png {
+int refill_behind(PELOI_PNGREADBUFFER* buffer, uint32_t need);
 
 constexpr uint32_t kReadWindow = 4096;
 

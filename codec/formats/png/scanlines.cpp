@@ -36,7 +36,7 @@ void begin_pass(PELOI_PNGCONTEXT& context, int number) {
 // False when there is none.
 bool next_pass(PELOI_PNGCONTEXT& context) {
   for (int number = context.pass.number + 1; number <= 7; ++number) {
-    if (getPassRowBytes(&context, context.fullWidth, context.fullHeight, number) == 0) continue;
+    if (set_pass_size(&context, context.fullWidth, context.fullHeight, number) == 0) continue;
     begin_pass(context, number);
     return true;
   }
@@ -55,7 +55,7 @@ bool at_end(PELOI_PNGCONTEXT& context) {
 // Restores the row just received.
 void finish_scanline(PELOI_PNGCONTEXT& context) {
   ScanlineState& scanline = context.scanline;
-  __PELOI_PngReadFilterRow(&context, scanline.current + 1, scanline.above + 1, scanline.rowBytes);
+  unfilter_row(&context, scanline.current + 1, scanline.above + 1, scanline.rowBytes);
   scanline.finished = scanline.current + 1;
   std::swap(scanline.current, scanline.above);
   scanline.filled = 0;
@@ -73,7 +73,7 @@ Result write_pending(PELOI_PNGCONTEXT& context) {
   const OutputState& output = context.output;
   while (context.scanline.finished != nullptr && has_output_row(context)) {
     if (!may_write(context)) return kFailed;
-    __PELOI_PngWriteDataToOutputBuffer(&context);
+    write_output_row(&context);
     if (output.stop != 0 && output.written >= output.stop && output.written < output.height)
       return kMore;
     if (!may_go_on()) return kFailed;
@@ -138,16 +138,11 @@ Result consume(PELOI_PNGCONTEXT& context) {
   }
 }
 
-}  // namespace pelo::png
-
-using namespace pelo::png;
-
-void __PELOI_PngReadFilterRow(PELOI_PNGCONTEXT* context, uint8_t* row, const uint8_t* previousRow,
-                              size_t rowBytes) {
+void unfilter_row(PELOI_PNGCONTEXT* context, uint8_t* row, const uint8_t* previousRow, size_t rowBytes) {
   unfilter(row[-1], row, previousRow, rowBytes, context->info.bytesPerPixel);
 }
 
-uint32_t getPassRowBytes(PELOI_PNGCONTEXT* context, uint32_t fullWidth, uint32_t fullHeight, int pass) {
+uint32_t set_pass_size(PELOI_PNGCONTEXT* context, uint32_t fullWidth, uint32_t fullHeight, int pass) {
   PELOI_PNGINFO& info = context->info;
   info.width = info.height = 0;
   if (pass < 1 || pass > 7) return 0;
@@ -159,3 +154,5 @@ uint32_t getPassRowBytes(PELOI_PNGCONTEXT* context, uint32_t fullWidth, uint32_t
   info.interlace = static_cast<uint8_t>(pass);
   return info.height == 0 ? 0 : static_cast<uint32_t>(row_bytes(info));
 }
+
+}  // namespace pelo::png
