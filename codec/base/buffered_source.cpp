@@ -5,7 +5,7 @@
 #include <cstddef>
 #include <cstring>
 
-using namespace pelo;
+#include "codec/base/io.h"
 
 static_assert(sizeof(void*) != 4 ||
               (sizeof(PELOJ_SOURCE) == 24 && offsetof(PELOJ_SOURCE, consumed) == 4 &&
@@ -19,7 +19,7 @@ bool read_behind(PELOJ_SOURCE& source, uint32_t room) {
   std::memmove(source.buffer, source.buffer + source.pos, source.avail);
   source.pos = 0;
   const int count =
-      room == 0 ? 0 : TAVIRPELO_Read_IO(source.io, source.buffer + source.avail, static_cast<int>(room));
+      room == 0 ? 0 : read_io(source.io, source.buffer + source.avail, static_cast<int>(room));
   if (count <= 0) return false;
   source.avail += static_cast<uint32_t>(count);
   source.consumed += static_cast<uint32_t>(count);
@@ -40,17 +40,13 @@ bool source_need(PELOJ_SOURCE& source, uint32_t n) {
   return true;
 }
 
-}  // namespace pelo
-
 // A single read, into the room that taken bytes left: what source_need does as often as it must.
-int PELOJ_CheckBuffer(PELOJ_SOURCE* source, int n) {
+int check_buffer(PELOJ_SOURCE* source, int n) {
   if (source == nullptr || source->buffer == nullptr) return 0;
   if (int64_t{source->avail} >= n) return 2;
   if (!has_room(*source, n)) return 0;
   return read_behind(*source, source->avail == 0 ? kSourceBufferSize : source->pos) ? 1 : 0;
 }
-
-namespace pelo {
 
 bool BufferedSource::open(TAVIRPELO_IO* io) {
   if (io == nullptr || !buffer_.allocate(kSourceBufferSize)) return false;
@@ -70,7 +66,7 @@ bool source_skip(PELOJ_SOURCE& source, int64_t k) {
   // The window is given up even when the seek fails, so that a later repositioning seeks again.
   source.consumed = static_cast<uint32_t>(target);
   source.pos = source.avail = 0;
-  return TAVIRPELO_Seek_IO(source.io, static_cast<int>(distance), SEEK_CUR) >= target;
+  return seek_io(source.io, static_cast<int>(distance), SEEK_CUR) >= target;
 }
 
 bool source_reposition(PELOJ_SOURCE& source, int64_t offset) {
@@ -84,7 +80,7 @@ bool source_reposition(PELOJ_SOURCE& source, int64_t offset) {
   if (offset < 0 || offset > INT_MAX) return false;
   source.consumed = static_cast<uint32_t>(offset);
   source.pos = source.avail = 0;
-  return TAVIRPELO_Seek_IO(source.io, static_cast<int>(offset), SEEK_SET) >= 0;
+  return seek_io(source.io, static_cast<int>(offset), SEEK_SET) >= 0;
 }
 
 }  // namespace pelo

@@ -18,11 +18,11 @@ typedef struct PELOJ_SOURCE {
   uint8_t* buffer;    // 4096 bytes
 } PELOJ_SOURCE;
 
+namespace pelo {
+
 // Makes n unread bytes available by one read at the most: 2 already there, 1 after a read that delivered
 // at least one byte (possibly fewer than n in all), 0 when there was nothing to read or no room for it.
-TAVIRPELO_API int PELOJ_CheckBuffer(PELOJ_SOURCE* source, int n);
-
-namespace pelo {
+int check_buffer(PELOJ_SOURCE* source, int n);
 
 constexpr uint32_t kSourceBufferSize = 4096;
 

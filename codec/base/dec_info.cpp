@@ -4,14 +4,14 @@
 #include <atomic>
 
 #include "codec/base/errors.h"
+#include "codec/base/io.h"
 #include "codec/base/os_memory.h"
 #include "tavirpelo/decinfo.h"
 
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_DECINFO) == 76);
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_CALLBACK) == 8);
 
-using namespace pelo;
-
+namespace pelo {
 namespace {
 
 constexpr int kDecoderVersion = 35010;
@@ -38,62 +38,64 @@ TAVIRPELO_DECINFO* finish(OsPtr<TAVIRPELO_DECINFO> decInfo, TAVIRPELO_IO* io, in
 
 }  // namespace
 
-void pelo::set_zoom_release(ReleaseZoom release) {
+void set_zoom_release(ReleaseZoom release) {
   releaseZoom.store(release);
 }
 
-TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfo(int ioType, void* source, int size, int outFormat,
-                                           uint32_t option) {
+TAVIRPELO_DECINFO* create_dec_info(int ioType, void* source, int size, int outFormat, uint32_t option) {
   auto decInfo = new_dec_info();
   if (!decInfo) return nullptr;
-  TAVIRPELO_IO* io = TAVIRPELO_Open_IO(ioType, source, size);
+  TAVIRPELO_IO* io = open_io(ioType, source, size);
   return finish(std::move(decInfo), io, outFormat, option);
 }
 
-TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfoWithStream(void* context, int size, TAVIRPELO_READFN pfRead,
-                                                     TAVIRPELO_SKIPFN pfSkip,
-                                                     TAVIRPELO_RESETFN pfReset, int outFormat,
-                                                     uint32_t option) {
+TAVIRPELO_DECINFO* create_dec_info_with_stream(void* context, int size, TAVIRPELO_READFN pfRead,
+                                               TAVIRPELO_SKIPFN pfSkip, TAVIRPELO_RESETFN pfReset,
+                                               int outFormat, uint32_t option) {
   auto decInfo = new_dec_info();
   if (!decInfo) return nullptr;
-  TAVIRPELO_IO* io = TAVIRPELO_Open_Stream(context, pfRead, pfSkip, pfReset, size);
+  TAVIRPELO_IO* io = open_stream(context, pfRead, pfSkip, pfReset, size);
   return finish(std::move(decInfo), io, outFormat, option);
 }
 
-int TAVIRPELO_DestroyDecInfo(TAVIRPELO_DECINFO* decInfo) {
+int destroy_dec_info(TAVIRPELO_DECINFO* decInfo) {
   record_error(ErrorWord::kObject, decInfo == nullptr ? TAVIRPELO_ERROR_NULL : TAVIRPELO_ERROR_NONE);
   if (decInfo == nullptr) return 0;
   const ReleaseZoom release = releaseZoom.load();
   if (decInfo->pZoomInfo != nullptr && release != nullptr) release(*decInfo);
-  TAVIRPELO_OsFree(decInfo->pCallback);
-  TAVIRPELO_Close_IO(decInfo->pIO);
-  TAVIRPELO_OsFree(decInfo);
+  os_free(decInfo->pCallback);
+  close_io(decInfo->pIO);
+  os_free(decInfo);
   return 1;
 }
 
-int TAVIRPELO_SetDecOption(TAVIRPELO_DECINFO* decInfo, uint32_t option) {
+int set_option(TAVIRPELO_DECINFO* decInfo, uint32_t option) {
   if (decInfo == nullptr) return 0;
   decInfo->option = decInfo->userOption = option;
   return 1;
 }
 
-int TAVIRPELO_SetDecMode(TAVIRPELO_DECINFO* decInfo, int mode) {
+int set_mode(TAVIRPELO_DECINFO* decInfo, int mode) {
   if (decInfo == nullptr) return 0;
   decInfo->decMode = mode < 0 ? 0 : mode > 4 ? 4 : mode;
   return 1;
 }
 
-int TAVIRPELO_GetErrorCode(void) {
+int object_error(void) {
   return error_code(ErrorWord::kObject);
 }
 
-int PELOJ_GetVersion(void) { return kDecoderVersion; }
+int decoder_version(void) {
+  return kDecoderVersion;
+}
 
-int PELOJ_SetCallback(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_PROGRESSFN function, intptr_t argument) {
+int set_callback(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_PROGRESSFN function, intptr_t argument) {
   if (decInfo == nullptr) return 0;
-  TAVIRPELO_OsFree(decInfo->pCallback);
+  os_free(decInfo->pCallback);
   decInfo->pCallback = os_new<TAVIRPELO_CALLBACK>().release();
   if (decInfo->pCallback == nullptr) return 0;
   *decInfo->pCallback = {argument, function};
   return 1;
 }
+
+}  // namespace pelo

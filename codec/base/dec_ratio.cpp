@@ -8,6 +8,7 @@
 
 #include "tavirpelo/decinfo.h"
 
+namespace pelo {
 namespace {
 
 constexpr int kOne = 1024;
@@ -32,7 +33,7 @@ int root(int64_t step) {
 
 }  // namespace
 
-int pelo::max_dec_ratio(int64_t needed, int64_t available) {
+int max_dec_ratio(int64_t needed, int64_t available) {
   if (needed < 0) return 0;
   if (needed > available) return kOne;
   if (available == 0) return 0;
@@ -41,6 +42,4 @@ int pelo::max_dec_ratio(int64_t needed, int64_t available) {
   return root(needed * 256 / available);
 }
 
-int PELO_GetMaxDecRatio(int needed, int available) {
-  return pelo::max_dec_ratio(needed, available);
-}
+}  // namespace pelo

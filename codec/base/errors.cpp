@@ -119,7 +119,8 @@ void begin_operation() {
 void record_error(ErrorWord word, int code) {
   std::atomic_ref<int>(*address_of(word)).store(code, std::memory_order_relaxed);
   // A raw image of another format than asked for is told by the word alone.
-  if (code == TAVIRPELO_ERROR_NONE || (word == ErrorWord::kCodec && code == TAVIRPELO_CODEC_RAW_FORMAT)) return;
+  if (code == TAVIRPELO_ERROR_NONE || (word == ErrorWord::kCodec && code == TAVIRPELO_CODEC_RAW_FORMAT))
+    return;
   lastFailure.word = word;
   lastFailure.code = code;
   if (lastFailure.reason == Reason::kNone) lastFailure.reason = reason_of(word, code);

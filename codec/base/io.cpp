@@ -1,5 +1,5 @@
 // Input sources: one object through which a decoder reads a file, a memory block or a caller's stream.
-#include "tavirpelo/io.h"
+#include "codec/base/io.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -7,12 +7,13 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "codec/base/errors.h"
 #include "codec/base/checked.h"
+#include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "tavirpelo/decinfo.h"
+#include "tavirpelo/io.h"
 
-using namespace pelo;
+namespace pelo {
 
 static_assert(sizeof(void*) != 4 || (sizeof(TAVIRPELO_IO) == 40 && offsetof(TAVIRPELO_IO, size) == 12 &&
                                      offsetof(TAVIRPELO_IO, pfRead) == 28));
@@ -45,7 +46,7 @@ Reason reason_of_open(int systemError) {
 
 bool open_path(TAVIRPELO_IO& io, const char* path, int size) {
   errno = 0;
-  FILE* stream = TAVIRPELO_OpenFile(path);
+  FILE* stream = open_file(path);
   if (stream == TAVIRPELO_INVALID_FILE) {
     refuse(reason_of_open(errno), "opening the source");
     return refuse_with(TAVIRPELO_ERROR_OPEN);
@@ -53,9 +54,9 @@ bool open_path(TAVIRPELO_IO& io, const char* path, int size) {
   io.hFile = stream;
   io.size = size;
   if (size > 0) return true;
-  io.size = TAVIRPELO_Seek_IO(&io, 0, SEEK_END);
+  io.size = seek_io(&io, 0, SEEK_END);
   if (io.size == 0) return refuse(Reason::kEmpty, "opening the source");
-  return io.size > 0 && TAVIRPELO_Seek_IO(&io, 0, SEEK_SET) == 0;
+  return io.size > 0 && seek_io(&io, 0, SEEK_SET) == 0;
 }
 
 bool open_memory(TAVIRPELO_IO& io, void* block, int size) {
@@ -76,7 +77,7 @@ bool plausible_handle(const FILE* handle) {
 bool open_handle(TAVIRPELO_IO& io, FILE* handle, int size) {
   if (!plausible_handle(handle)) return refuse_with(TAVIRPELO_ERROR_OPEN);
   io.hFile = handle;
-  io.base = TAVIRPELO_SeekFile(handle, 0, SEEK_CUR);
+  io.base = seek_file(handle, 0, SEEK_CUR);
   if (io.base < 0) return refuse_with(TAVIRPELO_ERROR_OPEN);  // cannot seek, and nothing else is offered
   io.size = size;
   return size > 0;
@@ -109,8 +110,8 @@ OsPtr<TAVIRPELO_IO> new_io(int kind) {
 int read_memory(const TAVIRPELO_IO& io, void* destination, int length) {
   const int count = std::min(length, io.size - io.position);
   if (count < 1) return 0;
-  TAVIRPELO_OsMemcpy(destination, static_cast<const uint8_t*>(io.pSource) + io.position,
-                     static_cast<size_t>(count));
+  os_memcpy(destination, static_cast<const uint8_t*>(io.pSource) + io.position,
+            static_cast<size_t>(count));
   return count;
 }
 
@@ -156,7 +157,7 @@ int seek_handle(TAVIRPELO_IO& io, int offset, int whence) {
       return io.position - io.base;
   }
   const auto inRange = checked_int(target);
-  const int reached = inRange ? TAVIRPELO_SeekFile(io.hFile, *inRange, from) : -1;
+  const int reached = inRange ? seek_file(io.hFile, *inRange, from) : -1;
   if (reached < 0) return -1;
   io.position = reached;
   return reached - io.base;
@@ -186,16 +187,16 @@ int seek_stream(TAVIRPELO_IO& io, int offset, int whence) {
 
 }  // namespace
 
-TAVIRPELO_IO* TAVIRPELO_Open_IO(int ioType, void* source, int size) {
+TAVIRPELO_IO* open_io(int ioType, void* source, int size) {
   auto io = new_io(ioType);
   if (io == nullptr) return nullptr;
   if (open_kind(*io, source, size)) return io.release();
-  if (ioType == TAVIRPELO_IO_FILE) TAVIRPELO_CloseFile(io->hFile);
+  if (ioType == TAVIRPELO_IO_FILE) close_file(io->hFile);
   return nullptr;
 }
 
-TAVIRPELO_IO* TAVIRPELO_Open_Stream(void* context, TAVIRPELO_READFN pfRead, TAVIRPELO_SKIPFN pfSkip,
-                                    TAVIRPELO_RESETFN pfReset, int size) {
+TAVIRPELO_IO* open_stream(void* context, TAVIRPELO_READFN pfRead, TAVIRPELO_SKIPFN pfSkip,
+                          TAVIRPELO_RESETFN pfReset, int size) {
   auto io = new_io(TAVIRPELO_IO_STREAM);
   if (io == nullptr) return nullptr;
   io->pSource = context;
@@ -206,13 +207,13 @@ TAVIRPELO_IO* TAVIRPELO_Open_Stream(void* context, TAVIRPELO_READFN pfRead, TAVI
   return io.release();
 }
 
-int TAVIRPELO_Read_IO(TAVIRPELO_IO* io, void* destination, int length) {
+int read_io(TAVIRPELO_IO* io, void* destination, int length) {
   if (io == nullptr) return -1;
   length = destination == nullptr ? 0 : std::max(length, 0);
   int count;
   switch (io->ioType) {
     case TAVIRPELO_IO_FILE:
-      count = TAVIRPELO_ReadFile(io->hFile, destination, length);
+      count = read_file(io->hFile, destination, length);
       break;
     case TAVIRPELO_IO_MEMORY:
       count = read_memory(*io, destination, length);
@@ -228,11 +229,11 @@ int TAVIRPELO_Read_IO(TAVIRPELO_IO* io, void* destination, int length) {
   return count;
 }
 
-int TAVIRPELO_Seek_IO(TAVIRPELO_IO* io, int offset, int whence) {
+int seek_io(TAVIRPELO_IO* io, int offset, int whence) {
   if (io == nullptr) return -1;
   switch (io->ioType) {
     case TAVIRPELO_IO_FILE:
-      return io->position = TAVIRPELO_SeekFile(io->hFile, offset, whence);
+      return io->position = seek_file(io->hFile, offset, whence);
     case TAVIRPELO_IO_MEMORY:
       return seek_memory(*io, offset, whence);
     case TAVIRPELO_IO_HANDLE:
@@ -244,15 +245,15 @@ int TAVIRPELO_Seek_IO(TAVIRPELO_IO* io, int offset, int whence) {
   }
 }
 
-int TAVIRPELO_Tell_IO(const TAVIRPELO_IO* io) {
+int tell_io(const TAVIRPELO_IO* io) {
   return io == nullptr ? -1 : io->position - io->base;
 }
 
-int TAVIRPELO_Close_IO(TAVIRPELO_IO* io) {
+int close_io(TAVIRPELO_IO* io) {
   if (io == nullptr) return 0;
   switch (io->ioType) {
     case TAVIRPELO_IO_FILE:
-      TAVIRPELO_CloseFile(io->hFile);
+      close_file(io->hFile);
       break;
     case TAVIRPELO_IO_MEMORY:
     case TAVIRPELO_IO_HANDLE:
@@ -263,14 +264,14 @@ int TAVIRPELO_Close_IO(TAVIRPELO_IO* io) {
     default:
       return 0;
   }
-  TAVIRPELO_OsFree(io);
+  os_free(io);
   return 1;
 }
 
-int TAVIRPELO_SetStreamReadSize(TAVIRPELO_DECINFO* decInfo, int readSize) {
+int set_read_size(TAVIRPELO_DECINFO* decInfo, int readSize) {
   if (decInfo == nullptr || decInfo->pIO == nullptr) return 0;
   decInfo->pIO->readSize = readSize;
   return 1;
 }
 
-void TAVIRPELO_PrintMessage(const char*) {}
+}  // namespace pelo

@@ -14,11 +14,14 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "codec/base/os.h"
 #include "codec/base/os_memory.h"
 #include "platform/fault_injection.h"
 #include "tavirpelo/io.h"
 
-using pelo::faults::allocations;
+namespace pelo {
+
+using faults::allocations;
 
 namespace {
 
@@ -60,93 +63,89 @@ FILE* open_regular(const char* path, const char* mode) {
 
 // ---- memory ----
 
-void* TAVIRPELO_OsMalloc(size_t size) {
+void* os_malloc(size_t size) {
   if (size == 0 || allocations.hit()) return nullptr;
   return std::malloc(size);
 }
 
-void* pelo::os_zeroed(size_t size) {
+void* os_zeroed(size_t size) {
   if (size == 0 || allocations.hit()) return nullptr;
   return std::calloc(1, size);
 }
 
-void TAVIRPELO_OsFree(void* pointer) {
+void os_free(void* pointer) {
   std::free(pointer);
 }
 
-void* TAVIRPELO_OsRealloc(void* pointer, size_t size) {
+void* os_realloc(void* pointer, size_t size) {
   if (allocations.hit()) return nullptr;
   return std::realloc(pointer, size);
 }
 
 // The C functions may not be given null even for no bytes.
-void* TAVIRPELO_OsMemcpy(void* destination, const void* source, size_t size) {
+void* os_memcpy(void* destination, const void* source, size_t size) {
   return size == 0 ? destination : std::memcpy(destination, source, size);
 }
 
-void* TAVIRPELO_OsMemset(void* destination, int value, size_t size) {
+void* os_memset(void* destination, int value, size_t size) {
   return size == 0 ? destination : std::memset(destination, value, size);
 }
 
 // ---- files ----
 
-FILE* TAVIRPELO_OsFopen(const char* path, const char* mode) {
+FILE* os_open(const char* path, const char* mode) {
   if (path == nullptr) return nullptr;
   return reads_only(mode) ? open_regular(path, mode) : std::fopen(path, mode);
 }
 
-size_t TAVIRPELO_OsFread(void* buffer, size_t size, size_t count, FILE* stream) {
+size_t os_read(void* buffer, size_t size, size_t count, FILE* stream) {
   return std::fread(buffer, size, count, stream);
 }
 
-size_t TAVIRPELO_OsFwrite(const void* buffer, size_t size, size_t count, FILE* stream) {
+size_t os_write(const void* buffer, size_t size, size_t count, FILE* stream) {
   return std::fwrite(buffer, size, count, stream);
 }
 
-int TAVIRPELO_OsFseek(FILE* stream, long offset, int whence) {
+int os_seek(FILE* stream, long offset, int whence) {
   return std::fseek(stream, offset, whence);
 }
 
-long TAVIRPELO_OsFtell(FILE* stream) {
+long os_tell(FILE* stream) {
   return std::ftell(stream);
 }
 
-int TAVIRPELO_OsFclose(FILE* stream) {
+int os_close(FILE* stream) {
   return std::fclose(stream);
 }
 
-FILE* TAVIRPELO_OpenFile(const char* path) {
-  FILE* stream = TAVIRPELO_OsFopen(path, "rb");
+FILE* open_file(const char* path) {
+  FILE* stream = os_open(path, "rb");
   return stream != nullptr ? stream : TAVIRPELO_INVALID_FILE;
 }
 
-int TAVIRPELO_ReadFile(FILE* stream, void* buffer, int length) {
+int read_file(FILE* stream, void* buffer, int length) {
   if (!usable(stream) || buffer == nullptr || length < 1) return 0;
-  return static_cast<int>(TAVIRPELO_OsFread(buffer, 1, static_cast<size_t>(length), stream));
+  return static_cast<int>(os_read(buffer, 1, static_cast<size_t>(length), stream));
 }
 
 // A refused seek is not an error of its own: the caller compares the position with what it asked for.
-int TAVIRPELO_SeekFile(FILE* stream, int offset, int whence) {
+int seek_file(FILE* stream, int offset, int whence) {
   if (!usable(stream)) return -1;
-  (void)TAVIRPELO_OsFseek(stream, offset, whence);
-  const long position = TAVIRPELO_OsFtell(stream);
+  (void)os_seek(stream, offset, whence);
+  const long position = os_tell(stream);
   return position < 0 || position > INT_MAX ? -1 : static_cast<int>(position);
 }
 
-int TAVIRPELO_CloseFile(FILE* stream) {
-  return usable(stream) ? TAVIRPELO_OsFclose(stream) : EOF;
+int close_file(FILE* stream) {
+  return usable(stream) ? os_close(stream) : EOF;
 }
 
 // ---- tasks ----
 
-unsigned long TAVIRPELO_OsThreadCreate(void* (*routine)(void*), void* argument) {
+unsigned long os_start_thread(void* (*routine)(void*), void* argument) {
   pthread_t thread;
   if (pthread_create(&thread, nullptr, routine, argument) != 0) return 0;
   return static_cast<unsigned long>(thread);
 }
 
-void TAVIRPELO_OsSleep(int) {}
-
-void TAVIRPELO_CheckExStatus(int* status) {
-  if (status != nullptr) *status = 0;
-}
+}  // namespace pelo

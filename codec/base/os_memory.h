@@ -8,13 +8,9 @@
 #include <utility>
 
 #include "codec/base/checked.h"
-#include "tavirpelo/io.h"
+#include "codec/base/os.h"
 
 namespace pelo {
-
-// `size` zero bytes, to be freed with TAVIRPELO_OsFree; null for 0 or when memory is short. Large blocks
-// are fresh pages of the system, which take no room until they are written.
-void* os_zeroed(size_t size);
 
 // A block of `count` trivial elements, zero-filled, freed with the OS layer.
 template <class T>
@@ -47,16 +43,16 @@ class OsBuffer {
   [[nodiscard]] bool grow(size_t count) {
     OsBuffer larger;
     if (count < count_ || !larger.allocate(count)) return false;
-    TAVIRPELO_OsMemcpy(larger.data_, data_, count_ * sizeof(T));
+    os_memcpy(larger.data_, data_, count_ * sizeof(T));
     swap(larger);
     return true;
   }
   void reset() {
-    TAVIRPELO_OsFree(data_);
+    os_free(data_);
     data_ = nullptr;
     count_ = 0;
   }
-  // Hands the block to the caller, who frees it with TAVIRPELO_OsFree.
+  // Hands the block to the caller, who frees it with os_free.
   [[nodiscard]] T* release() {
     count_ = 0;
     return std::exchange(data_, nullptr);
@@ -84,7 +80,7 @@ struct OsDelete {
   void operator()(T* object) const {
     if (object == nullptr) return;
     object->~T();
-    TAVIRPELO_OsFree(object);
+    os_free(object);
   }
 };
 template <class T>
@@ -93,7 +89,7 @@ using OsPtr = std::unique_ptr<T, OsDelete>;
 // A value-initialised object in OS-layer memory; empty when memory is short.
 template <class T>
 [[nodiscard]] OsPtr<T> os_new() {
-  void* memory = TAVIRPELO_OsMalloc(sizeof(T));
+  void* memory = os_malloc(sizeof(T));
   return OsPtr<T>(memory == nullptr ? nullptr : new (memory) T());
 }
 

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "codec/decode/one_call.h"
@@ -23,11 +24,11 @@ int fail(int code) {
 bool find_image_size(const char* path, TAVIRPELO_CROPRECT& rect) {
   if (rect.imageWidth != 0 && rect.imageHeight != 0) return true;
   TAVIRPELO_DECINFO* decInfo =
-      TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_FILE, const_cast<char*>(path), 0, TAVIRPELO_RGB565, 0);
+      create_dec_info(TAVIRPELO_IO_FILE, const_cast<char*>(path), 0, TAVIRPELO_RGB565, 0);
   if (decInfo == nullptr) return false;
   TAVIRPELO_HINFO header{};
   const bool found = TAVIRPELO_Parser(decInfo, &header) != TAVIRPELO_FORMAT_UNKNOWN;
-  TAVIRPELO_DestroyDecInfo(decInfo);
+  destroy_dec_info(decInfo);
   if (!found) return false;
   rect.imageWidth = header.width;
   rect.imageHeight = header.height;
@@ -50,10 +51,10 @@ Plan plan_decode(const TAVIRPELO_CROPRECT& rect, Size region) {
 
 int decode_small(const char* path, void* outBuffer, int width, int height) {
   TAVIRPELO_DECINFO* decInfo =
-      TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_FILE, const_cast<char*>(path), 0, TAVIRPELO_RGB565, 0);
+      create_dec_info(TAVIRPELO_IO_FILE, const_cast<char*>(path), 0, TAVIRPELO_RGB565, 0);
   if (decInfo == nullptr) return 0;
   const int result = jpeg::decode(decInfo, outBuffer, width, height);
-  TAVIRPELO_DestroyDecInfo(decInfo);
+  destroy_dec_info(decInfo);
   return result;
 }
 

@@ -24,8 +24,7 @@ constexpr const char* kStage = "format detection";
 constexpr Format kFormats[] = {
     {jpeg::sniff, jpeg::parse_head, jpeg::decode, TAVIRPELO_FORMAT_JPEG, 0},
     {png::sniff, png::parse_head, png::decode, TAVIRPELO_FORMAT_PNG, 0},
-    {gif::sniff, gif::parse_head, gif::decode, TAVIRPELO_FORMAT_GIF,
-     TAVIRPELO_FORMAT_ANIMATED_GIF},
+    {gif::sniff, gif::parse_head, gif::decode, TAVIRPELO_FORMAT_GIF, TAVIRPELO_FORMAT_ANIMATED_GIF},
     {bmp::sniff, bmp::parse_head, bmp::decode, TAVIRPELO_FORMAT_BMP, 0},
     {bmp::sniff_wbmp, bmp::parse_wbmp_head, bmp::decode_wbmp, TAVIRPELO_FORMAT_WBMP, 0},
 };

@@ -2,6 +2,7 @@
 
 #include <memory>
 
+#include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
 #include "codec/formats/gif/driver.h"
 #include "tavirpelo/decode.h"
@@ -10,12 +11,12 @@ namespace pelo {
 namespace {
 
 struct DestroyObject {
-  void operator()(TAVIRPELO_DECINFO* decInfo) const { TAVIRPELO_DestroyDecInfo(decInfo); }
+  void operator()(TAVIRPELO_DECINFO* decInfo) const { destroy_dec_info(decInfo); }
 };
 using Object = std::unique_ptr<TAVIRPELO_DECINFO, DestroyObject>;
 
 Object open(const PictureSource& source, int format, uint32_t option) {
-  return Object(TAVIRPELO_CreateDecInfo(source.ioType, source.address, source.size, format, option));
+  return Object(create_dec_info(source.ioType, source.address, source.size, format, option));
 }
 
 }  // namespace
@@ -72,7 +73,7 @@ int decode_frame(const PictureSource& source, const TAVIRPELO_RAWINFO& raw, uint
   }
   if (result != 0 && result != kNoFurtherFrame) return 1;
   gif::abort_animation(*handle);
-  TAVIRPELO_DestroyDecInfo(*handle);
+  destroy_dec_info(*handle);
   *handle = nullptr;
   return result;
 }

@@ -6,7 +6,7 @@
 
 namespace pelo {
 
-// A picture's source as TAVIRPELO_CreateDecInfo takes it.
+// A picture's source as create_dec_info takes it.
 struct PictureSource {
   int ioType;
   void* address;

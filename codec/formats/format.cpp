@@ -1,5 +1,7 @@
 #include "codec/formats/format.h"
 
+#include "codec/base/io.h"
+
 namespace pelo {
 
 int parse_source(TAVIRPELO_DECINFO& decInfo, TAVIRPELO_HINFO* hinfo, Detect detect) {
@@ -9,7 +11,7 @@ int parse_source(TAVIRPELO_DECINFO& decInfo, TAVIRPELO_HINFO* hinfo, Detect dete
     record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_MEMORY);
     return TAVIRPELO_FORMAT_UNKNOWN;
   }
-  if (TAVIRPELO_Seek_IO(decInfo.pIO, 0, SEEK_SET) < 0) return TAVIRPELO_FORMAT_UNKNOWN;
+  if (seek_io(decInfo.pIO, 0, SEEK_SET) < 0) return TAVIRPELO_FORMAT_UNKNOWN;
   decInfo.imageFormat = detect(decInfo, *source.get(), hinfo);
   if (hinfo != nullptr) {
     hinfo->width = decInfo.imageWidth;

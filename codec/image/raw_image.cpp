@@ -105,8 +105,8 @@ TAVIRPELO_RAWINFO* create_raw_image(int width, int height, int format) {
 
 void destroy_raw_image(TAVIRPELO_RAWINFO* raw) {
   if (raw == nullptr) return;
-  TAVIRPELO_OsFree(raw->pData);
-  TAVIRPELO_OsFree(raw);
+  os_free(raw->pData);
+  os_free(raw);
 }
 
 }  // namespace pelo

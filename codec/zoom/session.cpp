@@ -2,6 +2,7 @@
 #include "codec/zoom/session.h"
 
 #include "codec/base/errors.h"
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/zoom/task.h"
 #include "codec/zoom/zoom.h"
@@ -37,9 +38,9 @@ void release_state(TAVIRPELO_DECINFO& decInfo) {
   TAVIRPELO_ZOOMINFO* zoom = decInfo.pZoomInfo;
   if (zoom == nullptr) return;
   end_task(*zoom);
-  TAVIRPELO_OsFree(zoom->pZoomImage);
-  TAVIRPELO_OsFree(zoom->pZoomedImage);
-  TAVIRPELO_OsFree(zoom);
+  os_free(zoom->pZoomImage);
+  os_free(zoom->pZoomedImage);
+  os_free(zoom);
   decInfo.pZoomInfo = nullptr;
 }
 

@@ -1,4 +1,5 @@
 // The whole picture rendered at the current zoom, and views copied from it.
+#include "codec/base/os.h"
 #include "codec/pixel/packers.h"
 #include "codec/zoom/draw.h"
 #include "codec/zoom/session.h"
@@ -32,8 +33,8 @@ void copy_view(const TAVIRPELO_ZOOMINFO& zoom, const Display& display) {
   const auto* from = static_cast<const uint8_t*>(zoom.pZoomedImage) +
                      (ptrdiff_t{zoom.viewY} * zoom.zoomedWidth + zoom.viewX) * bytes;
   for (ptrdiff_t y = 0; y < shown.size.height; ++y) {
-    TAVIRPELO_OsMemcpy(shown.first + y * display.size.width * bytes, from + y * zoom.zoomedWidth * bytes,
-                       static_cast<size_t>(shown.size.width * bytes));
+    os_memcpy(shown.first + y * display.size.width * bytes, from + y * zoom.zoomedWidth * bytes,
+              static_cast<size_t>(shown.size.width * bytes));
   }
 }
 

@@ -1,4 +1,5 @@
 // Callback streams as sources, and short memory in every step of opening and parsing one.
+#include "codec/base/base_abi.h"
 #include "codec/base/buffered_source.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"

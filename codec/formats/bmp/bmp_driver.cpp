@@ -2,6 +2,7 @@
 #include <climits>
 #include <cstdio>
 
+#include "codec/base/io.h"
 #include "codec/formats/bmp/bmp_record.h"
 
 namespace pelo::bmp {
@@ -16,7 +17,7 @@ bool usable(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int
 
 // Rewinds the source; false for a memory source too short for the headers.
 bool rewind(TAVIRPELO_IO* io) {
-  TAVIRPELO_Seek_IO(io, 0, SEEK_SET);
+  seek_io(io, 0, SEEK_SET);
   return io->ioType != TAVIRPELO_IO_MEMORY || (io->pSource != nullptr && io->size >= kHeadBytes);
 }
 

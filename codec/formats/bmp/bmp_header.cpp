@@ -6,6 +6,7 @@
 #include "codec/base/axis_stepper.h"
 #include "codec/base/byte_order.h"
 #include "codec/base/geometry.h"
+#include "codec/base/io.h"
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/pixel/packers.h"
 
@@ -25,8 +26,8 @@ bool read_at(TAVIRPELO_IO* io, int64_t offset, uint8_t* out, int64_t count) {
     return true;
   }
   const auto target = static_cast<int>(offset);
-  return io->ioType == TAVIRPELO_IO_FILE && TAVIRPELO_Seek_IO(io, target, SEEK_SET) == target &&
-         TAVIRPELO_Read_IO(io, out, static_cast<int>(count)) == count;
+  return io->ioType == TAVIRPELO_IO_FILE && seek_io(io, target, SEEK_SET) == target &&
+         read_io(io, out, static_cast<int>(count)) == count;
 }
 
 // ---- headers ----

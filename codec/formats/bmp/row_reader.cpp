@@ -2,6 +2,8 @@
 
 #include <cstdio>
 
+#include "codec/base/io.h"
+
 namespace pelo::bmp {
 namespace {
 
@@ -10,8 +12,8 @@ constexpr int64_t kMaxChunk = 1 << 20;  // bytes
 // The bytes at an offset; as many as there are, 0 when the source cannot be moved.
 int read_at(TAVIRPELO_IO* io, int64_t offset, uint8_t* out, int64_t count) {
   const auto target = checked_int(offset);
-  if (!target || TAVIRPELO_Seek_IO(io, *target, SEEK_SET) != *target) return 0;
-  return std::max(0, TAVIRPELO_Read_IO(io, out, static_cast<int>(count)));
+  if (!target || seek_io(io, *target, SEEK_SET) != *target) return 0;
+  return std::max(0, read_io(io, out, static_cast<int>(count)));
 }
 
 }  // namespace

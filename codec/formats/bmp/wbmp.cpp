@@ -8,6 +8,7 @@
 
 #include "codec/base/axis_stepper.h"
 #include "codec/base/geometry.h"
+#include "codec/base/io.h"
 #include "codec/base/output_grid.h"
 #include "codec/base/row_progress.h"
 #include "codec/formats/bmp/row_reader.h"
@@ -50,13 +51,13 @@ bool parse(const uint8_t* data, int size, Wbmp& wbmp) {
 }
 
 bool read_header(TAVIRPELO_IO* io, Wbmp& wbmp) {
-  if (TAVIRPELO_Seek_IO(io, 0, SEEK_SET) != 0 || io->size <= 3) return false;
+  if (seek_io(io, 0, SEEK_SET) != 0 || io->size <= 3) return false;
   if (io->ioType == TAVIRPELO_IO_MEMORY) {
     return parse(static_cast<const uint8_t*>(io->pSource), io->size, wbmp);
   }
   if (io->ioType != TAVIRPELO_IO_FILE) return false;
   uint8_t head[kHeadBytes];
-  return parse(head, TAVIRPELO_Read_IO(io, head, kHeadBytes), wbmp);
+  return parse(head, read_io(io, head, kHeadBytes), wbmp);
 }
 
 // Black or white in an output format.

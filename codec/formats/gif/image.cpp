@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <climits>
 
+#include "codec/base/io.h"
 #include "codec/formats/gif/animation.h"
 #include "codec/formats/gif/geometry.h"
 #include "codec/formats/gif/interlace.h"
@@ -22,7 +23,7 @@ int end_of_data(Record& record, Supply supply) {
     case Supply::kTerminated:
       return kDone;
     case Supply::kCut:  // a file that simply ends is decoded as far as it goes
-      return TAVIRPELO_Tell_IO(record.reader.source) == record.reader.source->size ? kDone : kFailure;
+      return tell_io(record.reader.source) == record.reader.source->size ? kDone : kFailure;
     default:
       return kFailure;
   }

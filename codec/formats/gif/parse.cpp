@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "codec/base/byte_order.h"
+#include "codec/base/io.h"
 #include "codec/pixel/lanes.h"
 
 namespace pelo::gif {
@@ -92,7 +93,7 @@ int parse_header(TAVIRPELO_IO* source, Record* record) {
   Reader& reader = record->reader;
   reader.source = source;
   reader.remaining = 0;
-  if (TAVIRPELO_Seek_IO(source, 0, SEEK_SET) < 0) return 0;
+  if (seek_io(source, 0, SEEK_SET) < 0) return 0;
   const uint8_t* b = take(reader, 13);
   if (b == nullptr || !is_signature(b)) return 0;
   record->screen = {load_le16(b + 6), load_le16(b + 8)};

@@ -2,6 +2,8 @@
 
 #include <cstring>
 
+#include "codec/base/io.h"
+
 namespace pelo::gif {
 
 int fill_buffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining, uint8_t** cursor) {
@@ -10,7 +12,7 @@ int fill_buffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining,
   if (*remaining > 0) std::memmove(buffer, *cursor, static_cast<size_t>(*remaining));
   *cursor = buffer;
   while (*remaining < need) {
-    const int count = TAVIRPELO_Read_IO(source, buffer + *remaining, kReaderBytes - *remaining);
+    const int count = read_io(source, buffer + *remaining, kReaderBytes - *remaining);
     if (count < 1) return 0;
     *remaining += count;
   }

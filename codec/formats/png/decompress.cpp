@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "codec/base/byte_order.h"
+#include "codec/base/io.h"
 #include "codec/formats/png/crc32.h"
 #include "codec/formats/png/png_context.h"
 
@@ -125,10 +126,10 @@ int refill_from_chunks(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer, u
   IdatEntry& entry = info.idat[entryIndex];
   if (buffer->consumed != entry.offset) {
     const auto offset = pelo::checked_int(entry.offset);
-    if (!offset || TAVIRPELO_Seek_IO(buffer->source, *offset, SEEK_SET) != *offset) return 0;
+    if (!offset || seek_io(buffer->source, *offset, SEEK_SET) != *offset) return 0;
   }
   const uint32_t wanted = std::min(entry.length, kReadWindow);
-  const int count = TAVIRPELO_Read_IO(buffer->source, buffer->base, static_cast<int>(wanted));
+  const int count = read_io(buffer->source, buffer->base, static_cast<int>(wanted));
   if (count <= 0 || static_cast<uint32_t>(count) > wanted) return 0;
   const auto read = static_cast<uint32_t>(count);
   buffer->bufferPosition = entry.offset;

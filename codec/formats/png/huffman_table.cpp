@@ -157,7 +157,7 @@ const uint32_t* build_table(const uint8_t* lengths, int count, int alphabet,
 }
 
 void free_table(PELOI_PNGHUFFMANPOOL** pool) {
-  TAVIRPELO_OsFree(*pool);
+  os_free(*pool);
   *pool = nullptr;
 }
 

@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <cstring>
 
+#include "codec/base/io.h"
+
 namespace pelo::png {
 namespace {
 
@@ -13,8 +15,7 @@ constexpr int kReadFailed = 11;
 int fill(PELOI_PNGREADBUFFER& buffer, uint32_t space) {
   buffer.bufferPosition = buffer.consumed - buffer.remaining;
   buffer.cursor = 0;
-  const int count =
-      TAVIRPELO_Read_IO(buffer.source, buffer.base + buffer.remaining, static_cast<int>(space));
+  const int count = read_io(buffer.source, buffer.base + buffer.remaining, static_cast<int>(space));
   if (count <= 0 || static_cast<uint32_t>(count) > space) return kReadFailed;
   buffer.remaining += static_cast<uint32_t>(count);
   buffer.consumed += count;
@@ -35,7 +36,7 @@ bool open_read_buffer(PELOI_PNGREADBUFFER& buffer, TAVIRPELO_IO* source) {
   }
   if (!buffer.window.allocate(kReadWindow)) return false;
   buffer.base = buffer.window.data();
-  return TAVIRPELO_Seek_IO(source, 0, SEEK_SET) == 0;
+  return seek_io(source, 0, SEEK_SET) == 0;
 }
 
 bool need(PELOI_PNGREADBUFFER& buffer, uint32_t n) {
@@ -57,7 +58,7 @@ bool move_to(PELOI_PNGREADBUFFER& buffer, int64_t position) {
   }
   const auto target = checked_int(position);
   if (is_memory(buffer) || !target || *target < 0) return false;
-  if (TAVIRPELO_Seek_IO(buffer.source, *target, SEEK_SET) != *target) return false;
+  if (seek_io(buffer.source, *target, SEEK_SET) != *target) return false;
   buffer.consumed = buffer.bufferPosition = position;
   buffer.cursor = buffer.remaining = 0;
   return true;
