@@ -1,39 +1,40 @@
 #include "codec/formats/jpeg/decoder/convert.h"
 
-#include <cstring>
-
-#include "codec/pixel/lanes.h"
+#include "codec/base/axis_stepper.h"
 
 namespace pelo::jpeg {
 namespace {
+
+// The one channel of a grey row in all three lanes.
+struct GreyLanes {
+  using Row = GridRow;
+  static uint32_t word(const Row& row, uint32_t column) {
+    const uint32_t sample = row.plane[0][column];
+    return pack_lanes(sample, sample, sample);
+  }
+};
 
 // What the channels of a full-grid row are, and the writers they go to.
 struct YccRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
     write_ycc_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
   }
-  static void write_sums(PELOJ_JDINFO& jd) {
-    write_ycc_sums(&jd, jd.accumulator.data(), jd.targetWidth);
-  }
-  static constexpr bool kGrey = false;
+  static void write_sums(PELOJ_JDINFO& jd) { write_ycc_sums(&jd, jd.quarters.words(), jd.targetWidth); }
+  using Lanes = ColourLanes;
 };
 struct RgbRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
     write_rgb_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
   }
-  static void write_sums(PELOJ_JDINFO& jd) {
-    write_rgb_sums(&jd, jd.accumulator.data(), jd.targetWidth);
-  }
-  static constexpr bool kGrey = false;
+  static void write_sums(PELOJ_JDINFO& jd) { write_rgb_sums(&jd, jd.quarters.words(), jd.targetWidth); }
+  using Lanes = ColourLanes;
 };
 struct GreyRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
     write_grey_row(&jd, row.plane[0], count);
   }
-  static void write_sums(PELOJ_JDINFO& jd) {
-    write_grey_sums(&jd, jd.accumulator.data(), jd.targetWidth);
-  }
-  static constexpr bool kGrey = true;
+  static void write_sums(PELOJ_JDINFO& jd) { write_grey_sums(&jd, jd.quarters.words(), jd.targetWidth); }
+  using Lanes = GreyLanes;
 };
 
 // The row at the read position, from the crop offset on.
@@ -59,39 +60,15 @@ bool holds_three_quarters(const PELOJ_JDINFO& jd, int outputRow) {
   return holds_point(jd, jd.inputRow, outputRow, static_cast<int>(int64_t{3} * jd.usedHeight / 4));
 }
 
-// Sets or adds the two points of each output column.
-template <class Rows, bool Add>
-void accumulate(PELOJ_JDINFO& jd, const GridRow& row) {
-  const uint16_t* __restrict columns = jd.columns.data();
-  uint32_t* __restrict sums = jd.accumulator.data();
-  const int width = jd.targetWidth;
-  for (int x = 0; x < width; ++x) {
-    const uint32_t a = columns[2 * x];
-    const uint32_t b = columns[2 * x + 1];
-    const uint8_t* first = row.plane[0];
-    const uint32_t sum0 = static_cast<uint32_t>(first[a]) + first[b];
-    uint32_t sum;
-    if constexpr (Rows::kGrey) {
-      sum = pack_lanes(sum0, sum0, sum0);
-    } else {
-      const uint8_t* second = row.plane[1];
-      const uint8_t* third = row.plane[2];
-      sum = pack_lanes(sum0, static_cast<uint32_t>(second[a]) + second[b],
-                       static_cast<uint32_t>(third[a]) + third[b]);
-    }
-    sums[x] = Add ? sums[x] + sum : sum;
-  }
-}
-
 // Serves the next output row from the current input row. A row is opened by its quarter point and closed
 // by its three-quarter point; since no output row's quarter point lies above the three-quarter point of
 // the one before, only one is open at a time. True when an output row was finished.
 template <class Rows>
 bool serve_output_row(PELOJ_JDINFO& jd, const GridRow& row) {
   const int y = jd.output.emitted;
-  if (holds_quarter(jd, y)) accumulate<Rows, false>(jd, row);
+  if (holds_quarter(jd, y)) jd.quarters.open<typename Rows::Lanes>(row);
   if (!holds_three_quarters(jd, y)) return false;
-  accumulate<Rows, true>(jd, row);
+  jd.quarters.close<typename Rows::Lanes>(row);
   Rows::write_sums(jd);
   return true;
 }
@@ -146,10 +123,6 @@ void convert_picking(PELOJ_JDINFO& jd, int rows) {
   jd.continueFlag = 0;
 }
 
-bool picks_centres(const PELOJ_JDINFO& jd) {
-  return jd.convert == pick_ycc || jd.convert == pick_enlarging_ycc;
-}
-
 // Small pictures, coarse modes, and in mode 1 pictures that hardly shrink take the fast converter.
 bool wants_fast(const PELOJ_JDINFO& jd) {
   if (jd.outWidth <= 99 && jd.outHeight <= 99) return true;
@@ -158,20 +131,18 @@ bool wants_fast(const PELOJ_JDINFO& jd) {
          int64_t{12} * jd.outHeight >= int64_t{7} * jd.scaledHeight;
 }
 
-uint16_t sample_column(int64_t x, int64_t in, int64_t out, int64_t q) {
-  return static_cast<uint16_t>((x * in + q) / out);
-}
-
 }  // namespace
 
 bool choose_converter(PELOJ_JDINFO& jd) {
   const bool larger = jd.outWidth > jd.scaledWidth || jd.outHeight > jd.scaledHeight;
+  jd.sampling = Sampling::kQuarters;
   switch (jd.colourSpace) {
     case ColourSpace::kYcc:
-      if (larger) {
-        jd.convert = jd.decMode >= 2 ? pick_enlarging_ycc : enlarge_ycc;
+      if (larger ? jd.decMode >= 2 : wants_fast(jd)) {
+        jd.sampling = Sampling::kCentres;
+        jd.convert = larger ? pick_enlarging_ycc : pick_ycc;
       } else {
-        jd.convert = wants_fast(jd) ? pick_ycc : average_ycc;
+        jd.convert = larger ? enlarge_ycc : average_ycc;
       }
       return true;
     case ColourSpace::kGrey:
@@ -187,20 +158,14 @@ bool choose_converter(PELOJ_JDINFO& jd) {
 
 bool prepare_resampling(PELOJ_JDINFO& jd) {
   if (jd.exact) return true;
+  if (jd.sampling == Sampling::kQuarters) return jd.quarters.prepare(jd.usedWidth, jd.targetWidth);
   const auto width = static_cast<size_t>(jd.targetWidth);
-  const int64_t in = jd.usedWidth;
-  const bool picks = picks_centres(jd);
-  if (!jd.columns.allocate(picks ? width : 2 * width)) return false;
-  for (size_t x = 0; x < width; ++x) {
-    const auto column = static_cast<int64_t>(x);
-    if (picks) {
-      jd.columns[x] = sample_column(column, in, jd.targetWidth, in / 2);
-    } else {
-      jd.columns[2 * x] = sample_column(column, in, jd.targetWidth, in / 4);
-      jd.columns[2 * x + 1] = sample_column(column, in, jd.targetWidth, 3 * in / 4);
-    }
+  if (!jd.centres.allocate(width)) return false;
+  AxisStepper centre(jd.usedWidth, jd.targetWidth, jd.usedWidth / 2);
+  for (size_t x = 0; x < width; ++x, centre.advance()) {
+    jd.centres[x] = static_cast<uint16_t>(centre.position());
   }
-  return picks || jd.accumulator.allocate(width);
+  return true;
 }
 
 void average_ycc(PELOJ_JDINFO* jdInfo, int rows) {

@@ -12,6 +12,8 @@
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
 #include "codec/formats/jpeg/decoder/row_output.h"
+#include "codec/pixel/lanes.h"
+#include "codec/pixel/quad_sampler.h"
 #include "tavirpelo/decinfo.h"
 
 // Results of the row decoders.
@@ -109,6 +111,21 @@ struct GridRow {
   const uint8_t* plane[kMaxComponents];
 };
 
+// Three channels of a full-grid row, a word of 10-bit lanes each column.
+struct ColourLanes {
+  using Word = uint32_t;
+  using Row = GridRow;
+  static Word word(const Row& row, uint32_t column) {
+    return pack_lanes(row.plane[0][column], row.plane[1][column], row.plane[2][column]);
+  }
+};
+
+// How the decoded size becomes the target size.
+enum class Sampling : uint8_t {
+  kCentres,  // the sample nearest to each output's centre
+  kQuarters  // the mean of the four at its quarter points
+};
+
 }  // namespace pelo::jpeg
 
 struct PELOJ_JDINFO {
@@ -183,10 +200,11 @@ struct PELOJ_JDINFO {
 
   // Conversion and output.
   void (*convert)(PELOJ_JDINFO*, int);
+  pelo::jpeg::Sampling sampling;
   int continueFlag;  // the input row must still yield more output rows
   int inputRow;
-  pelo::OsBuffer<uint32_t> accumulator;  // one output row of packed sums
-  pelo::OsBuffer<uint16_t> columns;      // sample columns of each output column
+  pelo::OsBuffer<uint16_t> centres;  // of each output column; for sampling at quarters instead:
+  pelo::QuadSampler<pelo::jpeg::ColourLanes, uint16_t> quarters;
   pelo::jpeg::RowOutput output;
 };
 

@@ -207,7 +207,7 @@ void write_rgb_row(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, con
 }
 void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
                       int count) {
-  emit_row<YccModel>(*jdInfo, ColumnSource{{y, cb, cr}, jdInfo->columns.data()}, count);
+  emit_row<YccModel>(*jdInfo, ColumnSource{{y, cb, cr}, jdInfo->centres.data()}, count);
 }
 void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
                                const uint8_t* cr, int count) {
