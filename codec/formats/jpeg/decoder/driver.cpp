@@ -15,6 +15,8 @@
 namespace pelo::jpeg {
 namespace {
 
+constexpr const char* kStage = "JPEG decoder";
+
 int fail(const char* text) {
   log_error(text);
   return PELOJ_FAIL;
@@ -58,6 +60,7 @@ bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
   request.componentCount = jd.componentCount;
   if (parsed != PELOJ_OK) return log_error("PELOJ_Initialize : PELOJ_ParseHeader fail"), false;
   if (jd.imageWidth == 0 || jd.imageHeight == 0) {
+    refuse(Reason::kZeroSize, kStage);
     return log_error("PELOJ_Initialize : image width, hegiht is zero"), false;
   }
   choose_sizes(jd, jd.decInfo->option);
@@ -67,7 +70,10 @@ bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
   jd.decInfo->outWidth = jd.outWidth;
   jd.decInfo->outHeight = jd.outHeight;
   set_output(jd, request.outBuffer, jd.decInfo->option);
-  if (!prepare_resampling(jd)) return log_error("PELOJ_Initialize : malloc fail"), false;
+  if (!prepare_resampling(jd)) {
+    refuse(Reason::kNoMemory, kStage);
+    return log_error("PELOJ_Initialize : malloc fail"), false;
+  }
   jd.decInfo->imageWidth = jd.imageWidth;
   jd.decInfo->imageHeight = jd.imageHeight;
   return true;
@@ -78,12 +84,14 @@ Decoder start(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST& r
   Decoder decoder = os_new<PELOJ_JDINFO>();
   if (!decoder) {
     error = TAVIRPELO_ERROR_MEMORY;
+    refuse(Reason::kNoMemory, kStage);
     log_error("PELOJ_Initialize : malloc fail");
     return nullptr;
   }
   take_wishes(*decoder, decInfo, source, request);
   if (initialize(*decoder, request)) return decoder;
   error = TAVIRPELO_ERROR_DECODE;
+  refuse(Reason::kDamaged, kStage);
   return nullptr;
 }
 
@@ -94,7 +102,9 @@ bool skip_rows(PELOJ_JDINFO& jd) {
   while (jd.rowsDone < jd.cropY) {
     int rows = 0;
     const int status = process(&jd, &rows, 1);
-    if (status == PELOJ_IMAGE_DONE || status == PELOJ_FAIL || rows == 0) return false;
+    if (status == PELOJ_IMAGE_DONE || status == PELOJ_FAIL || rows == 0) {
+      return refuse(Reason::kTruncated, kStage, "above the wanted part");
+    }
     jd.rowsDone += rows;
   }
   // Sampling positions count from the first row that is shown.
@@ -112,7 +122,11 @@ int decode_rows(PELOJ_JDINFO& jd) {
     if (list_scans(jd) != PELOJ_OK) return PELOJ_FAIL;
   }
   if (!skip_rows(jd)) return 0;
-  if (show_rows(jd) != PELOJ_FAIL || !stores_coefficients(jd)) return PELOJ_OK;
+  if (show_rows(jd) != PELOJ_FAIL) return PELOJ_OK;
+  if (!stores_coefficients(jd)) {
+    begin_operation();  // the rows so far are the picture: nothing to complain of
+    return PELOJ_OK;
+  }
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_DECODE);
   log_error(jd.scale == kFull ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
                               : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");

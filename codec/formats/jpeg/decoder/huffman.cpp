@@ -1,5 +1,6 @@
 #include "codec/formats/jpeg/decoder/huffman.h"
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
 #include "codec/formats/jpeg/header_scan.h"
 
@@ -80,7 +81,13 @@ bool build_skip_table(DerivedTable& table) {
   return true;
 }
 
+int no_memory() {
+  refuse(Reason::kNoMemory, "JPEG Huffman tables");
+  return PELOJ_FAIL;
+}
+
 }  // namespace
+
 int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedTable** derivedOut,
                  EntropyState* entropy) {
   if (tableNumber < 0 || tableNumber > 3) return PELOJ_FAIL;
@@ -88,7 +95,7 @@ int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedT
   const HuffmanSpec* raw = isDC ? jdInfo->dcRaw[number] : jdInfo->acRaw[number];
   if (raw == nullptr || jdInfo->derivedCount >= kTablePoolSize) return PELOJ_FAIL;
   auto table = os_new<DerivedTable>();
-  if (!table) return PELOJ_FAIL;
+  if (!table) return no_memory();
 
   table->raw = raw;
   if (!derive_codes(*raw, *table)) return 0;
@@ -102,7 +109,7 @@ int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedT
   } else {
     fill_coefficients(*table);
     if (jdInfo->marker->frameType == FrameType::kBaseline && jdInfo->scale != kFull) {
-      if (!build_skip_table(*table)) return PELOJ_FAIL;
+      if (!build_skip_table(*table)) return no_memory();
       entropy->skip[number] = table->skip.get();
     }
   }

@@ -8,6 +8,7 @@
 #include <memory>
 
 #include "codec/base/buffered_source.h"
+#include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
@@ -68,6 +69,7 @@ struct MarkerRecord {
   uint8_t sawSos, sawDht, sawDqt, sawApp0, sawApp14;
   uint8_t transform;  // last byte of the last APP14
   std::array<uint8_t, kMaxComponents> componentIds;
+  Reason foreign;  // why frames that were passed over on the way to the first are not read
 };
 
 struct EntropyState {

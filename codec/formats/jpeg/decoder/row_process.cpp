@@ -1,5 +1,6 @@
 #include "codec/formats/jpeg/decoder/row_process.h"
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/imcu_row.h"
 #include "codec/formats/jpeg/decoder/progressive.h"
 #include "codec/formats/jpeg/decoder/upsample.h"
@@ -19,12 +20,14 @@ struct RowDecoder {
 // Decodes the next iMCU row into the sample rows. Returns its status, 201 for a failure.
 int fill_sample_rows(PELOJ_JDINFO& jd, const RowDecoder& function) {
   if (jd.checkFn != nullptr && jd.checkFn(jd.decInfo, jd.output.emitted, jd.rowsDone) == 0) {
+    refuse(Reason::kCancelled, "JPEG decoder");
     log_error(function.aborted);
     return PELOJ_FAIL;
   }
   const int before = jd.imcuRow;
   const int status = function.decodeRow(&jd);
   if (status == PELOJ_ROW_FAIL) {
+    refuse(Reason::kDamaged, "JPEG decoder");
     log_error(function.failed);
     return PELOJ_FAIL;
   }

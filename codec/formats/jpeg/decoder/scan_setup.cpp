@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/dequantise.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
@@ -9,6 +10,11 @@
 namespace pelo::jpeg {
 namespace {
 
+int no_memory(const char* text) {
+  refuse(Reason::kNoMemory, "JPEG scan");
+  log_error(text);
+  return PELOJ_FAIL;
+}
 int fail(const char* text) {
   log_error(text);
   return PELOJ_FAIL;
@@ -89,7 +95,7 @@ bool set_scan_geometry(PELOJ_JDINFO& jd) {
 int set_up_scan(PELOJ_JDINFO* jdInfo) {
   if (!jdInfo->entropy) {
     jdInfo->entropy = os_new<EntropyState>();
-    if (!jdInfo->entropy) return fail("PELOJ_SetupScan : malloc fail");
+    if (!jdInfo->entropy) return no_memory("PELOJ_SetupScan : malloc fail");
   }
   *jdInfo->entropy = {};
   jdInfo->unreadMarker = 0;
@@ -115,7 +121,7 @@ void begin_imcu_row(PELOJ_JDINFO* jdInfo) {
 int prepare_before_scan(PELOJ_JDINFO* jdInfo) {
   if (set_up_scan(jdInfo) != PELOJ_OK) return fail("PELOJ_InitDecBeforeScan : PELOJ_SetupScan fail");
   if (!prepare_multipliers(*jdInfo)) return fail("PELOJ_InitDecBeforeScan : no quntaze table");
-  if (!allocate_blocks(*jdInfo)) return fail("PELOJ_InitDecBeforeScan : malloc fail");
+  if (!allocate_blocks(*jdInfo)) return no_memory("PELOJ_InitDecBeforeScan : malloc fail");
   begin_imcu_row(jdInfo);
   return PELOJ_OK;
 }

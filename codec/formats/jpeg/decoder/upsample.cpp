@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
@@ -109,6 +110,7 @@ uint8_t** allocate_rows(int width, int rows) {
   const auto bytes = row ? checked_mul(*row, count) : std::nullopt;
   void* block = bytes ? TAVIRPELO_OsMalloc(*bytes) : nullptr;
   if (block == nullptr) {
+    refuse(Reason::kNoMemory, "JPEG decoder");
     log_error("PELOJ_AllocSampleArry : malloc fail");
     return nullptr;
   }
@@ -125,7 +127,10 @@ int prepare_upsampling(PELOJ_JDINFO* jdInfo) {
   const int mcus = (jdInfo->imageWidth + 8 * jdInfo->hMax - 1) / (8 * jdInfo->hMax);
   for (int c = 0; c < jdInfo->componentCount; ++c) {
     Component& component = (*jdInfo->components)[static_cast<size_t>(c)];
-    if (!choose_method(*jdInfo, component)) return fail("PELOJ_InitUpsampler : invalid sampling");
+    if (!choose_method(*jdInfo, component)) {
+      refuse(Reason::kVariant, "JPEG decoder", "sampling factors that do not divide each other");
+      return fail("PELOJ_InitUpsampler : invalid sampling");
+    }
     if (component.samples) continue;  // prepared for an earlier scan
     // Whole MCUs wide: blocks beyond the last column are written too.
     component.samples.reset(allocate_rows(mcus * component.h * blockSize, component.v * blockSize));

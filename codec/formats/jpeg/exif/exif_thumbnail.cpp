@@ -2,7 +2,6 @@
 #include <climits>
 #include <cstddef>
 
-#include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/exif/exif_members.h"
 #include "codec/formats/jpeg/header_scan.h"
 
@@ -53,17 +52,13 @@ constexpr Member<Thumbnail> kThumbnailMembers[] = {
     {4173, kShort, 1, number<&Thumbnail::tag4173>},
 };
 
-// The head of a frame (T.81 B.2.2): precision, height, width.
 bool read_frame_size(PELOJ_SOURCE& source, uint32_t& width, uint32_t& height) {
-  constexpr uint32_t kHead = 5;
+  FrameHead head;
   uint32_t remaining;
-  if (!segment_length(source, remaining) || remaining < kHead || !source_need(source, kHead))
-    return false;
-  const uint8_t* head = source_take(source, kHead);
-  if (head[0] != 8) return false;
-  height = load_be16(head + 1);
-  width = load_be16(head + 3);
-  return source_skip(source, remaining - kHead);
+  if (!read_frame_head(source, head, remaining) || head.precision != 8) return false;
+  height = static_cast<uint32_t>(head.height);
+  width = static_cast<uint32_t>(head.width);
+  return source_skip(source, remaining);
 }
 
 // Walks to the first scan; false when the data ends before it.
@@ -103,7 +98,7 @@ int jpeg_size(const uint8_t* data, uint32_t size, uint32_t* width, uint32_t* hei
 }
 
 void read_thumbnail_directory(const tiff::Structure& tiff, uint32_t offset,
-                                          TAVIRPELO_EXIFTHUMBNAIL& thumbnail) {
+                              TAVIRPELO_EXIFTHUMBNAIL& thumbnail) {
   walk_directory(tiff, offset, [&](const Field& field) {
     return store_field<Thumbnail>(kThumbnailMembers, thumbnail, field, tiff);
   });
