@@ -92,8 +92,8 @@ int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedT
                  EntropyState* entropy) {
   if (tableNumber < 0 || tableNumber > 3) return PELOJ_FAIL;
   const auto number = static_cast<size_t>(tableNumber);
-  const HuffmanSpec* raw = isDC ? jdInfo->dcRaw[number] : jdInfo->acRaw[number];
-  if (raw == nullptr || jdInfo->derivedCount >= kTablePoolSize) return PELOJ_FAIL;
+  const HuffmanSpec* raw = isDC ? jdInfo->tables.dcRaw[number] : jdInfo->tables.acRaw[number];
+  if (raw == nullptr || jdInfo->tables.derivedCount >= kTablePoolSize) return PELOJ_FAIL;
   auto table = os_new<DerivedTable>();
   if (!table) return no_memory();
 
@@ -108,13 +108,13 @@ int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedT
     }
   } else {
     fill_coefficients(*table);
-    if (jdInfo->marker->frameType == FrameType::kBaseline && jdInfo->scale != kFull) {
+    if (jdInfo->marker->frameType == FrameType::kBaseline && jdInfo->sizes.scale != kFull) {
       if (!build_skip_table(*table)) return no_memory();
       entropy->skip[number] = table->skip.get();
     }
   }
   *derivedOut = table.get();
-  jdInfo->derivedPool[jdInfo->derivedCount++] = std::move(table);
+  jdInfo->tables.derivedPool[jdInfo->tables.derivedCount++] = std::move(table);
   return PELOJ_OK;
 }
 
