@@ -43,12 +43,12 @@ class QuarterPoints {
 // with its three-quarter point, which may be the same row. The column table is made once.
 //
 // Lanes says how a sample is packed: Word holds the sum of four, and word(row, column) is one sample of
-// an input row of type Row. Column is wide enough for an input column.
+// an input row of type Row. Column is wide enough for an input column. A row may be opened and closed
+// with other lanes than the sampler's, as long as their words are alike.
 template <class Lanes, class Column>
 class QuadSampler {
  public:
   using Word = typename Lanes::Word;
-  using Row = typename Lanes::Row;
 
   // For rows of `inputs` samples to `outputs` words, both at least 1; false when memory is short.
   [[nodiscard]] bool prepare(int64_t inputs, int64_t outputs) {
@@ -62,19 +62,25 @@ class QuadSampler {
     return true;
   }
 
-  void open(const Row& row) { take<false>(row); }
-  void close(const Row& row) { take<true>(row); }
+  template <class Packing = Lanes>
+  void open(const typename Packing::Row& row) {
+    take<Packing, false>(row);
+  }
+  template <class Packing = Lanes>
+  void close(const typename Packing::Row& row) {
+    take<Packing, true>(row);
+  }
 
   const Word* words() const { return words_.data(); }
 
  private:
-  template <bool Add>
-  void take(const Row& row) {
+  template <class Packing, bool Add>
+  void take(const typename Packing::Row& row) {
     const Column* __restrict columns = columns_.data();
     Word* __restrict words = words_.data();
     const size_t count = words_.size();
     for (size_t k = 0; k < count; ++k) {
-      const Word sum = Lanes::word(row, columns[2 * k]) + Lanes::word(row, columns[2 * k + 1]);
+      const Word sum = Packing::word(row, columns[2 * k]) + Packing::word(row, columns[2 * k + 1]);
       words[k] = Add ? words[k] + sum : sum;
     }
   }

@@ -1,4 +1,5 @@
 // The JPEG part of the header information record: the picture's size and its thumbnail's.
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
@@ -15,7 +16,10 @@ int fail(const char* message) {
 int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
   if (io == nullptr || hinfo == nullptr) return 0;
   BufferedSource source;
-  if (!source.open(io)) return fail("PELOJ_GetHInfo : malloc Fail");
+  if (!source.open(io)) {
+    refuse(Reason::kNoMemory, "JPEG headers");
+    return fail("PELOJ_GetHInfo : malloc Fail");
+  }
   if (TAVIRPELO_Seek_IO(io, 0, SEEK_SET) < 0) return fail("PELOJ_GetHInfo : seek Fail");
   PELOJ_FILEHEADER header{};
   if (scan_file_header(source.get(), kScanMode, &header) != PELOJ_OK) {
@@ -28,7 +32,10 @@ int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
     if (!source_reposition(*source.get(), header.thumbnail.offset)) {
       return fail("TAVIRPELO_DecodeJPEG : seek Fail");
     }
-    if (scan_size(source.get(), kScanMode, &small) != PELOJ_OK) small = {};
+    if (scan_size(source.get(), kScanMode, &small) != PELOJ_OK) {
+      begin_operation();  // a picture without a readable thumbnail has not failed
+      small = {};
+    }
   }
   hinfo->width = header.width;
   hinfo->height = header.height;

@@ -4,7 +4,6 @@
 
 #include <cstddef>
 
-#include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/header_scan_segments.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
@@ -38,24 +37,24 @@ constexpr ScanPolicy kEverything{read_jfif, read_exif, read_photoshop};
 constexpr ScanPolicy kExifOnly{nullptr, read_exif, nullptr};
 constexpr ScanPolicy kSizeOnly{nullptr, nullptr, nullptr};
 
+constexpr const char* kStage = "JPEG headers";
+
 bool valid_side(int side) {
   return side >= 1 && side <= kMaxSide;
 }
 
-// SOF0, SOF2 (T.81 B.2.2): precision, height, width.
+// SOF0, SOF2.
 bool read_frame(PELOJ_SOURCE& source, Marker code, PELOJ_FILEHEADER& result) {
-  constexpr uint32_t kHead = 5;
+  FrameHead head;
   uint32_t remaining;
-  if (!segment_length(source, remaining) || remaining < kHead || !source_need(source, kHead))
-    return false;
-  const uint8_t* head = source_take(source, kHead);
-  const int height = load_be16(head + 1);
-  const int width = load_be16(head + 3);
-  if (head[0] != 8 || !valid_side(height) || !valid_side(width)) return false;
-  result.width = width;
-  result.height = height;
+  if (!read_frame_head(source, head, remaining)) return false;
+  if (head.precision != 8 || !valid_side(head.height) || !valid_side(head.width)) {
+    return refuse_frame(head, kStage);
+  }
+  result.width = head.width;
+  result.height = head.height;
   if (code == Marker::kSof2) result.progressive = 1;
-  return source_skip(source, remaining - kHead);
+  return source_skip(source, remaining);
 }
 
 bool search_segment(PELOJ_SOURCE& source, SegmentReader reader, ThumbnailSearch& search) {
@@ -63,12 +62,13 @@ bool search_segment(PELOJ_SOURCE& source, SegmentReader reader, ThumbnailSearch&
   if (!segment_length(source, remaining)) return false;
   const Segment segment{source, int64_t{source_offset(source)} + remaining};
   if (segment.end >= source.size) return false;
-  return reader(segment, search) && segment.leave();
+  if (!reader(segment, search)) return refuse(Reason::kDamaged, kStage, "an application segment");
+  return segment.leave();
 }
 
 int scan(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result, const ScanPolicy& policy) {
   if (source == nullptr || result == nullptr || (mode != 2 && mode != kScanMode)) return PELOJ_FAIL;
-  if (!find_soi(*source)) return PELOJ_FAIL;
+  if (!find_soi(*source)) return refuse(Reason::kUnknownFormat, kStage), PELOJ_FAIL;
   ThumbnailSearch search{result->thumbnail};
   uint8_t code;
   while (next_marker(*source, code)) {
@@ -82,9 +82,10 @@ int scan(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result, const ScanPol
     } else if (has_segment(marker)) {
       passed = skip_segment(*source);
     }
-    if (!passed) return PELOJ_FAIL;
+    if (!passed) break;
   }
-  return PELOJ_FAIL;
+  // Whatever has given no reason ran out of data.
+  return refuse(Reason::kTruncated, kStage), PELOJ_FAIL;
 }
 
 }  // namespace

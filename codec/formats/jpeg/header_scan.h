@@ -5,6 +5,7 @@
 #include <cstdint>
 
 #include "codec/base/buffered_source.h"
+#include "codec/formats/jpeg/frame_head.h"
 #include "codec/formats/jpeg/marker_codes.h"
 #include "tavirpelo/parse.h"
 
@@ -55,7 +56,6 @@ int scan_size(PELOJ_SOURCE* source, int mode, PELOJ_FILEHEADER* result);
 int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo);
 
 constexpr int kScanMode = 8;
-constexpr int kMaxSide = 5000;  // pixels, both directions
 
 // The parts of marker walking that the header scans and the decoding parser share.
 

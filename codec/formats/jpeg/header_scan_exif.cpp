@@ -1,27 +1,14 @@
 // The thumbnail that an EXIF segment describes in its second directory, IFD1.
-#include <climits>
 #include <cstring>
 
 #include "codec/formats/jpeg/header_scan_segments.h"
+#include "codec/formats/jpeg/ifd1_thumbnail.h"
 #include "codec/formats/jpeg/tiff.h"
 
 namespace pelo::jpeg {
 namespace {
 
 constexpr uint32_t kIdentifier = 6;  // "Exif", two zeros
-
-enum Tag : uint16_t {
-  kWidth = 256,
-  kHeight = 257,
-  kCompression = 259,
-  kPhotometric = 262,
-  kStripOffsets = 273,
-  kStripByteCounts = 279,
-  kPlanarConfig = 284,
-  kJpegOffset = 513,
-  kJpegLength = 514,
-  kTag4173 = 4173
-};
 
 // The segment's TIFF structure; offsets in it count from its header.
 struct Exif {
@@ -33,41 +20,19 @@ struct Exif {
   bool inside(uint32_t offset) const { return base + offset + 2 <= segment.end; }
 };
 
-// Takes over one entry; false for an offset that no source can have.
-bool store(PELOJ_THUMBNAIL& thumbnail, const Exif& exif, uint16_t tag, uint32_t value) {
-  const auto number = static_cast<int32_t>(value);
-  switch (tag) {
-    case kWidth:
-      thumbnail.width = number;
-      break;
-    case kHeight:
-      thumbnail.height = number;
-      break;
-    case kCompression:
-      thumbnail.type = number;
-      break;
-    case kPhotometric:
-      thumbnail.layout = number;
-      break;
-    case kPlanarConfig:
-      thumbnail.planarConfig = number;
-      break;
-    case kTag4173:
-      thumbnail.tag4173 = number;
-      break;
-    case kStripOffsets:
-    case kJpegOffset:
-      thumbnail.offset = static_cast<uint32_t>(exif.base + value);
-      return exif.base + value <= INT_MAX;  // positions in a source have 31 bits
-    case kStripByteCounts:
-    case kJpegLength:
-      thumbnail.type = tag == kJpegLength ? PELOJ_THUMBNAIL_JPEG : PELOJ_THUMBNAIL_STRIP;
-      thumbnail.length = value;
-      break;
-    default:
-      break;
-  }
-  return true;
+// The ten words by the names that the scans' record has for them.
+PELOJ_THUMBNAIL scanned(const TAVIRPELO_EXIFTHUMBNAIL& t) {
+  const auto number = [](uint32_t value) { return static_cast<int32_t>(value); };
+  return {0,
+          number(t.width),
+          number(t.height),
+          number(t.compression),
+          number(t.photometric),
+          t.length,
+          number(t.tag4173),
+          number(t.planarConfig),
+          t.offset,
+          0};
 }
 
 // Reads a directory's entry count at the current position; false when the data ends.
@@ -97,7 +62,7 @@ bool read_ifd1(const Exif& exif, uint32_t ifd1, ThumbnailSearch& search) {
   PELOJ_SOURCE& source = exif.segment.source;
   uint16_t count;
   if (!source_reposition(source, exif.base + ifd1) || !read_count(exif, count)) return false;
-  PELOJ_THUMBNAIL thumbnail{};
+  TAVIRPELO_EXIFTHUMBNAIL thumbnail{};
   bool reachable = true;
   for (; count > 0; --count) {
     if (!source_need(source, tiff::kEntrySize)) return false;
@@ -106,9 +71,12 @@ bool read_ifd1(const Exif& exif, uint32_t ifd1, ThumbnailSearch& search) {
         tiff::parse_entry(source_take(source, tiff::kEntrySize), exif.header.order);
     if (tiff::type_size(entry.type) == 0) break;
     const auto value = entry.first_value();
-    if (value && !store(thumbnail, exif, entry.tag, *value)) reachable = false;
+    const ThumbnailTag* tag = thumbnail_tag(entry.tag);
+    if (value && tag != nullptr && !store_thumbnail(thumbnail, *tag, *value, exif.base)) {
+      reachable = false;
+    }
   }
-  if (thumbnail.length != 0 && reachable) search.accept(thumbnail);
+  if (thumbnail.length != 0 && reachable) search.accept(scanned(thumbnail));
   return true;
 }
 

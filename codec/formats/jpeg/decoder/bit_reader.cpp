@@ -26,7 +26,7 @@ int next_data_byte(BitReader& reader) {
   while (code == 0xFF) code = next_byte(reader);
   if (code == 0) return 0xFF;
   if (code > 0) {
-    reader.jd->unreadMarker = static_cast<uint8_t>(code);
+    reader.jd->entropy.unreadMarker = static_cast<uint8_t>(code);
   } else {
     meet_end(*reader.jd);
   }
@@ -57,13 +57,13 @@ uint32_t match_code(BitReader& reader, const DerivedTable& table, int length) {
 }  // namespace
 
 void meet_end(PELOJ_JDINFO& jd) {
-  if (jd.endIsMarker) jd.unreadMarker = static_cast<uint8_t>(Marker::kEoi);
+  if (jd.entropy.endIsMarker) jd.entropy.unreadMarker = static_cast<uint8_t>(Marker::kEoi);
 }
 
 BitReader fill_by_bytes(BitReader reader) {
   BitState& state = reader.state;
   while (state.left <= kBitBufferSize - 8) {
-    const int byte = reader.jd->unreadMarker == 0 ? next_data_byte(reader) : -1;
+    const int byte = reader.jd->entropy.unreadMarker == 0 ? next_data_byte(reader) : -1;
     if (byte < 0) {
       reader.plainEnd = reader.next;
       pad(state);
@@ -83,11 +83,11 @@ uint32_t decode_long_code(BitReader& reader, const DerivedTable& table) {
 BitReader open_bits(PELOJ_JDINFO& jd) {
   const uint8_t* next = jd.source->buffer + jd.source->pos;
   const uint8_t* end = next + jd.source->avail;
-  return {jd.entropy->bits, next, end, jd.unreadMarker == 0 ? end : next, &jd};
+  return {jd.entropy.state->bits, next, end, jd.entropy.unreadMarker == 0 ? end : next, &jd};
 }
 
 void close_bits(PELOJ_JDINFO& jd, const BitReader& reader) {
-  jd.entropy->bits = reader.state;
+  jd.entropy.state->bits = reader.state;
   jd.source->pos = static_cast<uint32_t>(reader.next - jd.source->buffer);
   jd.source->avail = static_cast<uint32_t>(reader.end - reader.next);
 }
@@ -98,7 +98,7 @@ int refill_bits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
   *reader = fill_by_bytes(*reader);
   const int real = reader->state.left - reader->state.invented;
   if (real >= needed) return 1;
-  return reader->jd->unreadMarker != 0 ? 1 : 0;
+  return reader->jd->entropy.unreadMarker != 0 ? 1 : 0;
 }
 
 int decode_code(BitReader* reader, BitBuffer buffer, int bitsLeft, const DerivedTable* derived,

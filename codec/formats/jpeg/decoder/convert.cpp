@@ -1,11 +1,18 @@
 #include "codec/formats/jpeg/decoder/convert.h"
 
-#include <cstring>
-
-#include "codec/pixel/lanes.h"
+#include "codec/base/axis_stepper.h"
 
 namespace pelo::jpeg {
 namespace {
+
+// The one channel of a grey row in all three lanes.
+struct GreyLanes {
+  using Row = GridRow;
+  static uint32_t word(const Row& row, uint32_t column) {
+    const uint32_t sample = row.plane[0][column];
+    return pack_lanes(sample, sample, sample);
+  }
+};
 
 // What the channels of a full-grid row are, and the writers they go to.
 struct YccRows {
@@ -13,35 +20,36 @@ struct YccRows {
     write_ycc_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    write_ycc_sums(&jd, jd.accumulator.data(), jd.targetWidth);
+    write_ycc_sums(&jd, jd.resampling.quarters.words(), jd.sizes.target.width);
   }
-  static constexpr bool kGrey = false;
+  using Lanes = ColourLanes;
 };
 struct RgbRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
     write_rgb_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    write_rgb_sums(&jd, jd.accumulator.data(), jd.targetWidth);
+    write_rgb_sums(&jd, jd.resampling.quarters.words(), jd.sizes.target.width);
   }
-  static constexpr bool kGrey = false;
+  using Lanes = ColourLanes;
 };
 struct GreyRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
     write_grey_row(&jd, row.plane[0], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    write_grey_sums(&jd, jd.accumulator.data(), jd.targetWidth);
+    write_grey_sums(&jd, jd.resampling.quarters.words(), jd.sizes.target.width);
   }
-  static constexpr bool kGrey = true;
+  using Lanes = GreyLanes;
 };
 
 // The row at the read position, from the crop offset on.
 GridRow grid_row(const PELOJ_JDINFO& jd, int row) {
   GridRow grid{};
-  for (int c = 0; c < jd.componentCount; ++c) {
+  for (int c = 0; c < jd.frame.componentCount; ++c) {
     grid.plane[c] =
-        (*jd.components)[static_cast<size_t>(c)].colourRows[jd.readPosition + row] + jd.cropX;
+        (*jd.frame.components)[static_cast<size_t>(c)].colourRows[jd.progress.readPosition + row] +
+        jd.sizes.cropX;
   }
   return grid;
 }
@@ -49,38 +57,16 @@ GridRow grid_row(const PELOJ_JDINFO& jd, int row) {
 // True when an input row holds the sample point with offset q of output row y:
 // 0 <= y * inH + q - i * outH < outH.
 bool holds_point(const PELOJ_JDINFO& jd, int inputRow, int outputRow, int q) {
-  const int64_t distance = int64_t{outputRow} * jd.usedHeight + q - int64_t{inputRow} * jd.targetHeight;
-  return distance >= 0 && distance < jd.targetHeight;
+  const int64_t distance =
+      int64_t{outputRow} * jd.sizes.used.height + q - int64_t{inputRow} * jd.sizes.target.height;
+  return distance >= 0 && distance < jd.sizes.target.height;
 }
 bool holds_quarter(const PELOJ_JDINFO& jd, int outputRow) {
-  return holds_point(jd, jd.inputRow, outputRow, jd.usedHeight / 4);
+  return holds_point(jd, jd.resampling.inputRow, outputRow, jd.sizes.used.height / 4);
 }
 bool holds_three_quarters(const PELOJ_JDINFO& jd, int outputRow) {
-  return holds_point(jd, jd.inputRow, outputRow, static_cast<int>(int64_t{3} * jd.usedHeight / 4));
-}
-
-// Sets or adds the two points of each output column.
-template <class Rows, bool Add>
-void accumulate(PELOJ_JDINFO& jd, const GridRow& row) {
-  const uint16_t* __restrict columns = jd.columns.data();
-  uint32_t* __restrict sums = jd.accumulator.data();
-  const int width = jd.targetWidth;
-  for (int x = 0; x < width; ++x) {
-    const uint32_t a = columns[2 * x];
-    const uint32_t b = columns[2 * x + 1];
-    const uint8_t* first = row.plane[0];
-    const uint32_t sum0 = static_cast<uint32_t>(first[a]) + first[b];
-    uint32_t sum;
-    if constexpr (Rows::kGrey) {
-      sum = pack_lanes(sum0, sum0, sum0);
-    } else {
-      const uint8_t* second = row.plane[1];
-      const uint8_t* third = row.plane[2];
-      sum = pack_lanes(sum0, static_cast<uint32_t>(second[a]) + second[b],
-                       static_cast<uint32_t>(third[a]) + third[b]);
-    }
-    sums[x] = Add ? sums[x] + sum : sum;
-  }
+  return holds_point(jd, jd.resampling.inputRow, outputRow,
+                     static_cast<int>(int64_t{3} * jd.sizes.used.height / 4));
 }
 
 // Serves the next output row from the current input row. A row is opened by its quarter point and closed
@@ -89,9 +75,9 @@ void accumulate(PELOJ_JDINFO& jd, const GridRow& row) {
 template <class Rows>
 bool serve_output_row(PELOJ_JDINFO& jd, const GridRow& row) {
   const int y = jd.output.emitted;
-  if (holds_quarter(jd, y)) accumulate<Rows, false>(jd, row);
+  if (holds_quarter(jd, y)) jd.resampling.quarters.open<typename Rows::Lanes>(row);
   if (!holds_three_quarters(jd, y)) return false;
-  accumulate<Rows, true>(jd, row);
+  jd.resampling.quarters.close<typename Rows::Lanes>(row);
   Rows::write_sums(jd);
   return true;
 }
@@ -104,17 +90,17 @@ bool pauses(const PELOJ_JDINFO& jd) {
 // Four-point averages; every row of the call is used up.
 template <class Rows>
 void convert_averaging(PELOJ_JDINFO& jd, int rows) {
-  for (int i = 0; i < rows; ++i, ++jd.inputRow) {
+  for (int i = 0; i < rows; ++i, ++jd.resampling.inputRow) {
     const GridRow row = grid_row(jd, i);
-    if (jd.exact) {
-      Rows::write(jd, row, jd.targetWidth);
+    if (jd.sizes.exact) {
+      Rows::write(jd, row, jd.sizes.target.width);
       continue;
     }
     while (jd.output.emitted < jd.output.bandEnd && serve_output_row<Rows>(jd, row)) {
     }
     if (pauses(jd)) return;
   }
-  jd.continueFlag = 0;
+  jd.resampling.continueFlag = 0;
 }
 
 // The same for enlarging: one output row a call.
@@ -124,61 +110,56 @@ void convert_enlarging(PELOJ_JDINFO& jd, int rows) {
     // More points may fall into this input row.
     if (jd.output.emitted < jd.output.limit && holds_quarter(jd, jd.output.emitted)) return;
   }
-  jd.continueFlag = 0;
-  jd.inputRow += rows;
+  jd.resampling.continueFlag = 0;
+  jd.resampling.inputRow += rows;
 }
 
 // Centre points. A row may be none's centre, or that of several rows of an enlarged picture.
 template <auto WriteRow>
 void convert_picking(PELOJ_JDINFO& jd, int rows) {
-  for (int i = 0; i < rows; ++i, ++jd.inputRow) {
+  for (int i = 0; i < rows; ++i, ++jd.resampling.inputRow) {
     const GridRow row = grid_row(jd, i);
-    if (jd.exact) {
-      YccRows::write(jd, row, jd.targetWidth);
+    if (jd.sizes.exact) {
+      YccRows::write(jd, row, jd.sizes.target.width);
       continue;
     }
     while (jd.output.emitted < jd.output.bandEnd &&
-           holds_point(jd, jd.inputRow, jd.output.emitted, jd.usedHeight / 2)) {
-      WriteRow(&jd, row.plane[0], row.plane[1], row.plane[2], jd.targetWidth);
+           holds_point(jd, jd.resampling.inputRow, jd.output.emitted, jd.sizes.used.height / 2)) {
+      WriteRow(&jd, row.plane[0], row.plane[1], row.plane[2], jd.sizes.target.width);
     }
     if (pauses(jd)) return;
   }
-  jd.continueFlag = 0;
-}
-
-bool picks_centres(const PELOJ_JDINFO& jd) {
-  return jd.convert == pick_ycc || jd.convert == pick_enlarging_ycc;
+  jd.resampling.continueFlag = 0;
 }
 
 // Small pictures, coarse modes, and in mode 1 pictures that hardly shrink take the fast converter.
 bool wants_fast(const PELOJ_JDINFO& jd) {
-  if (jd.outWidth <= 99 && jd.outHeight <= 99) return true;
+  if (jd.sizes.output.width <= 99 && jd.sizes.output.height <= 99) return true;
   if (jd.decMode >= 2) return true;
-  return jd.decMode == 1 && int64_t{12} * jd.outWidth >= int64_t{7} * jd.scaledWidth &&
-         int64_t{12} * jd.outHeight >= int64_t{7} * jd.scaledHeight;
-}
-
-uint16_t sample_column(int64_t x, int64_t in, int64_t out, int64_t q) {
-  return static_cast<uint16_t>((x * in + q) / out);
+  return jd.decMode == 1 && int64_t{12} * jd.sizes.output.width >= int64_t{7} * jd.sizes.scaled.width &&
+         int64_t{12} * jd.sizes.output.height >= int64_t{7} * jd.sizes.scaled.height;
 }
 
 }  // namespace
 
 bool choose_converter(PELOJ_JDINFO& jd) {
-  const bool larger = jd.outWidth > jd.scaledWidth || jd.outHeight > jd.scaledHeight;
-  switch (jd.colourSpace) {
+  const bool larger =
+      jd.sizes.output.width > jd.sizes.scaled.width || jd.sizes.output.height > jd.sizes.scaled.height;
+  jd.resampling.sampling = Sampling::kQuarters;
+  switch (jd.frame.colourSpace) {
     case ColourSpace::kYcc:
-      if (larger) {
-        jd.convert = jd.decMode >= 2 ? pick_enlarging_ycc : enlarge_ycc;
+      if (larger ? jd.decMode >= 2 : wants_fast(jd)) {
+        jd.resampling.sampling = Sampling::kCentres;
+        jd.resampling.convert = larger ? pick_enlarging_ycc : pick_ycc;
       } else {
-        jd.convert = wants_fast(jd) ? pick_ycc : average_ycc;
+        jd.resampling.convert = larger ? enlarge_ycc : average_ycc;
       }
       return true;
     case ColourSpace::kGrey:
-      jd.convert = larger ? enlarge_grey : average_grey;
+      jd.resampling.convert = larger ? enlarge_grey : average_grey;
       return true;
     case ColourSpace::kRgb:
-      jd.convert = larger ? enlarge_rgb : average_rgb;
+      jd.resampling.convert = larger ? enlarge_rgb : average_rgb;
       return true;
     default:
       return false;
@@ -186,21 +167,16 @@ bool choose_converter(PELOJ_JDINFO& jd) {
 }
 
 bool prepare_resampling(PELOJ_JDINFO& jd) {
-  if (jd.exact) return true;
-  const auto width = static_cast<size_t>(jd.targetWidth);
-  const int64_t in = jd.usedWidth;
-  const bool picks = picks_centres(jd);
-  if (!jd.columns.allocate(picks ? width : 2 * width)) return false;
-  for (size_t x = 0; x < width; ++x) {
-    const auto column = static_cast<int64_t>(x);
-    if (picks) {
-      jd.columns[x] = sample_column(column, in, jd.targetWidth, in / 2);
-    } else {
-      jd.columns[2 * x] = sample_column(column, in, jd.targetWidth, in / 4);
-      jd.columns[2 * x + 1] = sample_column(column, in, jd.targetWidth, 3 * in / 4);
-    }
+  if (jd.sizes.exact) return true;
+  if (jd.resampling.sampling == Sampling::kQuarters)
+    return jd.resampling.quarters.prepare(jd.sizes.used.width, jd.sizes.target.width);
+  const auto width = static_cast<size_t>(jd.sizes.target.width);
+  if (!jd.resampling.centres.allocate(width)) return false;
+  AxisStepper centre(jd.sizes.used.width, jd.sizes.target.width, jd.sizes.used.width / 2);
+  for (size_t x = 0; x < width; ++x, centre.advance()) {
+    jd.resampling.centres[x] = static_cast<uint16_t>(centre.position());
   }
-  return picks || jd.accumulator.allocate(width);
+  return true;
 }
 
 void average_ycc(PELOJ_JDINFO* jdInfo, int rows) {

@@ -26,7 +26,7 @@ void enlarge_rgb(PELOJ_JDINFO* jdInfo, int rows);
 // has none.
 [[nodiscard]] bool choose_converter(PELOJ_JDINFO& jd);
 
-// Allocates the accumulators and the column table that the chosen converter needs.
+// Makes the column table that the chosen converter needs, and room for its sums.
 [[nodiscard]] bool prepare_resampling(PELOJ_JDINFO& jd);
 
 }  // namespace pelo::jpeg

@@ -13,11 +13,13 @@ struct Request {
   int width, height;
 };
 
-// The thumbnail's header scan; nothing is present when the file's own scan fails.
+// The header scan on the way to a decode; nothing is present when it fails. What it fails of is for the
+// decode itself to tell, if that fails too.
 PELOJ_FILEHEADER scan_header(PELOJ_SOURCE& source) {
   PELOJ_FILEHEADER header{};
-  if (scan_file_header(&source, kScanMode, &header) != PELOJ_OK) header = {};
-  return header;
+  if (scan_file_header(&source, kScanMode, &header) == PELOJ_OK) return header;
+  begin_operation();
+  return {};
 }
 
 // True when an embedded JPEG is at least as large as the request; reads its own header for that. Fills
@@ -29,12 +31,11 @@ bool large_enough(PELOJ_SOURCE& source, PELOJ_THUMBNAIL& thumbnail, const Reques
   }
   if (thumbnail.type != PELOJ_THUMBNAIL_JPEG || !source_reposition(source, thumbnail.offset))
     return false;
-  PELOJ_FILEHEADER header{};
-  if (scan_file_header(&source, kScanMode, &header) != PELOJ_OK) return false;
+  const PELOJ_FILEHEADER header = scan_header(source);
+  if (header.width == 0 || header.height == 0) return false;
   thumbnail.width = header.width;
   thumbnail.height = header.height;
-  return header.width != 0 && header.height != 0 && request.width <= header.width &&
-         request.height <= header.height;
+  return request.width <= header.width && request.height <= header.height;
 }
 
 bool usable(PELOJ_SOURCE& source, PELOJ_THUMBNAIL& thumbnail, uint32_t policy, const Request& request) {
@@ -88,6 +89,7 @@ bool decode(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, const Request& req
         return true;
       }
       // What the thumbnail failed of says nothing about the main picture.
+      begin_operation();
       record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
     }
   }
@@ -116,6 +118,7 @@ int decode(TAVIRPELO_DECINFO* decInfo, void* outBuffer, int reqWidth, int reqHei
     return 0;
   }
   if (reqWidth < 1 || reqHeight < 1) {
+    refuse(Reason::kArgument, "JPEG decoder", "the requested size");
     log_error("TAVIRPELO_DecodeJPEG : Invalid Size");
     return 0;
   }

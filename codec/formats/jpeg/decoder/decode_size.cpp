@@ -61,35 +61,33 @@ Scale mode_scale(Scale scale, int decMode) {
   }
 }
 
-void choose_sizes(PELOJ_JDINFO& jd, uint32_t option) {
-  const Size image{jd.imageWidth, jd.imageHeight};
-  const Size request = turned({jd.bufferWidth, jd.bufferHeight}, jd.rotation);
-  const Size output = fit_output(image, request, option);
-  jd.outWidth = output.width;
-  jd.outHeight = output.height;
+Sizes choose_sizes(const Frame& frame, FrameType type, const SizeWishes& wishes) {
+  const Size image{frame.width, frame.height};
+  const Size request = turned(wishes.buffer, wishes.rotation);
+  Sizes sizes{};
+  sizes.buffer = wishes.buffer;
+  sizes.output = sizes.target = fit_output(image, request, wishes.option);
 
-  jd.scale = mode_scale(covering_scale(image, output), jd.decMode);
-  if (jd.marker->frameType == FrameType::kProgressive && jd.scale == kThreeEighths) jd.scale = kHalf;
+  sizes.scale = mode_scale(covering_scale(image, sizes.output), wishes.decMode);
+  if (type == FrameType::kProgressive && sizes.scale == kThreeEighths) sizes.scale = kHalf;
   // The smallest transform still yields a sample of a picture narrower than its block.
-  jd.scaledWidth = std::max(jd.scale.of(image.width), 1);
-  jd.scaledHeight = std::max(jd.scale.of(image.height), 1);
-  jd.exact = jd.scaledWidth == jd.outWidth && jd.scaledHeight == jd.outHeight;
+  sizes.scaled = {std::max(sizes.scale.of(image.width), 1), std::max(sizes.scale.of(image.height), 1)};
+  sizes.exact = sizes.scaled.width == sizes.output.width && sizes.scaled.height == sizes.output.height;
 
-  jd.usedWidth = jd.scaledWidth;
-  jd.usedHeight = jd.scaledHeight;
-  jd.cropX = jd.cropY = 0;
-  jd.targetWidth = jd.outWidth;
-  jd.targetHeight = jd.outHeight;
-  if ((option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_FILL) return;
+  sizes.used = sizes.scaled;
+  if ((wishes.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_FILL) return sizes;
   // Filling: the centre of the picture, cut to the request.
-  const auto crop = [](int request1, int out, int scaled, int& target, int& used, int& offset) {
-    if (out <= request1) return;
-    target = request1;
-    used = static_cast<int>((out - 1 + int64_t{request1} * scaled) / out);
+  const auto crop = [](int requested, int out, int scaled, int& target, int& used, int& offset) {
+    if (out <= requested) return;
+    target = requested;
+    used = static_cast<int>((out - 1 + int64_t{requested} * scaled) / out);
     offset = (scaled - used) >> 1;
   };
-  crop(request.width, jd.outWidth, jd.scaledWidth, jd.targetWidth, jd.usedWidth, jd.cropX);
-  crop(request.height, jd.outHeight, jd.scaledHeight, jd.targetHeight, jd.usedHeight, jd.cropY);
+  crop(request.width, sizes.output.width, sizes.scaled.width, sizes.target.width, sizes.used.width,
+       sizes.cropX);
+  crop(request.height, sizes.output.height, sizes.scaled.height, sizes.target.height, sizes.used.height,
+       sizes.cropY);
+  return sizes;
 }
 
 }  // namespace pelo::jpeg

@@ -18,7 +18,14 @@ Scale covering_scale(Size image, Size output);
 // The scale that a decode mode makes of it.
 Scale mode_scale(Scale scale, int decMode);
 
-// Fills every size of the state from its header, mode, rotation and request.
-void choose_sizes(PELOJ_JDINFO& jd, uint32_t option);
+// What a request says about sizes.
+struct SizeWishes {
+  Size buffer;
+  uint32_t rotation;
+  uint32_t option;  // fitting
+  int decMode;
+};
+
+[[nodiscard]] Sizes choose_sizes(const Frame& frame, FrameType type, const SizeWishes& wishes);
 
 }  // namespace pelo::jpeg

@@ -18,35 +18,35 @@ int PELOJ_DecodeHuffMan(BitReader* reader, BitBuffer buffer, int bitsLeft, const
   return jpeg::decode_code(reader, buffer, bitsLeft, derived, minBits);
 }
 
-void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::average_ycc(jdInfo, rows);
 }
 
-void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::enlarge_ycc(jdInfo, rows);
 }
 
-void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::pick_ycc(jdInfo, rows);
 }
 
-void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::pick_enlarging_ycc(jdInfo, rows);
 }
 
-void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::average_grey(jdInfo, rows);
 }
 
-void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::enlarge_grey(jdInfo, rows);
 }
 
-void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::average_rgb(jdInfo, rows);
 }
 
-void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows) {
+void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, uint8_t**, int rows) {
   jpeg::enlarge_rgb(jdInfo, rows);
 }
 
@@ -73,11 +73,11 @@ int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
   return jpeg::derive_table(jdInfo, isDC, tableNumber, derivedOut, entropy);
 }
 
-int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo) {
+int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo, uint8_t***) {
   return jpeg::decode_imcu_row(jdInfo);
 }
 
-int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo) {
+int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo, uint8_t***) {
   return jpeg::decode_imcu_row_scaled(jdInfo);
 }
 
@@ -141,11 +141,11 @@ int PELOJ_ProgDecodeMcuRefine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   return jpeg::decode_mcu_refine(jdInfo, blocks);
 }
 
-int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo) {
+int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo, uint8_t***) {
   return jpeg::decode_progressive_row(jdInfo);
 }
 
-int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo) {
+int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo, uint8_t***) {
   return jpeg::transform_stored_row(jdInfo);
 }
 
@@ -185,19 +185,19 @@ void PELOJ_RGBWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count)
   jpeg::write_rgb_sums(jdInfo, sums, count);
 }
 
-int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int rowsWanted) {
   return jpeg::process_rows(jdInfo, rowCounter, rowsWanted);
 }
 
-int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int rowsWanted) {
   return jpeg::process_rows_scaled(jdInfo, rowCounter, rowsWanted);
 }
 
-int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int rowsWanted) {
   return jpeg::process_progressive_rows(jdInfo, rowCounter, rowsWanted);
 }
 
-int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted) {
+int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int rowsWanted) {
   return jpeg::process_progressive_rows_scaled(jdInfo, rowCounter, rowsWanted);
 }
 
@@ -231,11 +231,11 @@ void PELOJ_DoIntegralUpsample(PELOJ_JDINFO* jdInfo, Component* component, uint8_
   jpeg::replicate_integral(jdInfo, component, input, slot);
 }
 
-void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
+void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int capacity) {
   jpeg::convert_rows(jdInfo, rowCounter, capacity);
 }
 
-void PELOJ_SkipRowUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
+void PELOJ_SkipRowUpsample(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int capacity) {
   jpeg::skip_rows_unconverted(jdInfo, rowCounter, capacity);
 }
 

@@ -1,4 +1,6 @@
-// Given names of this room that no public header has; each is what the room's own function says.
+// Given names of this room that no public header has; each is what the room's own function says. Output
+// rows and sample rows (`outRows`, `sampleRows`) are the state's own, so arguments that name them are
+// not looked at.
 #pragma once
 
 #include "codec/formats/jpeg/decoder/bit_reader.h"
@@ -31,14 +33,14 @@ TAVIRPELO_API int PELOJ_DecodeHuffMan(pelo::jpeg::BitReader* reader, pelo::jpeg:
 // the fast enlarging one finish their rows in one call; the averaging enlarging ones return after every
 // output row. All clear the continue flag when the input row is used up, and keep it, one row a call,
 // when the band of output rows is full before.
-TAVIRPELO_API void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, int rows);
-TAVIRPELO_API void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, int rows);
+TAVIRPELO_API void PELOJ_DoYcbcrToRgb(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
+TAVIRPELO_API void PELOJ_DoYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
+TAVIRPELO_API void PELOJ_DoFastYcbcrToRgb(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
+TAVIRPELO_API void PELOJ_DoFastYcbcrToUpscaleRgb(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
+TAVIRPELO_API void PELOJ_DoGrayConvert(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
+TAVIRPELO_API void PELOJ_DoGrayUpscaleConvert(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
+TAVIRPELO_API void PELOJ_DoRgbConvert(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
+TAVIRPELO_API void PELOJ_DoRgbUpscaleConvert(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int rows);
 
 // Parses the headers, chooses sizes and scale and prepares the first scan. The state is the caller's:
 // end it with PELOJ_DeleteDecoderInfo and TAVIRPELO_OsFree (or pelo::jpeg::Decoder). Null on failure.
@@ -66,8 +68,8 @@ TAVIRPELO_API int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int ta
 
 // Full size, and reduced scales. 100: done, more rows; 101: the last row, or the data ended within the
 // last 16 rows to be shown (then the row is not counted); 102: failed.
-TAVIRPELO_API int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo);
-TAVIRPELO_API int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo);
+TAVIRPELO_API int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo, uint8_t*** sampleRows);
+TAVIRPELO_API int PELOJ_DecodeSingleiMcu_resize(PELOJ_JDINFO* jdInfo, uint8_t*** sampleRows);
 
 // Frees what the state owns and clears it; a second call does nothing.
 TAVIRPELO_API void PELOJ_DeleteDecoderInfo(PELOJ_JDINFO* jdInfo);
@@ -99,10 +101,10 @@ TAVIRPELO_API int PELOJ_ProgDecodeMcu(PELOJ_JDINFO* jdInfo, int32_t* const* bloc
 TAVIRPELO_API int PELOJ_ProgDecodeMcuRefine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks);
 
 // All scans of the next iMCU row, then its inverse transform. As PELOJ_DecodeSingleiMcu.
-TAVIRPELO_API int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo);
+TAVIRPELO_API int PELOJ_ProgDecodeSingleiMcu(PELOJ_JDINFO* jdInfo, uint8_t*** sampleRows);
 
 // Transforms the row's coefficients; 100, or 101 after the last row.
-TAVIRPELO_API int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo);
+TAVIRPELO_API int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo, uint8_t*** sampleRows);
 
 // One-row writers: `count` samples a row of each channel, one pixel each.
 TAVIRPELO_API void PELOJ_YcbcrWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
@@ -125,12 +127,16 @@ TAVIRPELO_API void PELOJ_RGBWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* su
 // Produce up to `rowsWanted` full-grid rows (minus *rowCounter, which advances) at full size and at
 // reduced scales. 201: failed or aborted by CheckFn; 101: the picture's last rows have been produced, or
 // its data has ended quietly; another value: more to come.
-TAVIRPELO_API int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
-TAVIRPELO_API int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
+TAVIRPELO_API int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int* rowCounter,
+                                    int rowsWanted);
+TAVIRPELO_API int PELOJ_ProcessData_resize(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int* rowCounter,
+                                           int rowsWanted);
 
 // The same for progressive pictures.
-TAVIRPELO_API int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
-TAVIRPELO_API int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, int* rowCounter, int rowsWanted);
+TAVIRPELO_API int PELOJ_ProgProcessData(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int* rowCounter,
+                                        int rowsWanted);
+TAVIRPELO_API int PELOJ_ProgProcessData_resize(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int* rowCounter,
+                                               int rowsWanted);
 
 // Makes a record of the current scan header, entropy state and source position in the slot. 200 or 201.
 TAVIRPELO_API int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, pelo::OsPtr<pelo::jpeg::ScanRecord>* slot);
@@ -163,8 +169,10 @@ TAVIRPELO_API void PELOJ_DoIntegralUpsample(PELOJ_JDINFO* jdInfo, pelo::jpeg::Co
 
 // Converts up to `capacity - *rowCounter` rows of the current row group, replicating it first when the
 // last one is used up, and advances *rowCounter. The skipping form moves on without converting.
-TAVIRPELO_API void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity);
-TAVIRPELO_API void PELOJ_SkipRowUpsample(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity);
+TAVIRPELO_API void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int* rowCounter,
+                                       int capacity);
+TAVIRPELO_API void PELOJ_SkipRowUpsample(PELOJ_JDINFO* jdInfo, uint8_t** outRows, int* rowCounter,
+                                         int capacity);
 
 // Chooses every component's method, and allocates sample rows and full-grid rows. 200 or 201.
 TAVIRPELO_API int PELOJ_InitUpsampler(PELOJ_JDINFO* jdInfo);

@@ -15,25 +15,23 @@
 namespace pelo::jpeg {
 namespace {
 
+constexpr const char* kStage = "JPEG decoder";
+
 int fail(const char* text) {
   log_error(text);
   return PELOJ_FAIL;
 }
 
-int divide_up(int64_t a, int64_t b) {
-  return static_cast<int>((a + b - 1) / b);
-}
-
 // Blocks and samples of a component in the picture (T.81 A.1.1, A.2.4).
-void lay_out(const PELOJ_JDINFO& jd, Component& component) {
-  const int64_t w = int64_t{jd.imageWidth} * component.h;
-  const int64_t h = int64_t{jd.imageHeight} * component.v;
-  component.blocksWide = divide_up(w, 8 * jd.hMax);
-  component.blocksHigh = divide_up(h, 8 * jd.vMax);
-  component.downsampledWidth = divide_up(w, jd.hMax);
-  component.downsampledHeight = divide_up(h, jd.vMax);
-  component.scaledWidth =
-      divide_up(int64_t{component.downsampledWidth} * jd.scale.numerator, 1 << jd.scale.shift);
+void lay_out(const Frame& frame, Scale scale, Component& component) {
+  // At most kMaxSide * kMaxSampling each.
+  const int w = frame.width * component.h;
+  const int h = frame.height * component.v;
+  component.blocksWide = ceil_div(w, 8 * frame.hMax);
+  component.blocksHigh = ceil_div(h, 8 * frame.vMax);
+  component.downsampledWidth = ceil_div(w, frame.hMax);
+  component.downsampledHeight = ceil_div(h, frame.vMax);
+  component.scaledWidth = ceil_div(component.downsampledWidth * scale.numerator, 1 << scale.shift);
 }
 
 // What a decode wants of the object that it runs on.
@@ -46,30 +44,34 @@ void take_wishes(PELOJ_JDINFO& jd, TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* sou
   jd.decMode = decInfo.decMode;
   // A planar picture is never turned: its planes have no common pixel step.
   jd.rotation = jd.outFormat == TAVIRPELO_YUV420 ? 0u : decInfo.option & TAVIRPELO_ROTATE_MASK;
-  jd.bufferWidth = jd.outWidth = request.width;
-  jd.bufferHeight = jd.outHeight = request.height;
+  jd.sizes.buffer = jd.sizes.output = {request.width, request.height};
 }
 
 // Headers to output position; false with a line in the log.
 bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
   const int parsed = parse_header(&jd, 0);
-  request.imageWidth = jd.imageWidth;
-  request.imageHeight = jd.imageHeight;
-  request.componentCount = jd.componentCount;
+  request.imageWidth = jd.frame.width;
+  request.imageHeight = jd.frame.height;
+  request.componentCount = jd.frame.componentCount;
   if (parsed != PELOJ_OK) return log_error("PELOJ_Initialize : PELOJ_ParseHeader fail"), false;
-  if (jd.imageWidth == 0 || jd.imageHeight == 0) {
+  if (jd.frame.width == 0 || jd.frame.height == 0) {
+    refuse(Reason::kZeroSize, kStage);
     return log_error("PELOJ_Initialize : image width, hegiht is zero"), false;
   }
-  choose_sizes(jd, jd.decInfo->option);
+  jd.sizes = choose_sizes(jd.frame, jd.marker->frameType,
+                          {jd.sizes.buffer, jd.rotation, jd.decInfo->option, jd.decMode});
   if (start_decompression(&jd) != PELOJ_OK) {
     return log_error("PELOJ_Initialize : PELOJ_StartDecompression fail"), false;
   }
-  jd.decInfo->outWidth = jd.outWidth;
-  jd.decInfo->outHeight = jd.outHeight;
+  jd.decInfo->outWidth = jd.sizes.output.width;
+  jd.decInfo->outHeight = jd.sizes.output.height;
   set_output(jd, request.outBuffer, jd.decInfo->option);
-  if (!prepare_resampling(jd)) return log_error("PELOJ_Initialize : malloc fail"), false;
-  jd.decInfo->imageWidth = jd.imageWidth;
-  jd.decInfo->imageHeight = jd.imageHeight;
+  if (!prepare_resampling(jd)) {
+    refuse(Reason::kNoMemory, kStage);
+    return log_error("PELOJ_Initialize : malloc fail"), false;
+  }
+  jd.decInfo->imageWidth = jd.frame.width;
+  jd.decInfo->imageHeight = jd.frame.height;
   return true;
 }
 
@@ -78,28 +80,32 @@ Decoder start(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* source, PELOJ_REQUEST& r
   Decoder decoder = os_new<PELOJ_JDINFO>();
   if (!decoder) {
     error = TAVIRPELO_ERROR_MEMORY;
+    refuse(Reason::kNoMemory, kStage);
     log_error("PELOJ_Initialize : malloc fail");
     return nullptr;
   }
   take_wishes(*decoder, decInfo, source, request);
   if (initialize(*decoder, request)) return decoder;
   error = TAVIRPELO_ERROR_DECODE;
+  refuse(Reason::kDamaged, kStage);
   return nullptr;
 }
 
 // Passes the rows above the wanted part; false when the picture ends there.
 bool skip_rows(PELOJ_JDINFO& jd) {
   const RowFunction process = row_function(jd);
-  jd.skipping = 1;
-  while (jd.rowsDone < jd.cropY) {
+  jd.progress.skipping = 1;
+  while (jd.progress.rowsDone < jd.sizes.cropY) {
     int rows = 0;
     const int status = process(&jd, &rows, 1);
-    if (status == PELOJ_IMAGE_DONE || status == PELOJ_FAIL || rows == 0) return false;
-    jd.rowsDone += rows;
+    if (status == PELOJ_IMAGE_DONE || status == PELOJ_FAIL || rows == 0) {
+      return refuse(Reason::kTruncated, kStage, "above the wanted part");
+    }
+    jd.progress.rowsDone += rows;
   }
   // Sampling positions count from the first row that is shown.
-  jd.skipping = 0;
-  jd.rowsDone = 0;
+  jd.progress.skipping = 0;
+  jd.progress.rowsDone = 0;
   return true;
 }
 
@@ -108,39 +114,43 @@ bool skip_rows(PELOJ_JDINFO& jd) {
 int decode_rows(PELOJ_JDINFO& jd) {
   if (needs_all_scans(jd)) {
     // A scan that is cut must not hide what the others have of its rows.
-    jd.endIsMarker = 1;
+    jd.entropy.endIsMarker = 1;
     if (list_scans(jd) != PELOJ_OK) return PELOJ_FAIL;
   }
   if (!skip_rows(jd)) return 0;
-  if (show_rows(jd) != PELOJ_FAIL || !stores_coefficients(jd)) return PELOJ_OK;
+  if (show_rows(jd) != PELOJ_FAIL) return PELOJ_OK;
+  if (!stores_coefficients(jd)) {
+    begin_operation();  // the rows so far are the picture: nothing to complain of
+    return PELOJ_OK;
+  }
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_DECODE);
-  log_error(jd.scale == kFull ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
-                              : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");
+  log_error(jd.sizes.scale == kFull ? "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData fail"
+                                    : "PELOJ_DecodeImage : PELOJ_ProgCompleteProcessData_resize fail");
   return 0;
 }
 
 }  // namespace
 void clear_decoder(PELOJ_JDINFO* jdInfo) {
   if (jdInfo == nullptr) return;
-  const int width = jdInfo->imageWidth;
-  const int height = jdInfo->imageHeight;
-  const int components = jdInfo->componentCount;
+  const int width = jdInfo->frame.width;
+  const int height = jdInfo->frame.height;
+  const int components = jdInfo->frame.componentCount;
   jdInfo->~PELOJ_JDINFO();
   new (jdInfo) PELOJ_JDINFO();
   // A refused header still tells its size.
-  jdInfo->imageWidth = width;
-  jdInfo->imageHeight = height;
-  jdInfo->componentCount = components;
+  jdInfo->frame.width = width;
+  jdInfo->frame.height = height;
+  jdInfo->frame.componentCount = components;
 }
 
 int start_decompression(PELOJ_JDINFO* jdInfo) {
   if (!choose_converter(*jdInfo)) {
     return fail("PELOJ_StartDecompression : unsupported color space");
   }
-  for (int c = 0; c < jdInfo->componentCount; ++c) {
-    lay_out(*jdInfo, (*jdInfo->components)[static_cast<size_t>(c)]);
+  for (int c = 0; c < jdInfo->frame.componentCount; ++c) {
+    lay_out(jdInfo->frame, jdInfo->sizes.scale, (*jdInfo->frame.components)[static_cast<size_t>(c)]);
   }
-  jdInfo->imcuRows = divide_up(jdInfo->imageHeight, 8 * jdInfo->vMax);
+  jdInfo->progress.imcuRows = jdInfo->frame.mcus_down();
   if (prepare_upsampling(jdInfo) != PELOJ_OK) {
     return fail("PELOJ_StartDecompression : PELOJ_InitUpsampler fail");
   }

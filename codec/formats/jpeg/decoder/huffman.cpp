@@ -1,5 +1,6 @@
 #include "codec/formats/jpeg/decoder/huffman.h"
 
+#include "codec/base/errors.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
 #include "codec/formats/jpeg/header_scan.h"
 
@@ -80,15 +81,21 @@ bool build_skip_table(DerivedTable& table) {
   return true;
 }
 
+int no_memory() {
+  refuse(Reason::kNoMemory, "JPEG Huffman tables");
+  return PELOJ_FAIL;
+}
+
 }  // namespace
+
 int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedTable** derivedOut,
                  EntropyState* entropy) {
   if (tableNumber < 0 || tableNumber > 3) return PELOJ_FAIL;
   const auto number = static_cast<size_t>(tableNumber);
-  const HuffmanSpec* raw = isDC ? jdInfo->dcRaw[number] : jdInfo->acRaw[number];
-  if (raw == nullptr || jdInfo->derivedCount >= kTablePoolSize) return PELOJ_FAIL;
+  const HuffmanSpec* raw = isDC ? jdInfo->tables.dcRaw[number] : jdInfo->tables.acRaw[number];
+  if (raw == nullptr || jdInfo->tables.derivedCount >= kTablePoolSize) return PELOJ_FAIL;
   auto table = os_new<DerivedTable>();
-  if (!table) return PELOJ_FAIL;
+  if (!table) return no_memory();
 
   table->raw = raw;
   if (!derive_codes(*raw, *table)) return 0;
@@ -101,13 +108,13 @@ int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedT
     }
   } else {
     fill_coefficients(*table);
-    if (jdInfo->marker->frameType == FrameType::kBaseline && jdInfo->scale != kFull) {
-      if (!build_skip_table(*table)) return PELOJ_FAIL;
+    if (jdInfo->marker->frameType == FrameType::kBaseline && jdInfo->sizes.scale != kFull) {
+      if (!build_skip_table(*table)) return no_memory();
       entropy->skip[number] = table->skip.get();
     }
   }
   *derivedOut = table.get();
-  jdInfo->derivedPool[jdInfo->derivedCount++] = std::move(table);
+  jdInfo->tables.derivedPool[jdInfo->tables.derivedCount++] = std::move(table);
   return PELOJ_OK;
 }
 

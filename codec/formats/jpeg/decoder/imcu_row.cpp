@@ -44,14 +44,14 @@ void transform_block(const Component& component, const int32_t* block, int lastP
 // Returns the index of the next component's first block.
 template <class Size>
 int transform_component(PELOJ_JDINFO& jd, const Component& component, int block, int mcu, int blockRow) {
-  const int wide = mcu == jd.mcusPerRow - 1 ? component.lastColumnWidth : component.mcuWidth;
-  const int firstRow = jd.imcuRow * component.v + blockRow;
+  const int wide = mcu == jd.scan.mcusPerRow - 1 ? component.lastColumnWidth : component.mcuWidth;
+  const int firstRow = jd.progress.imcuRow * component.v + blockRow;
   for (int y = 0; y < component.mcuHeight; ++y) {
     if (firstRow + y >= component.blocksHigh) break;
     uint8_t* const* rows = component.samples.get() + (blockRow + y) * Size::kBlock;
     for (int x = 0; x < wide; ++x) {
       const auto b = static_cast<size_t>(block + y * component.mcuWidth + x);
-      transform_block<Size>(component, jd.blocks[b], jd.lastPosition[b], rows,
+      transform_block<Size>(component, jd.entropy.blocks[b], jd.entropy.lastPosition[b], rows,
                             (mcu * component.mcuWidth + x) * Size::kBlock);
     }
   }
@@ -61,8 +61,8 @@ int transform_component(PELOJ_JDINFO& jd, const Component& component, int block,
 template <class Size>
 void transform_mcu(PELOJ_JDINFO& jd, int mcu, int blockRow) {
   int block = 0;
-  for (int i = 0; i < jd.scanComponentCount; ++i) {
-    const Component& component = *jd.scan[static_cast<size_t>(i)];
+  for (int i = 0; i < jd.scan.componentCount; ++i) {
+    const Component& component = *jd.scan.components[static_cast<size_t>(i)];
     block = transform_component<Size>(jd, component, block, mcu, blockRow);
   }
 }
@@ -72,12 +72,12 @@ using DecodeMcu = int (*)(PELOJ_JDINFO*, int32_t* const*);
 // The current scan's part of the iMCU row; false when its data fails.
 template <class Size>
 bool decode_scan_row(PELOJ_JDINFO& jd, DecodeMcu decode) {
-  const auto used = static_cast<size_t>(jd.mcuBlocks) * 64 * sizeof(int32_t);
-  for (int blockRow = 0; blockRow < jd.mcuRowsPerImcu; ++blockRow) {
-    for (int mcu = 0; mcu < jd.mcusPerRow; ++mcu) {
-      TAVIRPELO_OsMemset(jd.coefficients.data(), 0, used);
-      jd.lastPosition = {};
-      if (!decode(&jd, jd.blocks.data())) return false;
+  const auto used = static_cast<size_t>(jd.scan.mcuBlocks) * 64 * sizeof(int32_t);
+  for (int blockRow = 0; blockRow < jd.scan.mcuRowsPerImcu; ++blockRow) {
+    for (int mcu = 0; mcu < jd.scan.mcusPerRow; ++mcu) {
+      TAVIRPELO_OsMemset(jd.entropy.coefficients.data(), 0, used);
+      jd.entropy.lastPosition = {};
+      if (!decode(&jd, jd.entropy.blocks.data())) return false;
       transform_mcu<Size>(jd, mcu, blockRow);
     }
   }
@@ -100,11 +100,11 @@ int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
   const bool decoded =
       jd.scanCount > 0 ? decode_scan_rows<Size>(jd, decode) : decode_scan_row<Size>(jd, decode);
   if (!decoded) {
-    if (jd.usedHeight - jd.rowsDone < 16) return PELOJ_IMAGE_DONE;
+    if (jd.sizes.used.height - jd.progress.rowsDone < 16) return PELOJ_IMAGE_DONE;
     log_error(failure);
     return PELOJ_ROW_FAIL;
   }
-  if (++jd.imcuRow >= jd.imcuRows) return PELOJ_IMAGE_DONE;
+  if (++jd.progress.imcuRow >= jd.progress.imcuRows) return PELOJ_IMAGE_DONE;
   begin_imcu_row(&jd);
   return PELOJ_ROW_DONE;
 }
@@ -112,20 +112,20 @@ int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
 }  // namespace
 int decode_imcu_row(PELOJ_JDINFO* jdInfo) {
   return decode_imcu_row<FullSize>(*jdInfo,
-                                   jdInfo->requantise ? decode_mcu_requantised : decode_mcu_full,
+                                   jdInfo->entropy.requantise ? decode_mcu_requantised : decode_mcu_full,
                                    "PELOJ_DecodeSingleiMcu : PELOJ_DecodeMcu fail");
 }
 
 int decode_imcu_row_scaled(PELOJ_JDINFO* jdInfo) {
-  if (jdInfo->scale == kHalf) {
+  if (jdInfo->sizes.scale == kHalf) {
     return decode_imcu_row<HalfSize>(*jdInfo, decode_mcu_half,
                                      "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_2to1 fail");
   }
-  if (jdInfo->scale == kThreeEighths) {
+  if (jdInfo->sizes.scale == kThreeEighths) {
     return decode_imcu_row<ThreeEighthsSize>(
         *jdInfo, decode_mcu_three_eighths, "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_8to3 fail");
   }
-  if (jdInfo->scale == kQuarter) {
+  if (jdInfo->sizes.scale == kQuarter) {
     return decode_imcu_row<QuarterSize>(*jdInfo, decode_mcu_quarter,
                                         "PELOJ_DecodeSingleiMcu_resize : PELOJ_DecodeMcu_4to1 fail");
   }

@@ -8,10 +8,15 @@
 #include <memory>
 
 #include "codec/base/buffered_source.h"
+#include "codec/base/checked.h"
+#include "codec/base/errors.h"
+#include "codec/base/geometry.h"
 #include "codec/base/os_memory.h"
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
 #include "codec/formats/jpeg/decoder/row_output.h"
+#include "codec/pixel/lanes.h"
+#include "codec/pixel/quad_sampler.h"
 #include "tavirpelo/decinfo.h"
 
 // Results of the row decoders.
@@ -66,6 +71,7 @@ struct MarkerRecord {
   uint8_t sawSos, sawDht, sawDqt, sawApp0, sawApp14;
   uint8_t transform;  // last byte of the last APP14
   std::array<uint8_t, kMaxComponents> componentIds;
+  Reason foreign;  // why frames that were passed over on the way to the first are not read
 };
 
 struct EntropyState {
@@ -109,6 +115,110 @@ struct GridRow {
   const uint8_t* plane[kMaxComponents];
 };
 
+// Three channels of a full-grid row, a word of 10-bit lanes each column.
+struct ColourLanes {
+  using Word = uint32_t;
+  using Row = GridRow;
+  static Word word(const Row& row, uint32_t column) {
+    return pack_lanes(row.plane[0][column], row.plane[1][column], row.plane[2][column]);
+  }
+};
+
+// How the decoded size becomes the target size.
+enum class Sampling : uint8_t {
+  kCentres,  // the sample nearest to each output's centre
+  kQuarters  // the mean of the four at its quarter points
+};
+
+// The picture as its frame header describes it.
+struct Frame {
+  int width, height;
+  int componentCount;
+  int hMax, vMax;
+  ColourSpace colourSpace;
+  OsPtr<std::array<Component, kMaxComponents>> components;
+
+  // Interleaved MCUs; those at the right and lower edge reach beyond the picture.
+  int mcus_across() const { return ceil_div(width, 8 * hMax); }
+  int mcus_down() const { return ceil_div(height, 8 * vMax); }
+};
+
+// Tables as segments have defined them so far.
+struct Tables {
+  std::array<OsPtr<QuantTable>, 4> quant;
+  // Replaced between scans, but still some component's.
+  std::array<OsPtr<QuantTable>, kMaxComponents> replacedQuant;
+  size_t replacedCount;
+  std::array<const HuffmanSpec*, 4> dcRaw, acRaw;
+  // Every DHT definition keeps its slot: derived tables of earlier scans point into it.
+  std::array<OsPtr<HuffmanSpec>, kTablePoolSize> rawPool;
+  size_t rawCount;
+  std::array<OsPtr<DerivedTable>, kTablePoolSize> derivedPool;
+  size_t derivedCount;
+};
+
+// The current scan: its header, and the layout of its MCUs.
+struct Scan {
+  int componentCount;
+  std::array<Component*, kMaxComponents> components;
+  int lastComponent;  // frame index
+  int ss, se, ah, al;
+  int restartInterval;  // MCUs; 0: none
+  int mcuBlocks;
+  std::array<uint8_t, kMaxMcuBlocks> blockComponent;  // scan position
+  int mcusPerRow;
+  int mcuRowsPerImcu;  // rows of MCUs in the current iMCU row
+};
+
+// Entropy decoding, and the MCU that it fills.
+struct Entropy {
+  OsPtr<EntropyState> state;
+  uint8_t unreadMarker;  // second byte of a marker met in the data; 0: none
+  int endIsMarker;       // the source's end counts as EOI; otherwise decoding fails there
+  uint32_t eobRun;       // blocks that an end-of-band code still covers (T.81 G.1.2.2)
+  int requantise;        // AC coefficients are brought to the reference steps while decoding
+  std::array<uint8_t, kMaxMcuBlocks> lastPosition;  // zig-zag, last non-zero coefficient
+  OsBuffer<int32_t> coefficients;                   // one MCU
+  std::array<int32_t*, kMaxMcuBlocks> blocks;
+};
+
+// Sizes in pixels, in the order in which a picture passes through them. The inverse transform makes of
+// the frame a `scaled` picture. Of that the part `used` is shown, all of it unless filling cuts it, from
+// the crop offset on; it is resampled to `target`, which stands somewhere in the caller's `buffer`. What
+// the whole scaled picture would become, of which filling cuts the target, is `output`.
+struct Sizes {
+  Scale scale;
+  Size scaled;
+  Size used;
+  int cropX, cropY;
+  Size output;
+  Size target;
+  Size buffer;  // as requested: for sideways rotations its sides are the picture's exchanged
+  int exact;    // scaled equals output: rows are copied
+};
+
+// How far a decode has come.
+struct Progress {
+  int imcuRows;    // in the picture
+  int imcuRow;     // decoded
+  int bufferFull;  // an iMCU row waits to be shown
+  int lastImcuDecoded;
+  int rowGroup;      // of that iMCU row, next to be replicated
+  int readPosition;  // rows of the current row group already converted
+  int rowsDone;      // full-grid rows handed to the converter, or skipped
+  int skipping;      // rows above the wanted region: no conversion
+};
+
+// From full-grid rows to rows of the target.
+struct Resampling {
+  void (*convert)(PELOJ_JDINFO*, int);
+  Sampling sampling;
+  int continueFlag;  // the input row must still yield more output rows
+  int inputRow;
+  OsBuffer<uint16_t> centres;  // of each output column; for sampling at quarters instead:
+  QuadSampler<ColourLanes, uint16_t> quarters;
+};
+
 }  // namespace pelo::jpeg
 
 struct PELOJ_JDINFO {
@@ -119,74 +229,20 @@ struct PELOJ_JDINFO {
   uint32_t rotation;
   int decMode;
 
-  // Frame and scan headers.
-  int componentCount;
-  int hMax, vMax;
-  pelo::jpeg::ColourSpace colourSpace;
-  int imageWidth, imageHeight;
-  int restartInterval;  // MCUs; 0: none
   pelo::OsPtr<pelo::jpeg::MarkerRecord> marker;
-  std::array<pelo::OsPtr<pelo::jpeg::QuantTable>, 4> quant;
-  // Replaced between scans, but still some component's.
-  std::array<pelo::OsPtr<pelo::jpeg::QuantTable>, pelo::jpeg::kMaxComponents> replacedQuant;
-  size_t replacedCount;
-  std::array<const pelo::jpeg::HuffmanSpec*, 4> dcRaw, acRaw;
-  // Every DHT definition keeps its slot: derived tables of earlier scans point into it.
-  std::array<pelo::OsPtr<pelo::jpeg::HuffmanSpec>, pelo::jpeg::kTablePoolSize> rawPool;
-  size_t rawCount;
-  std::array<pelo::OsPtr<pelo::jpeg::DerivedTable>, pelo::jpeg::kTablePoolSize> derivedPool;
-  size_t derivedCount;
-  pelo::OsPtr<std::array<pelo::jpeg::Component, pelo::jpeg::kMaxComponents>> components;
-  int scanComponentCount;
-  std::array<pelo::jpeg::Component*, pelo::jpeg::kMaxComponents> scan;
-  int lastScanComponent;  // frame index
-  int ss, se, ah, al;
-
-  // Entropy decoding.
-  pelo::OsPtr<pelo::jpeg::EntropyState> entropy;
-  uint8_t unreadMarker;  // second byte of a marker met in the data; 0: none
-  int mcuBlocks;
-  std::array<uint8_t, pelo::jpeg::kMaxMcuBlocks> blockComponent;  // scan position
-  std::array<uint8_t, pelo::jpeg::kMaxMcuBlocks> lastPosition;    // zig-zag, last non-zero coefficient
-  pelo::OsBuffer<int32_t> coefficients;                           // one MCU
-  std::array<int32_t*, pelo::jpeg::kMaxMcuBlocks> blocks;
-  int requantise;  // AC coefficients are brought to the reference steps while decoding
+  pelo::jpeg::Frame frame;
+  pelo::jpeg::Tables tables;
+  pelo::jpeg::Scan scan;
+  pelo::jpeg::Entropy entropy;
 
   // Pictures in several scans.
   std::array<pelo::OsPtr<pelo::jpeg::ScanRecord>, pelo::jpeg::kMaxScans> scans;
   size_t scanCount;  // 0 while the header's scan alone is read
-  int endIsMarker;   // the source's end counts as EOI; otherwise decoding fails there
-  uint32_t eobRun;   // blocks that an end-of-band code still covers (T.81 G.1.2.2)
   std::array<pelo::OsBuffer<int32_t>, pelo::jpeg::kMaxComponents> rowCoefficients;  // one iMCU row
 
-  // Progress.
-  int mcusPerRow;      // of the current scan
-  int mcuRowsPerImcu;  // rows of MCUs in the current iMCU row
-  int imcuRows;        // in the picture
-  int imcuRow;         // decoded
-  int bufferFull;      // an iMCU row waits to be shown
-  int lastImcuDecoded;
-  int rowGroup;      // of that iMCU row, next to be replicated
-  int readPosition;  // rows of the current row group already converted
-  int rowsDone;      // full-grid rows handed to the converter, or skipped
-  int skipping;      // rows above the wanted region: no conversion
-
-  // Sizes.
-  int bufferWidth, bufferHeight;
-  int outWidth, outHeight;
-  pelo::jpeg::Scale scale;
-  int exact;  // the scaled picture has the output size
-  int scaledWidth, scaledHeight;
-  int usedWidth, usedHeight;
-  int cropX, cropY;
-  int targetWidth, targetHeight;
-
-  // Conversion and output.
-  void (*convert)(PELOJ_JDINFO*, int);
-  int continueFlag;  // the input row must still yield more output rows
-  int inputRow;
-  pelo::OsBuffer<uint32_t> accumulator;  // one output row of packed sums
-  pelo::OsBuffer<uint16_t> columns;      // sample columns of each output column
+  pelo::jpeg::Sizes sizes;
+  pelo::jpeg::Progress progress;
+  pelo::jpeg::Resampling resampling;
   pelo::jpeg::RowOutput output;
 };
 

@@ -107,24 +107,24 @@ template <class Member>
 int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
   int result;
   if (!begin_mcu(jd, result)) return result;
-  EntropyState& entropy = *jd.entropy;
+  EntropyState& entropy = *jd.entropy.state;
   BitReader reader = open_bits(jd);
-  for (size_t i = 0; i < static_cast<size_t>(jd.mcuBlocks); ++i) {
-    const size_t scanIndex = jd.blockComponent[i];
+  for (size_t i = 0; i < static_cast<size_t>(jd.scan.mcuBlocks); ++i) {
+    const size_t scanIndex = jd.scan.blockComponent[i];
     const int32_t dc = decode_dc(reader, *entropy.blockDc[i], entropy.lastDc[scanIndex]);
-    blocks[i][0] = static_cast<int32_t>(static_cast<uint32_t>(dc) << jd.al);
+    blocks[i][0] = static_cast<int32_t>(static_cast<uint32_t>(dc) << jd.scan.al);
 
-    BlockContext context{*entropy.blockAc[i], entropy.blockSkip[i], nullptr, jd.se};
+    BlockContext context{*entropy.blockAc[i], entropy.blockSkip[i], nullptr, jd.scan.se};
     if constexpr (Member::kRequantise) {
-      context.correction = quant_table(jd, *jd.scan[scanIndex])->correction.data();
+      context.correction = quant_table(jd, *jd.scan.components[scanIndex])->correction.data();
     }
     int last = 0;
-    int k = jd.ss + 1;
+    int k = jd.scan.ss + 1;
     if constexpr (Member::kLimit > 1) {
       k = decode_kept<Member>(reader, context, blocks[i], k, last);
     }
     if constexpr (!Member::kWhole) skip_rest(reader, context, k - 1);
-    jd.lastPosition[i] = static_cast<uint8_t>(last < 63 ? last : 63);
+    jd.entropy.lastPosition[i] = static_cast<uint8_t>(last < 63 ? last : 63);
   }
   return end_mcu(jd, reader);
 }

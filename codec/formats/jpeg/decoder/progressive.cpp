@@ -13,7 +13,7 @@ namespace {
 // Blocks of a component in one row of the coefficient store: whole MCUs of the frame, whatever the
 // current scan's are.
 size_t stored_blocks_wide(const PELOJ_JDINFO& jd, const Component& component) {
-  const int mcus = (jd.imageWidth + 8 * jd.hMax - 1) / (8 * jd.hMax);
+  const int mcus = jd.frame.mcus_across();
   return static_cast<size_t>(mcus) * component.h;
 }
 
@@ -26,9 +26,9 @@ int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int
 }
 
 bool allocate_store(PELOJ_JDINFO& jd) {
-  for (int c = 0; c < jd.componentCount; ++c) {
+  for (int c = 0; c < jd.frame.componentCount; ++c) {
     const auto index = static_cast<size_t>(c);
-    const Component& component = (*jd.components)[index];
+    const Component& component = (*jd.frame.components)[index];
     const size_t blocks = stored_blocks_wide(jd, component) * component.v;
     if (!jd.rowCoefficients[index].allocate(blocks * 64)) return false;
   }
@@ -40,11 +40,11 @@ namespace {
 // Points the MCU's blocks at their places in the store.
 void point_blocks(PELOJ_JDINFO& jd, int mcu, int mcuRow) {
   size_t b = 0;
-  for (int i = 0; i < jd.scanComponentCount; ++i) {
-    const Component& component = *jd.scan[static_cast<size_t>(i)];
+  for (int i = 0; i < jd.scan.componentCount; ++i) {
+    const Component& component = *jd.scan.components[static_cast<size_t>(i)];
     for (int y = 0; y < component.mcuHeight; ++y) {
       for (int x = 0; x < component.mcuWidth; ++x) {
-        jd.blocks[b++] = stored_block(jd, component, mcuRow + y, mcu * component.mcuWidth + x);
+        jd.entropy.blocks[b++] = stored_block(jd, component, mcuRow + y, mcu * component.mcuWidth + x);
       }
     }
   }
@@ -53,20 +53,20 @@ void point_blocks(PELOJ_JDINFO& jd, int mcu, int mcuRow) {
 // One scan's part of the iMCU row; false when its data fails.
 bool decode_scan_row(PELOJ_JDINFO& jd) {
   // Nothing more comes of a scan that ended: a few bytes must not cost a visit to every block.
-  if (jd.entropy->insufficient && jd.restartInterval == 0) return true;
-  const auto decode = jd.ah != 0 ? decode_mcu_refine : decode_mcu_first;
-  for (int row = 0; row < jd.mcuRowsPerImcu; ++row) {
-    for (int mcu = 0; mcu < jd.mcusPerRow; ++mcu) {
+  if (jd.entropy.state->insufficient && jd.scan.restartInterval == 0) return true;
+  const auto decode = jd.scan.ah != 0 ? decode_mcu_refine : decode_mcu_first;
+  for (int row = 0; row < jd.scan.mcuRowsPerImcu; ++row) {
+    for (int mcu = 0; mcu < jd.scan.mcusPerRow; ++mcu) {
       point_blocks(jd, mcu, row);
-      if (!decode(&jd, jd.blocks.data())) return false;
+      if (!decode(&jd, jd.entropy.blocks.data())) return false;
     }
   }
   return true;
 }
 
 void transform_row(PELOJ_JDINFO& jd, const Component& component, InverseDct transform) {
-  const int size = jd.scale.block_size();
-  for (int y = 0; y < component.v && jd.imcuRow * component.v + y < component.blocksHigh; ++y) {
+  const int size = jd.sizes.scale.block_size();
+  for (int y = 0; y < component.v && jd.progress.imcuRow * component.v + y < component.blocksHigh; ++y) {
     uint8_t* const* rows = component.samples.get() + y * size;
     for (int x = 0; x < component.blocksWide; ++x) {
       transform(nullptr, component.multiplier.data(), stored_block(jd, component, y, x), rows, x * size);
@@ -84,8 +84,8 @@ int decode_coefficient_row(PELOJ_JDINFO& jd) {
     ScanRecord* record = jd.scans[i].get();
     if (!load_scan(&jd, record)) continue;
     if (!decode_scan_row(jd)) {
-      if (jd.usedHeight - jd.rowsDone < 16) return PELOJ_IMAGE_DONE;
-      if (jd.ah == 0) log_error("PELOJ_ProgDecodeSingleiMcu : PELOJ_ProgDecodeMcu fail");
+      if (jd.sizes.used.height - jd.progress.rowsDone < 16) return PELOJ_IMAGE_DONE;
+      if (jd.scan.ah == 0) log_error("PELOJ_ProgDecodeSingleiMcu : PELOJ_ProgDecodeMcu fail");
       return PELOJ_ROW_FAIL;
     }
     save_scan(&jd, record);
@@ -99,13 +99,13 @@ int decode_progressive_row(PELOJ_JDINFO* jdInfo) {
 }
 
 int transform_stored_row(PELOJ_JDINFO* jdInfo) {
-  const InverseDct transform = jdInfo->scale == kFull   ? PELOJ_DoIdct
-                               : jdInfo->scale == kHalf ? PELOJ_DoIdct_2to1
-                                                        : PELOJ_DoIdct_4to1;
-  for (int c = 0; c < jdInfo->componentCount; ++c) {
-    transform_row(*jdInfo, (*jdInfo->components)[static_cast<size_t>(c)], transform);
+  const InverseDct transform = jdInfo->sizes.scale == kFull   ? PELOJ_DoIdct
+                               : jdInfo->sizes.scale == kHalf ? PELOJ_DoIdct_2to1
+                                                              : PELOJ_DoIdct_4to1;
+  for (int c = 0; c < jdInfo->frame.componentCount; ++c) {
+    transform_row(*jdInfo, (*jdInfo->frame.components)[static_cast<size_t>(c)], transform);
   }
-  return ++jdInfo->imcuRow >= jdInfo->imcuRows ? PELOJ_IMAGE_DONE : PELOJ_ROW_DONE;
+  return ++jdInfo->progress.imcuRow >= jdInfo->progress.imcuRows ? PELOJ_IMAGE_DONE : PELOJ_ROW_DONE;
 }
 
 }  // namespace pelo::jpeg

@@ -18,16 +18,16 @@ int transform_stored_row(PELOJ_JDINFO* jdInfo);
 
 // False when that first scan is not a first pass over DC, without which the rest is nothing.
 inline bool first_scan_suffices(const PELOJ_JDINFO& jd) {
-  const bool firstAlone = is_progressive(jd) && jd.scale == kEighth;
-  return !firstAlone || (jd.ss == 0 && jd.ah == 0);
+  const bool firstAlone = is_progressive(jd) && jd.sizes.scale == kEighth;
+  return !firstAlone || (jd.scan.ss == 0 && jd.scan.ah == 0);
 }
 
 // Memory for one iMCU row of coefficients.
 [[nodiscard]] bool allocate_store(PELOJ_JDINFO& jd);
 
 // All scans of the next iMCU row into the coefficient store, without its transform; the caller moves
-// jd.imcuRow on. 100; 102 when a scan's data fail, or 101 when they do so within the picture's last
-// rows: neither happens with jd.endIsMarker.
+// jd.progress.imcuRow on. 100; 102 when a scan's data fail, or 101 when they do so within the picture's
+// last rows: neither happens with jd.entropy.endIsMarker.
 int decode_coefficient_row(PELOJ_JDINFO& jd);
 
 // A block of that store, by block row and column of the component in the iMCU row.

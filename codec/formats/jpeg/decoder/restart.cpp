@@ -1,5 +1,6 @@
 // Restart markers of the entropy-coded data.
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
+#include "codec/formats/jpeg/marker_codes.h"
 
 namespace pelo::jpeg {
 namespace {
@@ -19,7 +20,7 @@ bool scan_for_marker(PELOJ_JDINFO& jd) {
       code = *source_take(source, 1);
     } while (code == 0xFF);
     if (code != 0) {
-      jd.unreadMarker = code;
+      jd.entropy.unreadMarker = code;
       return true;
     }
     marker.discardedBytes += 2;
@@ -30,22 +31,22 @@ bool scan_for_marker(PELOJ_JDINFO& jd) {
 }  // namespace
 
 int process_restart(PELOJ_JDINFO* jdInfo) {
-  EntropyState& entropy = *jdInfo->entropy;
+  EntropyState& entropy = *jdInfo->entropy.state;
   MarkerRecord& marker = *jdInfo->marker;
   const int real = entropy.bits.left - entropy.bits.invented;
   if (real > 0) marker.discardedBytes += real / 8;
   entropy.bits = {};
 
-  if (jdInfo->unreadMarker == 0 && !scan_for_marker(*jdInfo)) {
+  if (jdInfo->entropy.unreadMarker == 0 && !scan_for_marker(*jdInfo)) {
     meet_end(*jdInfo);
-    if (jdInfo->unreadMarker == 0) return 0;
+    if (jdInfo->entropy.unreadMarker == 0) return 0;
   }
-  if (jdInfo->unreadMarker == 0xD0 + marker.nextRestart) jdInfo->unreadMarker = 0;
+  if (jdInfo->entropy.unreadMarker == restart_code(marker.nextRestart)) jdInfo->entropy.unreadMarker = 0;
   marker.nextRestart = (marker.nextRestart + 1) & 7;
   entropy.lastDc = {};
-  jdInfo->eobRun = 0;
-  entropy.restartsToGo = static_cast<uint32_t>(jdInfo->restartInterval);
-  if (jdInfo->unreadMarker == 0) entropy.insufficient = 0;
+  jdInfo->entropy.eobRun = 0;
+  entropy.restartsToGo = static_cast<uint32_t>(jdInfo->scan.restartInterval);
+  if (jdInfo->entropy.unreadMarker == 0) entropy.insufficient = 0;
   return 1;
 }
 

@@ -148,7 +148,7 @@ void set_planes(PELOJ_JDINFO& jd, uint8_t* buffer, const Placement& p, int64_t h
 // counted only.
 int choose_packer(PELOJ_JDINFO& jd) {
   jd.output.dither =
-      jd.outFormat == TAVIRPELO_RGB565_DITHER && jd.colourSpace == ColourSpace::kYcc ? 1 : 0;
+      jd.outFormat == TAVIRPELO_RGB565_DITHER && jd.frame.colourSpace == ColourSpace::kYcc ? 1 : 0;
   const int format = jd.outFormat == TAVIRPELO_RGB565_DITHER ? TAVIRPELO_RGB565 : jd.outFormat;
   jd.output.pack = jd.output.dither ? dithered_packer() : opaque_packer(format);
   return jd.output.pack == nullptr ? 0 : bytes_per_pixel(format);
@@ -157,17 +157,17 @@ int choose_packer(PELOJ_JDINFO& jd) {
 }  // namespace
 
 void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option) {
-  const Size target{jd.targetWidth, jd.targetHeight};
+  const Size target{jd.sizes.target.width, jd.sizes.target.height};
   const uint32_t placing = (option & ~uint32_t{TAVIRPELO_ROTATE_MASK}) | jd.rotation;
-  const Placement p = place({jd.bufferWidth, jd.bufferHeight}, target, placing);
+  const Placement p = place({jd.sizes.buffer.width, jd.sizes.buffer.height}, target, placing);
   const bool tight = (option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT;
   auto* bytes = static_cast<uint8_t*>(buffer);
 
   jd.output = {};
-  jd.output.limit = jd.output.bandEnd = jd.targetHeight;
+  jd.output.limit = jd.output.bandEnd = jd.sizes.target.height;
   if (buffer == nullptr) return;
   if (jd.outFormat == TAVIRPELO_YUV420) {
-    set_planes(jd, bytes, p, tight ? target.height : jd.bufferHeight);
+    set_planes(jd, bytes, p, tight ? target.height : jd.sizes.buffer.height);
     return;
   }
   const int size = choose_packer(jd);
@@ -191,7 +191,7 @@ void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows) {
   }
   if (!complete) output.plane[0] = nullptr;
   output.pixelStep = size;
-  output.rowStep = static_cast<ptrdiff_t>(int64_t{jd.bufferWidth} * size);
+  output.rowStep = static_cast<ptrdiff_t>(int64_t{jd.sizes.buffer.width} * size);
 }
 
 void write_ycc_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
@@ -207,7 +207,7 @@ void write_rgb_row(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, con
 }
 void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
                       int count) {
-  emit_row<YccModel>(*jdInfo, ColumnSource{{y, cb, cr}, jdInfo->columns.data()}, count);
+  emit_row<YccModel>(*jdInfo, ColumnSource{{y, cb, cr}, jdInfo->resampling.centres.data()}, count);
 }
 void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
                                const uint8_t* cr, int count) {

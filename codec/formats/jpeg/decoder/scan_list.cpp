@@ -24,16 +24,17 @@ class Coverage {
   // transform reads of a component whose band reached far enough.
   void add_scan(const PELOJ_JDINFO& jd) {
     if (!is_progressive(jd)) {
-      for (int i = 0; i < jd.scanComponentCount; ++i) complete(i, jd) = true;
+      for (int i = 0; i < jd.scan.componentCount; ++i) complete(i, jd) = true;
       return;
     }
-    const bool enough = (jd.scale == kHalf && jd.se > 18) || (jd.scale == kQuarter && jd.se >= 5);
-    if (enough) complete_[static_cast<size_t>(jd.lastScanComponent)] = true;
+    const bool enough =
+        (jd.sizes.scale == kHalf && jd.scan.se > 18) || (jd.sizes.scale == kQuarter && jd.scan.se >= 5);
+    if (enough) complete_[static_cast<size_t>(jd.scan.lastComponent)] = true;
   }
   // False for a sequential scan of components that are there already: the standard allows each once.
   bool gains(const PELOJ_JDINFO& jd) {
     if (is_progressive(jd)) return true;
-    for (int i = 0; i < jd.scanComponentCount; ++i) {
+    for (int i = 0; i < jd.scan.componentCount; ++i) {
       if (!complete(i, jd)) return true;
     }
     return false;
@@ -47,7 +48,7 @@ class Coverage {
 
  private:
   bool& complete(int scanIndex, const PELOJ_JDINFO& jd) {
-    return complete_[jd.scan[static_cast<size_t>(scanIndex)]->index];
+    return complete_[jd.scan.components[static_cast<size_t>(scanIndex)]->index];
   }
   std::array<bool, kMaxComponents> complete_{};
 };
@@ -86,7 +87,7 @@ int list_scans(PELOJ_JDINFO& jd) {
     }
     ++jd.scanCount;
     coverage.add_scan(jd);
-    if (coverage.all(jd.componentCount) || !find_scan(jd, coverage)) break;
+    if (coverage.all(jd.frame.componentCount) || !find_scan(jd, coverage)) break;
     if (prepare_scan(jd) != PELOJ_OK) return PELOJ_FAIL;
   }
   // What the state says of a sequential picture's scan stays that of the first one.
@@ -98,41 +99,41 @@ int make_scan_record(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
   *slot = os_new<ScanRecord>();
   if (!*slot) return PELOJ_FAIL;
   ScanRecord& record = **slot;
-  record.componentCount = jdInfo->scanComponentCount;
-  record.components = jdInfo->scan;
-  record.lastComponent = jdInfo->lastScanComponent;
-  record.ss = jdInfo->ss;
-  record.se = jdInfo->se;
-  record.ah = jdInfo->ah;
-  record.al = jdInfo->al;
-  record.restartInterval = jdInfo->restartInterval;
-  jdInfo->eobRun = 0;
+  record.componentCount = jdInfo->scan.componentCount;
+  record.components = jdInfo->scan.components;
+  record.lastComponent = jdInfo->scan.lastComponent;
+  record.ss = jdInfo->scan.ss;
+  record.se = jdInfo->scan.se;
+  record.ah = jdInfo->scan.ah;
+  record.al = jdInfo->scan.al;
+  record.restartInterval = jdInfo->scan.restartInterval;
+  jdInfo->entropy.eobRun = 0;
   save_scan(jdInfo, &record);
   return PELOJ_OK;
 }
 
 void save_scan(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
-  record->entropy = *jdInfo->entropy;
+  record->entropy = *jdInfo->entropy.state;
   record->sourcePosition = source_offset(*jdInfo->source);
-  record->eobRun = jdInfo->eobRun;
+  record->eobRun = jdInfo->entropy.eobRun;
   record->nextRestart = jdInfo->marker->nextRestart;
-  record->unreadMarker = jdInfo->unreadMarker;
+  record->unreadMarker = jdInfo->entropy.unreadMarker;
 }
 
 int load_scan(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
   if (!source_reposition(*jdInfo->source, record->sourcePosition)) return 0;
-  jdInfo->scanComponentCount = record->componentCount;
-  jdInfo->scan = record->components;
-  jdInfo->lastScanComponent = record->lastComponent;
-  jdInfo->ss = record->ss;
-  jdInfo->se = record->se;
-  jdInfo->ah = record->ah;
-  jdInfo->al = record->al;
-  jdInfo->restartInterval = record->restartInterval;
-  *jdInfo->entropy = record->entropy;
-  jdInfo->eobRun = record->eobRun;
+  jdInfo->scan.componentCount = record->componentCount;
+  jdInfo->scan.components = record->components;
+  jdInfo->scan.lastComponent = record->lastComponent;
+  jdInfo->scan.ss = record->ss;
+  jdInfo->scan.se = record->se;
+  jdInfo->scan.ah = record->ah;
+  jdInfo->scan.al = record->al;
+  jdInfo->scan.restartInterval = record->restartInterval;
+  *jdInfo->entropy.state = record->entropy;
+  jdInfo->entropy.eobRun = record->eobRun;
   jdInfo->marker->nextRestart = record->nextRestart;
-  jdInfo->unreadMarker = record->unreadMarker;
+  jdInfo->entropy.unreadMarker = record->unreadMarker;
   if (!set_scan_geometry(*jdInfo)) return 0;
   begin_imcu_row(jdInfo);
   return 1;

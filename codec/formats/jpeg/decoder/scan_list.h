@@ -23,13 +23,13 @@ inline bool is_progressive(const PELOJ_JDINFO& jd) {
 // True for pictures whose blocks several scans make up: progressive ones but at an eighth of their size,
 // where the first scan alone is shown.
 inline bool stores_coefficients(const PELOJ_JDINFO& jd) {
-  return is_progressive(jd) && jd.scale != kEighth;
+  return is_progressive(jd) && jd.sizes.scale != kEighth;
 }
 
 // True when a row takes more than the scan that the header ends with.
 inline bool needs_all_scans(const PELOJ_JDINFO& jd) {
   if (is_progressive(jd)) return stores_coefficients(jd);
-  return jd.scanCount > 0 || jd.scanComponentCount < jd.componentCount;
+  return jd.scanCount > 0 || jd.scan.componentCount < jd.frame.componentCount;
 }
 
 // Lists the scans from the first one, which the decoder has just prepared, as far as the scale can show

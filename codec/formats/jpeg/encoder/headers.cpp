@@ -3,27 +3,19 @@
 
 #include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
+#include "codec/formats/jpeg/marker_codes.h"
 
 namespace pelo::jpeg {
 namespace {
 
-enum Marker : uint8_t {
-  kSof0 = 0xC0,
-  kDht = 0xC4,
-  kSoi = 0xD8,
-  kEoi = 0xD9,
-  kSos = 0xDA,
-  kDqt = 0xDB,
-  kDri = 0xDD,
-  kApp0 = 0xE0
-};
+using enum Marker;
 
 // One segment under construction; the largest is a DHT of 256 symbols.
 class Segment {
  public:
   explicit Segment(Marker marker) {
     u8(0xFF);
-    u8(marker);
+    u8(static_cast<uint8_t>(marker));
     u16(0);
   }
   void u8(int value) { bytes_[size_++] = static_cast<uint8_t>(value); }
@@ -47,7 +39,7 @@ class Segment {
 };
 
 bool write_bare(ELO_ENCODER& encoder, Marker marker) {
-  const uint8_t bytes[2] = {0xFF, marker};
+  const uint8_t bytes[2] = {0xFF, static_cast<uint8_t>(marker)};
   return append(*encoder.destination, bytes, sizeof bytes);
 }
 

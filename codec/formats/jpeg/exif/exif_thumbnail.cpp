@@ -1,69 +1,21 @@
 // The thumbnail that an EXIF segment describes in IFD1: where it is, and how large.
 #include <climits>
-#include <cstddef>
 
-#include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/exif/exif_members.h"
 #include "codec/formats/jpeg/header_scan.h"
+#include "codec/formats/jpeg/ifd1_thumbnail.h"
 
 namespace pelo::jpeg {
 
-static_assert(sizeof(TAVIRPELO_EXIFTHUMBNAIL) == 40 && offsetof(TAVIRPELO_EXIFTHUMBNAIL, length) == 20 &&
-              offsetof(TAVIRPELO_EXIFTHUMBNAIL, offset) == 32);
-
 namespace {
 
-using Thumbnail = TAVIRPELO_EXIFTHUMBNAIL;
-
-// Values of the compression member; others are tag 259's.
-constexpr uint32_t kStrips = 0;
-constexpr uint32_t kJpeg = 6;
-
-// Positions in a source have 31 bits; 0 for what lies beyond.
-bool store_offset(Thumbnail& thumbnail, const Field& field, const tiff::Structure& tiff) {
-  const uint64_t offset = uint64_t{tiff.base} + field.number;
-  thumbnail.offset = offset <= INT_MAX ? static_cast<uint32_t>(offset) : 0;
-  return true;
-}
-
-bool store_jpeg_offset(Thumbnail& thumbnail, const Field& field, const tiff::Structure& tiff) {
-  if (tiff.holds(field.number, 0)) {
-    jpeg_size(tiff.data + field.number, tiff.size - field.number, &thumbnail.width, &thumbnail.height);
-  }
-  return store_offset(thumbnail, field, tiff);
-}
-
-template <uint32_t Compression>
-bool store_length(Thumbnail& thumbnail, const Field& field, const tiff::Structure&) {
-  thumbnail.compression = Compression;
-  thumbnail.length = field.number;
-  return true;
-}
-
-constexpr Member<Thumbnail> kThumbnailMembers[] = {
-    {256, kShortOrLong, 1, number<&Thumbnail::width>},
-    {257, kShortOrLong, 1, number<&Thumbnail::height>},
-    {259, kShort, 1, number<&Thumbnail::compression>},
-    {262, kShort, 1, number<&Thumbnail::photometric>},
-    {273, kShortOrLong, kAnyCount, store_offset},
-    {279, kShortOrLong, kAnyCount, store_length<kStrips>},
-    {284, kShort, 1, number<&Thumbnail::planarConfig>},
-    {513, kLong, 1, store_jpeg_offset},
-    {514, kLong, 1, store_length<kJpeg>},
-    {4173, kShort, 1, number<&Thumbnail::tag4173>},
-};
-
-// The head of a frame (T.81 B.2.2): precision, height, width.
 bool read_frame_size(PELOJ_SOURCE& source, uint32_t& width, uint32_t& height) {
-  constexpr uint32_t kHead = 5;
+  FrameHead head;
   uint32_t remaining;
-  if (!segment_length(source, remaining) || remaining < kHead || !source_need(source, kHead))
-    return false;
-  const uint8_t* head = source_take(source, kHead);
-  if (head[0] != 8) return false;
-  height = load_be16(head + 1);
-  width = load_be16(head + 3);
-  return source_skip(source, remaining - kHead);
+  if (!read_frame_head(source, head, remaining) || head.precision != 8) return false;
+  height = static_cast<uint32_t>(head.height);
+  width = static_cast<uint32_t>(head.width);
+  return source_skip(source, remaining);
 }
 
 // Walks to the first scan; false when the data ends before it.
@@ -103,9 +55,15 @@ int jpeg_size(const uint8_t* data, uint32_t size, uint32_t* width, uint32_t* hei
 }
 
 void read_thumbnail_directory(const tiff::Structure& tiff, uint32_t offset,
-                                          TAVIRPELO_EXIFTHUMBNAIL& thumbnail) {
+                              TAVIRPELO_EXIFTHUMBNAIL& thumbnail) {
   walk_directory(tiff, offset, [&](const Field& field) {
-    return store_field<Thumbnail>(kThumbnailMembers, thumbnail, field, tiff);
+    const ThumbnailTag* tag = thumbnail_tag(field.tag);
+    if (tag == nullptr || !tag->standard(field.type, field.count)) return true;
+    if (!store_thumbnail(thumbnail, *tag, field.number, tiff.base)) thumbnail.offset = 0;
+    if (tag->part == ThumbnailPart::kJpegOffset && tiff.holds(field.number, 0)) {
+      jpeg_size(tiff.data + field.number, tiff.size - field.number, &thumbnail.width, &thumbnail.height);
+    }
+    return true;
   });
   thumbnail.present = thumbnail.length != 0;
 }

@@ -80,7 +80,7 @@ int list_strip_scans(PELOJ_JDINFO* state) {
 int decode_strip(PELOJ_JDINFO* state, uint8_t* const* planes, int rows) {
   if (state == nullptr) return 0;
   // Stretching never crops, so that no rows have to be passed before the first one.
-  if (rows < 1 || state->rowsDone >= state->usedHeight) return 1;
+  if (rows < 1 || state->progress.rowsDone >= state->sizes.used.height) return 1;
   set_band(*state, planes, rows);
   const bool progressive = state->marker->frameType == FrameType::kProgressive;
   const int status = show_rows(*state);
@@ -90,7 +90,7 @@ int decode_strip(PELOJ_JDINFO* state, uint8_t* const* planes, int rows) {
     return 0;
   }
   if (status == PELOJ_IMAGE_DONE) {
-    state->rowsDone = state->usedHeight;
+    state->progress.rowsDone = state->sizes.used.height;
     if (progressive) release_buffers(*state);
   }
   return 1;

@@ -12,7 +12,7 @@ void add_table(TransformParameters& parameters, const PELOJ_JDINFO& jd, uint8_t 
   if (std::find(parameters.numbers.begin(), end, number) != end) return;
   parameters.numbers[static_cast<size_t>(parameters.tableCount++)] = number;
   for (size_t i = 0; i < 64; ++i) {
-    parameters.coding.quant[number][i] = static_cast<uint8_t>(jd.quant[number]->value[i]);
+    parameters.coding.quant[number][i] = static_cast<uint8_t>(jd.tables.quant[number]->value[i]);
   }
 }
 
@@ -25,7 +25,7 @@ void parameters_of_source(CoefficientSource* source, TransformParameters* parame
   for (auto& ratios : parameters->ratio) ratios.fill(1024);
   parameters->coding.componentCount = grid.componentCount;
   for (size_t c = 0; c < static_cast<size_t>(grid.componentCount); ++c) {
-    const uint8_t number = (*jd.components)[c].quantTable;
+    const uint8_t number = (*jd.frame.components)[c].quantTable;
     parameters->coding.components[c] = {number, static_cast<uint8_t>(grid.h[c]),
                                         static_cast<uint8_t>(grid.v[c])};
     add_table(*parameters, jd, number);

@@ -31,8 +31,8 @@ bool CoefficientSource::open(int ioType, void* source, int size, int width, int 
   decInfo_.reset(
       TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_YUV420, TAVIRPELO_THUMBNAIL_NEVER));
   if (!decInfo_) return false;
-  decoder_.reset(begin_strips(decInfo_.get(), std::max(width, 1), std::max(height, 1),
-                                          TAVIRPELO_YUV420));
+  decoder_.reset(
+      begin_strips(decInfo_.get(), std::max(width, 1), std::max(height, 1), TAVIRPELO_YUV420));
   if (!decoder_ || !accepted()) return false;
   lay_out();
   return true;
@@ -40,13 +40,16 @@ bool CoefficientSource::open(int ioType, void* source, int size, int width, int 
 
 bool CoefficientSource::accepted() const {
   const PELOJ_JDINFO& jd = *decoder_;
-  if (jd.colourSpace != ColourSpace::kYcc && jd.colourSpace != ColourSpace::kGrey) return false;
-  for (int c = 0; c < jd.componentCount; ++c) {
+  if (jd.frame.colourSpace != ColourSpace::kYcc && jd.frame.colourSpace != ColourSpace::kGrey)
+    return false;
+  for (int c = 0; c < jd.frame.componentCount; ++c) {
     const auto index = static_cast<size_t>(c);
-    const Component& component = (*jd.components)[index];
-    if (component.quantTable >= jd.quant.size() || !jd.quant[component.quantTable]) return false;
-    if (has_zero(*jd.quant[component.quantTable])) return false;
-    if (!progressive() && (jd.scanComponentCount != jd.componentCount || jd.scan[index]->index != c))
+    const Component& component = (*jd.frame.components)[index];
+    if (component.quantTable >= jd.tables.quant.size() || !jd.tables.quant[component.quantTable])
+      return false;
+    if (has_zero(*jd.tables.quant[component.quantTable])) return false;
+    if (!progressive() &&
+        (jd.scan.componentCount != jd.frame.componentCount || jd.scan.components[index]->index != c))
       return false;
   }
   return !progressive() || needs_all_scans(jd);
@@ -55,17 +58,16 @@ bool CoefficientSource::accepted() const {
 void CoefficientSource::lay_out() {
   const PELOJ_JDINFO& jd = *decoder_;
   grid_ = {};
-  grid_.componentCount = jd.componentCount;
-  const bool single = jd.componentCount == 1;
-  for (size_t c = 0; c < static_cast<size_t>(jd.componentCount); ++c) {
-    const Component& component = (*jd.components)[c];
+  grid_.componentCount = jd.frame.componentCount;
+  const bool single = jd.frame.componentCount == 1;
+  for (size_t c = 0; c < static_cast<size_t>(jd.frame.componentCount); ++c) {
+    const Component& component = (*jd.frame.components)[c];
     grid_.h[c] = single ? 1 : component.h;
     grid_.v[c] = single ? 1 : component.v;
     grid_.blocks += grid_.h[c] * grid_.v[c];
   }
-  grid_.across =
-      single ? (*jd.components)[0].blocksWide : (jd.imageWidth + 8 * jd.hMax - 1) / (8 * jd.hMax);
-  grid_.down = single ? (*jd.components)[0].blocksHigh : jd.imcuRows;
+  grid_.across = single ? (*jd.frame.components)[0].blocksWide : jd.frame.mcus_across();
+  grid_.down = single ? (*jd.frame.components)[0].blocksHigh : jd.progress.imcuRows;
 }
 
 bool CoefficientSource::read_row(CoefficientBlock* blocks) {
@@ -98,12 +100,14 @@ bool CoefficientSource::skip_row() {
 // Fills the coefficient store with the next iMCU row. Of one component that holds several rows of MCUs.
 bool CoefficientSource::next_stored_row() {
   PELOJ_JDINFO& jd = *decoder_;
-  if (jd.imcuRow >= jd.imcuRows || decode_coefficient_row(jd) != PELOJ_ROW_DONE) return false;
-  const Component& first = (*jd.components)[0];
-  storedRows_ =
-      jd.componentCount > 1 ? 1 : std::min<int>(first.v, first.blocksHigh - jd.imcuRow * first.v);
+  if (jd.progress.imcuRow >= jd.progress.imcuRows || decode_coefficient_row(jd) != PELOJ_ROW_DONE)
+    return false;
+  const Component& first = (*jd.frame.components)[0];
+  storedRows_ = jd.frame.componentCount > 1
+                    ? 1
+                    : std::min<int>(first.v, first.blocksHigh - jd.progress.imcuRow * first.v);
   storedRow_ = 0;
-  ++jd.imcuRow;
+  ++jd.progress.imcuRow;
   return true;
 }
 
@@ -111,7 +115,7 @@ bool CoefficientSource::read_progressive_row(CoefficientBlock* blocks) {
   if (storedRow_ >= storedRows_ && !next_stored_row()) return false;
   for (int mcu = 0; mcu < grid_.across; ++mcu) {
     for (size_t c = 0; c < static_cast<size_t>(grid_.componentCount); ++c) {
-      const Component& component = (*decoder_->components)[c];
+      const Component& component = (*decoder_->frame.components)[c];
       for (int y = 0; y < grid_.v[c]; ++y) {
         for (int x = 0; x < grid_.h[c]; ++x, ++blocks) {
           const int32_t* stored =

@@ -38,15 +38,15 @@ struct Job {
 
 enum class Outcome { kFits, kTooLarge, kFailed };
 
-using Frame = std::unique_ptr<TAVIRPELO_DECINFO, int (*)(TAVIRPELO_DECINFO*)>;
-Frame open(const Input& input) {
+using OpenInput = std::unique_ptr<TAVIRPELO_DECINFO, int (*)(TAVIRPELO_DECINFO*)>;
+OpenInput open(const Input& input) {
   return {TAVIRPELO_CreateDecInfo(input.kind, input.address, input.size, TAVIRPELO_YUV420, 0),
           TAVIRPELO_DestroyDecInfo};
 }
 
 // Size of the picture and its orientation; false when it is no JPEG.
 bool read_source(Job& job) {
-  const Frame frame = open(job.source);
+  const OpenInput frame = open(job.source);
   if (frame == nullptr) return false;
   TAVIRPELO_HINFO header{};
   record_error(ErrorWord::kDecoding, TAVIRPELO_ERROR_NONE);
@@ -77,7 +77,7 @@ TAVIRPELO_RAWINFO planar(int width, int height) {
 bool code_again(const Job& job, CoefficientSource& source, const TransformParameters& parameters,
                 ELO_DESTINATION& destination) {
   const PELOJ_JDINFO& jd = source.decoder();
-  const TAVIRPELO_RAWINFO image = planar(jd.imageWidth, jd.imageHeight);
+  const TAVIRPELO_RAWINFO image = planar(jd.frame.width, jd.frame.height);
   const TAVIRPELO_ENCOPTION options{100, job.segment(), 0};
   restart(destination);
   ELO_ENCODER* encoder = begin_bands(&image, &destination, &options, &parameters.coding);
@@ -143,7 +143,7 @@ bool code_bands(PELOJ_JDINFO* decoder, ELO_ENCODER* encoder, Band& band, int hei
 }
 
 bool planar_source(const PELOJ_JDINFO& jd) {
-  return jd.colourSpace == ColourSpace::kYcc || jd.colourSpace == ColourSpace::kGrey;
+  return jd.frame.colourSpace == ColourSpace::kYcc || jd.frame.colourSpace == ColourSpace::kGrey;
 }
 
 // Reduced sizes, each three quarters of the one before, from the ratio on.
@@ -233,7 +233,7 @@ int scale_for_target(int width, int height, int target) {
 
 int resize_within(void* source, int size, int kind, int width, int height, const TAVIRPELO_APP1* app1,
                   ELO_DESTINATION* destination) {
-  const Frame frame = open({kind, source, size});
+  const OpenInput frame = open({kind, source, size});
   Band band;
   if (frame == nullptr || !band.allocate(width)) return 0;
   PELOJ_JDINFO* decoder = begin_strips(frame.get(), width, height, TAVIRPELO_YUV420);

@@ -41,7 +41,7 @@ bool Rotation::start(void* source, int size, Size picture, ELO_DESTINATION* dest
   if (!source_.open(TAVIRPELO_IO_MEMORY, source, size, picture.width / 8, picture.height / 8))
     return false;
   const PELOJ_JDINFO& jd = source_.decoder();
-  if (source_.progressive() || jd.imageWidth != picture.width || jd.imageHeight != picture.height)
+  if (source_.progressive() || jd.frame.width != picture.width || jd.frame.height != picture.height)
     return false;
   const size_t blocks = source_.grid().row_blocks();
   if (!row_.allocate(blocks) || !turned_.allocate(blocks)) return false;

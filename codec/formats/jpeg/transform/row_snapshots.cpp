@@ -3,22 +3,25 @@
 namespace pelo::jpeg {
 
 void init_partial(const PELOJ_JDINFO* jdInfo, RowSnapshot* snapshot) {
-  const EntropyState& entropy = *jdInfo->entropy;
-  *snapshot = {entropy.bits,         entropy.lastDc,
-               entropy.restartsToGo, pelo::source_offset(*jdInfo->source),
-               entropy.insufficient, jdInfo->marker->nextRestart,
-               jdInfo->unreadMarker};
+  const EntropyState& entropy = *jdInfo->entropy.state;
+  *snapshot = {entropy.bits,
+               entropy.lastDc,
+               entropy.restartsToGo,
+               pelo::source_offset(*jdInfo->source),
+               entropy.insufficient,
+               jdInfo->marker->nextRestart,
+               jdInfo->entropy.unreadMarker};
 }
 
 int load_partial(PELOJ_JDINFO* jdInfo, const RowSnapshot* snapshot) {
   if (!pelo::source_reposition(*jdInfo->source, snapshot->sourcePosition)) return 0;
-  EntropyState& entropy = *jdInfo->entropy;
+  EntropyState& entropy = *jdInfo->entropy.state;
   entropy.bits = snapshot->bits;
   entropy.lastDc = snapshot->lastDc;
   entropy.restartsToGo = snapshot->restartsToGo;
   entropy.insufficient = snapshot->insufficient;
   jdInfo->marker->nextRestart = snapshot->nextRestart;
-  jdInfo->unreadMarker = snapshot->unreadMarker;
+  jdInfo->entropy.unreadMarker = snapshot->unreadMarker;
   return 1;
 }
 

@@ -4,6 +4,8 @@
 #include <climits>
 #include <utility>
 
+#include "codec/formats/jpeg/marker_codes.h"
+
 namespace pelo::jpeg {
 namespace {
 
@@ -100,7 +102,7 @@ int finish_column(ColumnEncoder* columns) {
   if (!reserve(*encoder.destination, total + 2)) return 0;
   for (size_t i = 0; i < columns->streams.size(); ++i) {
     ELO_DESTINATION& stream = columns->streams[i].destination;
-    const uint8_t marker[2] = {0xFF, static_cast<uint8_t>(0xD0 + (i + 7) % 8)};
+    const uint8_t marker[2] = {0xFF, restart_code(static_cast<int>(i + 7))};
     if (i != 0 && !append(*encoder.destination, marker, sizeof marker)) return 0;
     if (!append(*encoder.destination, stream.buffer, static_cast<size_t>(stream.used))) return 0;
     discard(stream);
