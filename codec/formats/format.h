@@ -6,6 +6,7 @@
 #include <cstdint>
 
 #include "codec/base/buffered_source.h"
+#include "codec/base/checked.h"
 #include "codec/base/errors.h"
 #include "tavirpelo/parse.h"
 
@@ -31,6 +32,15 @@ struct Format {
 // format's: sets imageFormat and the record's sizes.
 using Detect = int (*)(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
 int parse_source(TAVIRPELO_DECINFO& decInfo, TAVIRPELO_HINFO* hinfo, Detect detect);
+
+// ---- what the decoders share ----
+
+// Whether obtain() gets a block of so many bytes, or why not. It is not asked above the limit.
+template <class Obtain>
+[[nodiscard]] bool obtain_block(int64_t bytes, const char* stage, Obtain obtain) {
+  if (bytes > kMaxPictureBlock) return refuse(Reason::kBlockLimit, stage);
+  return obtain() || refuse(Reason::kNoMemory, stage);
+}
 
 // ---- what the parsers share ----
 

@@ -2,23 +2,28 @@
 #include <climits>
 #include <cstdio>
 
+#include "codec/base/errors.h"
 #include "codec/base/io.h"
 #include "codec/formats/bmp/bmp_record.h"
 
 namespace pelo::bmp {
 namespace {
 
+constexpr const char* kStage = "BMP decoder";
 constexpr int kIterRows = 100;
 constexpr int kHeadBytes = 54;
 
 bool usable(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
-  return decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 && height >= 0;
+  return (decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 &&
+          height >= 0) ||
+         refuse(Reason::kArgument, kStage);
 }
 
 // Rewinds the source; false for a memory source too short for the headers.
 bool rewind(TAVIRPELO_IO* io) {
   seek_io(io, 0, SEEK_SET);
-  return io->ioType != TAVIRPELO_IO_MEMORY || (io->pSource != nullptr && io->size >= kHeadBytes);
+  return io->ioType != TAVIRPELO_IO_MEMORY || (io->pSource != nullptr && io->size >= kHeadBytes) ||
+         refuse(Reason::kTruncated, "BMP header");
 }
 
 bool same_request(const PELOI_BMPRECORD& record, const TAVIRPELO_DECINFO& decInfo, const void* output,
@@ -43,14 +48,15 @@ PELOI_BMPRECORD* obtain(TAVIRPELO_DECINFO* decInfo, void* output, int width, int
   auto* record = held_state<PELOI_BMPRECORD>(*decInfo);
   if (record != nullptr && same_request(*record, *decInfo, output, width, height)) return record;
   release(decInfo);
-  return nullptr;
+  return refuse(Reason::kRequestChanged, kStage), nullptr;
 }
 
 }  // namespace
 int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   if (!usable(decInfo, output, width, height) || !rewind(decInfo->pIO)) return 0;
   release(decInfo);
-  if (decInfo->pFormatInfo != nullptr) return 0;  // another format's
+  if (decInfo->pFormatInfo != nullptr)  // another format's
+    return refuse(Reason::kRequestChanged, kStage);
   PELOI_BMPRECORD* record = make_record(decInfo, width, height, output);
   if (record == nullptr) return 0;
   const bool done = decode(*record, INT_MAX);
@@ -59,7 +65,9 @@ int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
 }
 
 int decode_rows_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
-  if (!usable(decInfo, output, width, height) || lines < 1 || !rewind(decInfo->pIO)) return 0;
+  if (!usable(decInfo, output, width, height)) return 0;
+  if (lines < 1) return refuse(Reason::kArgument, kStage);
+  if (!rewind(decInfo->pIO)) return 0;
   PELOI_BMPRECORD* record = obtain(decInfo, output, width, height);
   if (record == nullptr) return 0;
   decInfo->pFormatInfo = record;

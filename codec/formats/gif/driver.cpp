@@ -11,8 +11,12 @@
 namespace pelo::gif {
 namespace {
 
+constexpr const char* kStage = "GIF decoder";
+
 bool valid(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
-  return decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 && height >= 0;
+  return (decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 &&
+          height >= 0) ||
+         refuse(Reason::kArgument, kStage);
 }
 
 // What a mode needs beyond the geometry of all.
@@ -32,7 +36,9 @@ OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, void* output, int width, int hei
   OsPtr<Record> record(make_record(&decInfo, width, height, mode == Mode::kAnimated, output));
   if (record == nullptr) return nullptr;
   record->request.mode = mode;
-  if (seek_image(decInfo.pIO, record.get()) != kImageFollows || !prepare(*record)) return nullptr;
+  if (seek_image(decInfo.pIO, record.get()) != kImageFollows)
+    return refuse(Reason::kDamaged, kStage, "no image"), nullptr;
+  if (!prepare(*record)) return nullptr;
   decInfo.outWidth = record->picture.width;
   decInfo.outHeight = record->picture.height;
   return record;
@@ -45,13 +51,14 @@ bool foreign_state(const TAVIRPELO_DECINFO& decInfo) {
 }  // namespace
 
 Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode) {
-  if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return nullptr;
+  if (!valid(decInfo, output, width, height)) return nullptr;
+  if (foreign_state(*decInfo)) return refuse(Reason::kRequestChanged, kStage), nullptr;
   if (Record* held = held_state<Record>(*decInfo)) {
     const Request asked{mode, {width, height}, decInfo->outFormat, decInfo->option};
     held->decInfo = decInfo;
     if (held->request == asked) return held;
     release_state<Record>(*decInfo);
-    return nullptr;
+    return refuse(Reason::kRequestChanged, kStage), nullptr;
   }
   decInfo->pFormatInfo = start(*decInfo, output, width, height, mode).release();
   return held_state<Record>(*decInfo);
@@ -80,21 +87,22 @@ Record* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, int anima
 }
 
 int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return kFailure;
+  if (!valid(decInfo, output, width, height)) return kFailure;
+  if (foreign_state(*decInfo)) return refuse(Reason::kRequestChanged, kStage);
   release_state<Record>(*decInfo);
   const auto record = start(*decInfo, output, width, height, Mode::kWhole);
   if (record == nullptr) return kFailure;
-  const int result = decode_image(decInfo->pIO, record.get(), output);
+  const int result = answer(decode_image(decInfo->pIO, record.get(), output));
   if (record->ended || !finish_picture(*record, output)) return kFailure;
   return result;
 }
 
 int decode_lines(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
-  if (lines < 1) return kFailure;
+  if (lines < 1) return refuse(Reason::kArgument, kStage);
   const bool first = decInfo != nullptr && decInfo->pFormatInfo == nullptr;
   Record* record = continue_or_start(decInfo, output, width, height, Mode::kLines);
   if (record == nullptr) return kFailure;
-  const int result = decode_image_lines(decInfo->pIO, record, output, lines, first);
+  const int result = answer(decode_image_lines(decInfo->pIO, record, output, lines, first));
   if (result != kMore) release_state<Record>(*decInfo);
   return result == kFailure ? kFailure : kDone;
 }

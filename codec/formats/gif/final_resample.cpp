@@ -1,6 +1,7 @@
 #include "codec/formats/gif/final_resample.h"
 
 #include "codec/base/axis_stepper.h"
+#include "codec/base/errors.h"
 #include "codec/formats/gif/geometry.h"
 #include "codec/formats/gif/output.h"
 #include "codec/formats/gif/store_span.h"
@@ -88,7 +89,8 @@ bool plan_reduction(Record& record) {
   const Size reduced = reduced_size(record);
   if (record.store == nullptr || !is_reduced(record)) return true;
   if (reduced == record.picture) {  // sampling straight into the output gives the same pixels
-    return record.plane.painted.allocate(static_cast<size_t>(record.picture.height));
+    return record.plane.painted.allocate(static_cast<size_t>(record.picture.height)) ||
+           refuse(Reason::kNoMemory, "GIF picture");
   }
   return set_sampling(record.sampling, record.screen, reduced) && record.plane.allocate(reduced);
 }

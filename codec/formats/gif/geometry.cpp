@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "codec/base/axis_stepper.h"
+#include "codec/formats/format.h"
 #include "codec/pixel/packers.h"
 
 namespace pelo::gif {
@@ -56,7 +57,9 @@ bool set_sampling(Sampling& sampling, Size from, Size to) {
   sampling.columns.reset();
   if (from == to || to.width == 0 || from.width == 0) return true;
   const auto count = static_cast<size_t>(to.width);
-  if (to.width > kMaxPictureBlock / 2 || !sampling.columns.allocate(count)) return false;
+  if (!obtain_block(int64_t{2} * to.width, "GIF picture",
+                    [&] { return sampling.columns.allocate(count); }))
+    return false;
   AxisStepper stepper(from.width, to.width, from.width / 2);
   for (size_t k = 0; k < count; ++k, stepper.advance()) {
     sampling.columns[k] = static_cast<uint16_t>(stepper.position());

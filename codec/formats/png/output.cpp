@@ -9,6 +9,7 @@
 
 #include "codec/base/byte_order.h"
 #include "codec/base/row_progress.h"
+#include "codec/formats/format.h"
 #include "codec/formats/png/png_context.h"
 #include "codec/pixel/blend.h"
 #include "codec/pixel/packers.h"
@@ -152,7 +153,8 @@ void choose_size(PELOI_PNGCONTEXT& context) {
 
 bool map_columns(PELOI_PNGCONTEXT& context) {
   OutputState& output = context.output;
-  if (uint64_t{output.width} * 8 > kMaxPictureBlock || !output.columns.allocate(output.width))
+  if (!obtain_block(int64_t{output.width} * 8, "PNG picture",
+                    [&] { return output.columns.allocate(output.width); }))
     return false;
   const uint32_t width = context.info.width;
   AxisStepper columns(width, output.width, width / 4);
@@ -160,15 +162,17 @@ bool map_columns(PELOI_PNGCONTEXT& context) {
     output.columns[k] = static_cast<uint32_t>(columns.position());
   }
   if (context.info.interlace == 0) return true;
-  if (!output.passColumns.allocate(size_t{2} * output.width)) return false;
+  if (!output.passColumns.allocate(size_t{2} * output.width))
+    return refuse(Reason::kNoMemory, "PNG picture");
   output.passTargets = output.passColumns.data() + output.width;
   return true;
 }
 
 bool reserve_whole_image(PELOI_PNGCONTEXT& context) {
   OutputState& output = context.output;
-  const uint64_t pixels = uint64_t{output.width} * output.height;
-  return pixels <= kMaxPictureBlock / 4 && output.wholeImage.allocate(static_cast<size_t>(pixels * 4));
+  const int64_t pixels = int64_t{output.width} * output.height;
+  return obtain_block(std::min(pixels, kMaxPictureBlock) * 4, "PNG picture",
+                      [&] { return output.wholeImage.allocate(static_cast<size_t>(pixels * 4)); });
 }
 
 bool gathers(const PELOI_PNGCONTEXT& context) {

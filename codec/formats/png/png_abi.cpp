@@ -2,6 +2,7 @@
 #include "codec/formats/png/png_abi.h"
 
 #include "codec/base/axis_stepper.h"
+#include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "codec/pixel/blend.h"
 #include "tavirpelo/api.h"
@@ -97,15 +98,18 @@ int __checkbuffer_util2(PELOI_PNGREADBUFFER* buffer, uint32_t need) {
 }
 
 int TAVIRPELOI_DecodePNG(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return png::decode(decInfo, output, width, height);
 }
 
 int TAVIRPELOI_DecodePNGLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
                              int lines) {
+  begin_operation();
   return png::decode_lines(decInfo, output, width, height, lines);
 }
 
 int TAVIRPELOI_DecodePNGIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return png::decode_step(decInfo, output, width, height);
 }
 

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "codec/base/row_progress.h"
+#include "codec/formats/format.h"
 #include "codec/formats/png/png_context.h"
 #include "codec/formats/png/row_filter.h"
 
@@ -90,9 +91,10 @@ Result write_pending(PELOI_PNGCONTEXT& context) {
 bool begin_scanlines(PELOI_PNGCONTEXT& context) {
   ScanlineState& scanline = context.scanline;
   const uint64_t rowBytes = (uint64_t{context.info.bitsPerPixel} * context.info.width + 7) / 8;
-  if (2 * (rowBytes + 1 + context.info.width) > kMaxPictureBlock) return false;
   const auto rowSize = static_cast<size_t>(rowBytes) + 1;
-  if (!scanline.rows.allocate(2 * rowSize)) return false;
+  if (!obtain_block(static_cast<int64_t>(2 * (rowBytes + 1 + context.info.width)), "PNG rows",
+                    [&] { return scanline.rows.allocate(2 * rowSize); }))
+    return false;
   scanline.current = scanline.rows.data();
   scanline.above = scanline.rows.data() + rowSize;
   context.fullWidth = context.info.width;
@@ -116,7 +118,7 @@ bool may_go_on() {
   int status = 0;
   TAVIRPELO_CheckExStatus(&status);
   if (status > 0) TAVIRPELO_OsSleep(status);
-  return status >= 0;
+  return status >= 0 || refuse(Reason::kCancelled, "writing rows");
 }
 
 Result consume(PELOI_PNGCONTEXT& context) {
