@@ -19,28 +19,41 @@ bool valid(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int 
          refuse(Reason::kArgument, kStage);
 }
 
-// What a mode needs beyond the geometry of all.
-bool prepare(Record& record) {
-  switch (record.request.mode) {
-    case Mode::kLines:  // rows are delivered as they are
-      return set_geometry(record, record.option & ~uint32_t{TAVIRPELO_ROTATE_MASK});
-    case Mode::kAnimated:
-      return true;
-    default:
-      return plan_reduction(record);
-  }
+// How a picture is placed: by lines, rows are delivered as they are.
+uint32_t placing_option(Mode mode, uint32_t option) {
+  return mode == Mode::kLines ? option & ~uint32_t{TAVIRPELO_ROTATE_MASK} : option;
+}
+
+// A record with the header read and the output's geometry computed.
+OsPtr<Record> open(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode) {
+  OsPtr<Record> record(new_record());
+  if (record == nullptr) return nullptr;
+  decInfo.scaleDenom = 1;
+  record->decInfo = &decInfo;
+  record->animated = mode == Mode::kAnimated;
+  record->request = {mode, {width, height}, decInfo.outFormat, decInfo.option};
+  record->store = gif_storer(decInfo.outFormat);
+  if (!parse_header(decInfo.pIO, record.get())) return nullptr;
+  if (!set_geometry(*record, placing_option(mode, decInfo.option))) return nullptr;
+  if (record->animated && !create_canvas(*record)) return nullptr;
+  decInfo.imageWidth = record->screen.width;
+  decInfo.imageHeight = record->screen.height;
+  decInfo.outWidth = record->picture.width;
+  decInfo.outHeight = record->picture.height;
+  return record;
+}
+
+bool averages(Mode mode) {
+  return mode == Mode::kWhole || mode == Mode::kIterative;
 }
 
 // A record that stands at the first image's data; null on failure.
-OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, void* output, int width, int height, Mode mode) {
-  OsPtr<Record> record(make_record(&decInfo, width, height, mode == Mode::kAnimated, output));
+OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode) {
+  OsPtr<Record> record = open(decInfo, width, height, mode);
   if (record == nullptr) return nullptr;
-  record->request.mode = mode;
   if (seek_image(decInfo.pIO, record.get()) != kImageFollows)
     return refuse(Reason::kDamaged, kStage, "no image"), nullptr;
-  if (!prepare(*record)) return nullptr;
-  decInfo.outWidth = record->picture.width;
-  decInfo.outHeight = record->picture.height;
+  if (averages(mode) && !plan_reduction(*record)) return nullptr;
   return record;
 }
 
@@ -60,37 +73,20 @@ Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, i
     release_state<Record>(*decInfo);
     return refuse(Reason::kRequestChanged, kStage), nullptr;
   }
-  decInfo->pFormatInfo = start(*decInfo, output, width, height, mode).release();
+  decInfo->pFormatInfo = start(*decInfo, width, height, mode).release();
   return held_state<Record>(*decInfo);
 }
 
 Record* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, int animated, void* output) {
   if (!valid(decInfo, output, width, height)) return nullptr;
-  OsPtr<Record> record(new_record());
-  if (record == nullptr) return nullptr;
-  decInfo->scaleDenom = 1;
-  record->decInfo = decInfo;
-  record->animated = animated != 0;
-  record->request = {animated != 0 ? Mode::kAnimated : Mode::kWhole,
-                     {width, height},
-                     decInfo->outFormat,
-                     decInfo->option};
-  record->store = gif_storer(decInfo->outFormat);
-  if (!parse_header(decInfo->pIO, record.get())) return nullptr;
-  if (!set_geometry(*record, decInfo->option)) return nullptr;
-  if (record->animated && !create_canvas(*record)) return nullptr;
-  decInfo->imageWidth = record->screen.width;
-  decInfo->imageHeight = record->screen.height;
-  decInfo->outWidth = record->picture.width;
-  decInfo->outHeight = record->picture.height;
-  return record.release();
+  return open(*decInfo, width, height, animated != 0 ? Mode::kAnimated : Mode::kWhole).release();
 }
 
 int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   if (!valid(decInfo, output, width, height)) return kFailure;
   if (foreign_state(*decInfo)) return refuse(Reason::kRequestChanged, kStage);
   release_state<Record>(*decInfo);
-  const auto record = start(*decInfo, output, width, height, Mode::kWhole);
+  const auto record = start(*decInfo, width, height, Mode::kWhole);
   if (record == nullptr) return kFailure;
   const int result = answer(decode_image(decInfo->pIO, record.get(), output));
   if (record->ended || !finish_picture(*record, output)) return kFailure;

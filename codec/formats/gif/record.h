@@ -7,6 +7,7 @@
 #include "codec/base/geometry.h"
 #include "codec/base/lsb_bits.h"
 #include "codec/base/os_memory.h"
+#include "codec/base/output_grid.h"
 #include "codec/formats/gif/reader.h"
 #include "codec/formats/gif/translation_table.h"
 #include "codec/pixel/rgba_store.h"
@@ -50,6 +51,13 @@ struct Sampling {
 
 struct OutputRows {
   int begin, end;
+};
+
+// The rows of the picture in the caller's buffer, as long as calls name the same.
+struct Target {
+  void* bytes;
+  int lines;  // of a call by lines
+  OutputGrid grid;
 };
 
 // Sampled rows of indices, kept until they can be written.
@@ -103,6 +111,7 @@ struct Record : FormatState {
   Size picture;     // produced size before rotation
   Sampling sampling;
   IndexPlane plane;
+  Target target;
   OsBuffer<uint8_t> line;  // indices of the current row and the rest of the string behind it
   int currentRow;          // on the screen
   int rowsWritten;         // output rows of the image or frame
