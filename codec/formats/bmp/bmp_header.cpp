@@ -3,7 +3,6 @@
 #include <climits>
 #include <cstring>
 
-#include "codec/base/axis_stepper.h"
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
 #include "codec/base/geometry.h"
@@ -11,6 +10,7 @@
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/formats/format.h"
 #include "codec/pixel/packers.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo::bmp {
 namespace {
@@ -169,11 +169,10 @@ bool prepare_resizing(PELOI_BMPRECORD& record) {
     return record.columns.allocate(2 * width) && record.accumulators.allocate(width);
   };
   if (!obtain_block(int64_t{record.outWidth} * 8, "BMP picture", allocate)) return false;
-  AxisStepper quarter(record.width, record.outWidth, record.width / 4);
-  AxisStepper threeQuarters(record.width, record.outWidth, int64_t{3} * record.width / 4);
-  for (size_t x = 0; x < width; ++x, quarter.advance(), threeQuarters.advance()) {
-    record.columns[x] = static_cast<uint32_t>(quarter.position());
-    record.columns[width + x] = static_cast<uint32_t>(threeQuarters.position());
+  QuarterPoints columns(record.width, record.outWidth);
+  for (size_t x = 0; x < width; ++x, columns.advance()) {
+    record.columns[x] = static_cast<uint32_t>(columns.first());
+    record.columns[width + x] = static_cast<uint32_t>(columns.second());
   }
   return true;
 }

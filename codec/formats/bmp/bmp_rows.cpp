@@ -11,6 +11,7 @@
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/pixel_layout.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo::bmp {
 namespace {
@@ -126,8 +127,10 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Depth& depth) {
         });
   }
   std::fill_n(record.accumulators.data(), record.outWidth, 0u);
-  const int64_t quarters[2] = {record.height / 4, int64_t{3} * record.height / 4};
-  for (const int64_t phase : {quarters[record.topDown], quarters[!record.topDown]}) {  // in file order
+  const auto [quarter, threeQuarters] = quarter_phases(record.height);
+  const bool topDown = record.topDown;
+  for (const int64_t phase :
+       {topDown ? threeQuarters : quarter, topDown ? quarter : threeQuarters}) {  // in file order
     const int64_t row = row_from_below(record, (phase + up * record.height) / record.outHeight);
     const bool there =
         record.reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {

@@ -6,7 +6,6 @@
 #include <cstring>
 #include <utility>
 
-#include "codec/base/axis_stepper.h"
 #include "codec/base/geometry.h"
 #include "codec/base/io.h"
 #include "codec/base/output_grid.h"
@@ -16,6 +15,7 @@
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_layout.h"
+#include "codec/pixel/quad_sampler.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::bmp {
@@ -99,8 +99,9 @@ bool add_row(RowReader& reader, int64_t row, const Wbmp& wbmp, OsBuffer<uint32_t
     size_t next;  // output pixel
   };
   const auto out = static_cast<int64_t>(words.size());
-  Point points[] = {{{wbmp.width, out, wbmp.width / 4}, 0},
-                    {{wbmp.width, out, int64_t{3} * wbmp.width / 4}, 0}};
+  // Steppers of their own: a piece may end between the two points of an output pixel.
+  const auto [quarter, threeQuarters] = quarter_phases(wbmp.width);
+  Point points[] = {{{wbmp.width, out, quarter}, 0}, {{wbmp.width, out, threeQuarters}, 0}};
   return reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
     for (auto& [at, next] : points) {
       for (; next < words.size() && at.position() < first + count; ++next, at.advance()) {
@@ -132,12 +133,11 @@ bool write_resized(TAVIRPELO_DECINFO* decInfo, const Wbmp& wbmp, RowReader& read
   if (!obtain_block(int64_t{out.width} * 4, "WBMP picture",
                     [&] { return words.allocate(static_cast<size_t>(out.width)); }))
     return false;
-  AxisStepper quarter(wbmp.height, out.height, wbmp.height / 4);
-  AxisStepper threeQuarters(wbmp.height, out.height, int64_t{3} * wbmp.height / 4);
-  for (int y = 0; y < out.height; ++y, quarter.advance(), threeQuarters.advance()) {
+  QuarterPoints rows(wbmp.height, out.height);
+  for (int y = 0; y < out.height; ++y, rows.advance()) {
     if (!caller_agrees(decInfo, y)) return false;
     std::fill_n(words.data(), words.size(), 0u);
-    for (const int64_t source : {quarter.position(), threeQuarters.position()}) {
+    for (const int64_t source : {rows.first(), rows.second()}) {
       if (!add_row(reader, source, wbmp, words)) return refuse(Reason::kDamaged, "WBMP picture");
     }
     write_words(words, grid.span(y, 0, out.width), format);
