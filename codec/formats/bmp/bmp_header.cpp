@@ -151,10 +151,10 @@ bool read_headers(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
 // ---- output ----
 
 void choose_size(PELOI_BMPRECORD& record) {
-  const Size box = turned({record.requestWidth, record.requestHeight}, record.option);
+  const Size box = turned(record.request.buffer, record.request.option);
   const Size picture{record.width, record.height};
   Size out = box;
-  if ((record.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_STRETCH) {
+  if ((record.request.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_STRETCH) {
     record.oneToOne = picture.width <= box.width && picture.height <= box.height;
     out = fit_by_width(picture.width, picture.height, box);
   }
@@ -193,10 +193,7 @@ PELOI_BMPRECORD* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, 
   if (decInfo->pIO == nullptr || !read_headers(*record, decInfo->pIO)) return nullptr;
   record->kind = PELOI_BMPRECORD::kKind;
   record->output = output;
-  record->requestWidth = width;
-  record->requestHeight = height;
-  record->outFormat = decInfo->outFormat;
-  record->option = decInfo->option;
+  record->request = request_of(*decInfo, width, height);
   record->decInfo = decInfo;
   decInfo->scaleDenom = 1;
   decInfo->imageWidth = record->width;
@@ -206,7 +203,7 @@ PELOI_BMPRECORD* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, 
   decInfo->outWidth = record->outWidth;
   decInfo->outHeight = record->outHeight;
   record->grid = pelo::OutputGrid(output, {width, height}, {record->outWidth, record->outHeight},
-                                  pelo::bytes_per_pixel(record->outFormat), record->option);
+                                  pelo::bytes_per_pixel(decInfo->outFormat), decInfo->option);
   return record.release();
 }
 

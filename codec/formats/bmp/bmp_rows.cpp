@@ -122,7 +122,7 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Depth& depth) {
     return record.reader.for_pieces(
         row_from_below(record, up), [&](const uint8_t* bytes, int64_t first, int64_t count) {
           const auto visible = static_cast<int>(std::min(count, span.count - first));
-          depth.write(bytes, span.first + first * span.step, visible, span.step, record.outFormat,
+          depth.write(bytes, span.first + first * span.step, visible, span.step, record.request.format,
                       &record.colours);
         });
   }
@@ -138,7 +138,8 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Depth& depth) {
         });
     if (!there) return false;
   }
-  depth.write_averages(record.accumulators.data(), span.first, span.count, span.step, record.outFormat);
+  depth.write_averages(record.accumulators.data(), span.first, span.count, span.step,
+                       record.request.format);
   return true;
 }
 
@@ -167,7 +168,7 @@ int decode_rows(PELOI_BMPRECORD& record, int rows, const Depth& depth) {
   const int done = record.rowsDone;
   const int64_t lowest = int64_t{record.outHeight} - done - count;
   record.rowsDone += count;
-  if (record.outWidth == 0 || !writes(record.outFormat)) return 1;
+  if (record.outWidth == 0 || !writes(record.request.format)) return 1;
   bool complete = true;
   for (int i = 0; i < count; ++i) {
     if (!caller_agrees(record.decInfo, done + i)) return 0;

@@ -174,8 +174,7 @@ uint32_t number_of_groups(const uint8_t* packed, int byteCount, int shift) {
 }
 
 int decode_wbmp(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (decInfo == nullptr || decInfo->pIO == nullptr || output == nullptr || width < 0 || height < 0)
-    return refuse(Reason::kArgument, "WBMP decoder");
+  if (!usable(decInfo, output, width, height, "WBMP decoder")) return 0;
   TAVIRPELO_IO* io = decInfo->pIO;
   Wbmp wbmp{};
   if (!read_header(io, wbmp)) return 0;

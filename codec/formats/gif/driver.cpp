@@ -13,12 +13,6 @@ namespace {
 
 constexpr const char* kStage = "GIF decoder";
 
-bool valid(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
-  return (decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 &&
-          height >= 0) ||
-         refuse(Reason::kArgument, kStage);
-}
-
 // How a picture is placed: by lines, rows are delivered as they are.
 uint32_t placing_option(Mode mode, uint32_t option) {
   return mode == Mode::kLines ? option & ~uint32_t{TAVIRPELO_ROTATE_MASK} : option;
@@ -31,7 +25,8 @@ OsPtr<Record> open(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode)
   decInfo.scaleDenom = 1;
   record->decInfo = &decInfo;
   record->animated = mode == Mode::kAnimated;
-  record->request = {mode, {width, height}, decInfo.outFormat, decInfo.option};
+  record->mode = mode;
+  record->request = request_of(decInfo, width, height);
   record->store = gif_storer(decInfo.outFormat);
   if (!parse_header(decInfo.pIO, record.get())) return nullptr;
   if (!set_geometry(*record, placing_option(mode, decInfo.option))) return nullptr;
@@ -57,35 +52,30 @@ OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode
   return record;
 }
 
-bool foreign_state(const TAVIRPELO_DECINFO& decInfo) {
-  return decInfo.pFormatInfo != nullptr && held_state<Record>(decInfo) == nullptr;
-}
-
 }  // namespace
 
 Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode) {
-  if (!valid(decInfo, output, width, height)) return nullptr;
-  if (foreign_state(*decInfo)) return refuse(Reason::kRequestChanged, kStage), nullptr;
+  if (!usable(decInfo, output, width, height, kStage)) return nullptr;
+  const auto same = [&](const Record& held) {
+    return held.mode == mode && held.request == request_of(*decInfo, width, height);
+  };
+  if (!may_go_on<Record>(*decInfo, kStage, same)) return nullptr;
   if (Record* held = held_state<Record>(*decInfo)) {
-    const Request asked{mode, {width, height}, decInfo->outFormat, decInfo->option};
     held->decInfo = decInfo;
-    if (held->request == asked) return held;
-    release_state<Record>(*decInfo);
-    return refuse(Reason::kRequestChanged, kStage), nullptr;
+    return held;
   }
   decInfo->pFormatInfo = start(*decInfo, width, height, mode).release();
   return held_state<Record>(*decInfo);
 }
 
 Record* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, int animated, void* output) {
-  if (!valid(decInfo, output, width, height)) return nullptr;
+  if (!usable(decInfo, output, width, height, kStage)) return nullptr;
   return open(*decInfo, width, height, animated != 0 ? Mode::kAnimated : Mode::kWhole).release();
 }
 
 int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (!valid(decInfo, output, width, height)) return kFailure;
-  if (foreign_state(*decInfo)) return refuse(Reason::kRequestChanged, kStage);
-  release_state<Record>(*decInfo);
+  if (!usable(decInfo, output, width, height, kStage) || !may_start<Record>(*decInfo, kStage))
+    return kFailure;
   const auto record = start(*decInfo, width, height, Mode::kWhole);
   if (record == nullptr) return kFailure;
   const int result = answer(decode_image(decInfo->pIO, record.get(), output));
@@ -116,9 +106,9 @@ int decode_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height)
 }
 
 int abort(TAVIRPELO_DECINFO* decInfo) {
-  if (decInfo == nullptr || foreign_state(*decInfo)) return 0;
+  if (decInfo == nullptr) return 0;
   release_state<Record>(*decInfo);
-  return 1;
+  return decInfo->pFormatInfo == nullptr;
 }
 
 }  // namespace pelo::gif

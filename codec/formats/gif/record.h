@@ -3,11 +3,10 @@
 
 #include <cstdint>
 
-#include "codec/base/format_state.h"
-#include "codec/base/geometry.h"
 #include "codec/base/lsb_bits.h"
 #include "codec/base/os_memory.h"
 #include "codec/base/output_grid.h"
+#include "codec/formats/format.h"
 #include "codec/formats/gif/reader.h"
 #include "codec/formats/gif/translation_table.h"
 #include "codec/pixel/rgba_store.h"
@@ -15,15 +14,6 @@
 namespace pelo::gif {
 
 enum class Mode { kWhole, kLines, kIterative, kAnimated };
-
-// What a decode was started with; its later calls must ask for the same.
-struct Request {
-  Mode mode;
-  Size buffer;  // the caller's, pixels
-  int format;
-  uint32_t option;
-  bool operator==(const Request&) const = default;
-};
 
 // A colour in memory order; a transparent or unpainted pixel is all zeros.
 struct alignas(4) Rgba {
@@ -105,7 +95,8 @@ struct Record : FormatState {
   Reader reader;
 
   TAVIRPELO_DECINFO* decInfo;  // of the current call; null: nobody to ask
-  Request request;
+  Mode mode;
+  DecodeRequest request;
   uint32_t option;  // the option word that the output is placed by
   StoreRgba store;  // null: the output format has no writer
   Size picture;     // produced size before rotation

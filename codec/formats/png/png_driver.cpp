@@ -26,11 +26,11 @@ Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
 }
 
 // The object's state: the one it holds when the request is the same, else a new one.
-Result obtain(TAVIRPELO_DECINFO& decInfo, const Request& request, PELOI_PNGCONTEXT*& context) {
+Result obtain(TAVIRPELO_DECINFO& decInfo, const DecodeRequest& request, PELOI_PNGCONTEXT*& context) {
+  const auto same = [&](const PELOI_PNGCONTEXT& held) { return held.request == request; };
+  if (!may_go_on<PELOI_PNGCONTEXT>(decInfo, kStage, same)) return kFailed;
   context = held_state<PELOI_PNGCONTEXT>(decInfo);
-  if (context != nullptr && context->request == request) return kDone;
-  if (decInfo.pFormatInfo != nullptr)  // of another request or format
-    return refuse(Reason::kRequestChanged, kStage), kFailed;
+  if (context != nullptr) return kDone;
   context = os_new<PELOI_PNGCONTEXT>().release();
   if (context == nullptr) return refuse(Reason::kNoMemory, kStage), kNoMemory;
   context->kind = PELOI_PNGCONTEXT::kKind;
@@ -55,7 +55,7 @@ bool accepts_lines(const PELOI_PNGCONTEXT& context, int lines) {
   return static_cast<uint32_t>(lines) == height;
 }
 
-int decode(TAVIRPELO_DECINFO& decInfo, void* output, const Request& request, int lines) {
+int decode(TAVIRPELO_DECINFO& decInfo, void* output, const DecodeRequest& request, int lines) {
   PELOI_PNGCONTEXT* context;
   if (const Result result = obtain(decInfo, request, context); result != kDone) return result;
   if (context->output.width == 0 || context->output.height == 0) return kDone;
@@ -68,19 +68,13 @@ int decode(TAVIRPELO_DECINFO& decInfo, void* output, const Request& request, int
   return decompress(*context);
 }
 
-bool usable(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
-  return (decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 &&
-          height >= 0) ||
-         refuse(Reason::kArgument, kStage);
-}
-
 // The codes of the public operations: 1 complete, 4 more to come, 0 failed.
 int public_result(int result) {
   return result == kDone ? 1 : result == kMore ? 4 : 0;
 }
 
 int start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines, int iterFlag) {
-  if (!usable(decInfo, output, width, height)) return 0;
+  if (!usable(decInfo, output, width, height, kStage)) return 0;
   if (lines < 0) return refuse(Reason::kArgument, kStage);
   decInfo->scaleDenom = 1;
   decInfo->pngIterFlag = iterFlag;
@@ -89,8 +83,7 @@ int start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int l
 
 }  // namespace
 int decode_request(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
-  const Request request{width, height, decInfo->outFormat, decInfo->option};
-  const int result = decode(*decInfo, output, request, lines);
+  const int result = decode(*decInfo, output, request_of(*decInfo, width, height), lines);
   if (result != kMore) release(decInfo);
   return result;
 }

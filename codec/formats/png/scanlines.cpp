@@ -4,7 +4,6 @@
 #include <utility>
 
 #include "codec/base/row_progress.h"
-#include "codec/formats/format.h"
 #include "codec/formats/png/png_context.h"
 #include "codec/formats/png/row_filter.h"
 
@@ -77,7 +76,7 @@ Result write_pending(PELOI_PNGCONTEXT& context) {
     write_output_row(&context);
     if (output.stop != 0 && output.written >= output.stop && output.written < output.height)
       return kMore;
-    if (!may_go_on()) return kFailed;
+    if (!host_agrees()) return kFailed;
   }
   if (context.scanline.finished != nullptr) {
     context.scanline.finished = nullptr;
@@ -114,7 +113,7 @@ bool completes_row(const PELOI_PNGCONTEXT& context, int64_t sourceRow) {
   return true;
 }
 
-bool may_go_on() {
+bool host_agrees() {
   int status = 0;
   TAVIRPELO_CheckExStatus(&status);
   if (status > 0) TAVIRPELO_OsSleep(status);
