@@ -6,7 +6,10 @@
 #include <cstdint>
 
 #include "codec/base/buffered_source.h"
+#include "codec/base/checked.h"
 #include "codec/base/errors.h"
+#include "codec/base/format_state.h"
+#include "codec/base/geometry.h"
 #include "tavirpelo/parse.h"
 
 namespace pelo {
@@ -31,6 +34,52 @@ struct Format {
 // format's: sets imageFormat and the record's sizes.
 using Detect = int (*)(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
 int parse_source(TAVIRPELO_DECINFO& decInfo, TAVIRPELO_HINFO* hinfo, Detect detect);
+
+// ---- what the decoders share ----
+
+// What a decode was started with; its later calls must ask for the same.
+struct DecodeRequest {
+  Size buffer;  // the caller's, pixels
+  int format;
+  uint32_t option;
+  bool operator==(const DecodeRequest&) const = default;
+};
+
+inline DecodeRequest request_of(const TAVIRPELO_DECINFO& decInfo, int width, int height) {
+  return {{width, height}, decInfo.outFormat, decInfo.option};
+}
+
+// Whether a decode can be asked for with these arguments.
+inline bool usable(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height,
+                   const char* stage) {
+  return (decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 &&
+          height >= 0) ||
+         refuse(Reason::kArgument, stage);
+}
+
+// Whether the object holds no state, or a State whose request is the same by same(state). A State of
+// another request is released; another format's is left alone.
+template <class State, class Same>
+[[nodiscard]] bool may_go_on(TAVIRPELO_DECINFO& decInfo, const char* stage, Same same) {
+  const State* held = held_state<State>(decInfo);
+  if (decInfo.pFormatInfo == nullptr || (held != nullptr && same(*held))) return true;
+  release_state<State>(decInfo);
+  return refuse(Reason::kRequestChanged, stage);
+}
+
+// Releases what an earlier decode left. False when that is another format's.
+template <class State>
+[[nodiscard]] bool may_start(TAVIRPELO_DECINFO& decInfo, const char* stage) {
+  release_state<State>(decInfo);
+  return decInfo.pFormatInfo == nullptr || refuse(Reason::kRequestChanged, stage);
+}
+
+// Whether obtain() gets a block of so many bytes, or why not. It is not asked above the limit.
+template <class Obtain>
+[[nodiscard]] bool obtain_block(int64_t bytes, const char* stage, Obtain obtain) {
+  if (bytes > kMaxPictureBlock) return refuse(Reason::kBlockLimit, stage);
+  return obtain() || refuse(Reason::kNoMemory, stage);
+}
 
 // ---- what the parsers share ----
 

@@ -1,6 +1,7 @@
 // The given names of this room; each forwards to the room's own function.
 #include "codec/formats/bmp/bmp_abi.h"
 
+#include "codec/base/errors.h"
 #include "tavirpelo/api.h"
 #include "tavirpelo/decode.h"
 #include "tavirpelo/io.h"
@@ -44,20 +45,24 @@ uint64_t PELOI_WBMPpow(uint64_t base, int exponent) {
 }
 
 int TAVIRPELOI_DecodeBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return bmp::decode(decInfo, output, width, height);
 }
 
 int TAVIRPELOI_DecodeBMPIterLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
                                  int lines) {
+  begin_operation();
   return bmp::decode_rows_step(decInfo, output, width, height, lines);
 }
 
 int TAVIRPELOI_DecodeBMPLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
                              int lines) {
+  begin_operation();
   return bmp::decode_lines(decInfo, output, width, height, lines);
 }
 
 int TAVIRPELOI_DecodeBMPIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return bmp::decode_step(decInfo, output, width, height);
 }
 
@@ -66,6 +71,7 @@ int TAVIRPELOI_AbortBMPIter(TAVIRPELO_DECINFO* decInfo) {
 }
 
 int TAVIRPELOI_DecodeWBMP(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return bmp::decode_wbmp(decInfo, output, width, height);
 }
 

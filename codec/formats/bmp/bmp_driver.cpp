@@ -4,27 +4,20 @@
 
 #include "codec/base/io.h"
 #include "codec/formats/bmp/bmp_record.h"
+#include "codec/formats/format.h"
 
 namespace pelo::bmp {
 namespace {
 
+constexpr const char* kStage = "BMP decoder";
 constexpr int kIterRows = 100;
 constexpr int kHeadBytes = 54;
-
-bool usable(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
-  return decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 && height >= 0;
-}
 
 // Rewinds the source; false for a memory source too short for the headers.
 bool rewind(TAVIRPELO_IO* io) {
   seek_io(io, 0, SEEK_SET);
-  return io->ioType != TAVIRPELO_IO_MEMORY || (io->pSource != nullptr && io->size >= kHeadBytes);
-}
-
-bool same_request(const PELOI_BMPRECORD& record, const TAVIRPELO_DECINFO& decInfo, const void* output,
-                  int width, int height) {
-  return record.output == output && record.requestWidth == width && record.requestHeight == height &&
-         record.outFormat == decInfo.outFormat && record.option == decInfo.option;
+  return io->ioType != TAVIRPELO_IO_MEMORY || (io->pSource != nullptr && io->size >= kHeadBytes) ||
+         refuse(Reason::kTruncated, "BMP header");
 }
 
 // The next rows by the bit count's decoder, which another bit count does not have; false when the caller
@@ -37,20 +30,18 @@ bool decode(PELOI_BMPRECORD& record, int rows) {
 
 // The record of the decode going on, or a new one; null on failure, when none is left.
 PELOI_BMPRECORD* obtain(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (decInfo->pFormatInfo == nullptr) {
-    return make_record(decInfo, width, height, output);
-  }
+  const auto same = [&](const PELOI_BMPRECORD& held) {
+    return held.output == output && held.request == request_of(*decInfo, width, height);
+  };
+  if (!may_go_on<PELOI_BMPRECORD>(*decInfo, kStage, same)) return nullptr;
   auto* record = held_state<PELOI_BMPRECORD>(*decInfo);
-  if (record != nullptr && same_request(*record, *decInfo, output, width, height)) return record;
-  release(decInfo);
-  return nullptr;
+  return record != nullptr ? record : make_record(decInfo, width, height, output);
 }
 
 }  // namespace
 int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (!usable(decInfo, output, width, height) || !rewind(decInfo->pIO)) return 0;
-  release(decInfo);
-  if (decInfo->pFormatInfo != nullptr) return 0;  // another format's
+  if (!usable(decInfo, output, width, height, kStage) || !rewind(decInfo->pIO)) return 0;
+  if (!may_start<PELOI_BMPRECORD>(*decInfo, kStage)) return 0;
   PELOI_BMPRECORD* record = make_record(decInfo, width, height, output);
   if (record == nullptr) return 0;
   const bool done = decode(*record, INT_MAX);
@@ -59,7 +50,9 @@ int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
 }
 
 int decode_rows_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
-  if (!usable(decInfo, output, width, height) || lines < 1 || !rewind(decInfo->pIO)) return 0;
+  if (!usable(decInfo, output, width, height, kStage)) return 0;
+  if (lines < 1) return refuse(Reason::kArgument, kStage);
+  if (!rewind(decInfo->pIO)) return 0;
   PELOI_BMPRECORD* record = obtain(decInfo, output, width, height);
   if (record == nullptr) return 0;
   decInfo->pFormatInfo = record;

@@ -3,16 +3,19 @@
 #include <climits>
 #include <cstring>
 
-#include "codec/base/axis_stepper.h"
 #include "codec/base/byte_order.h"
+#include "codec/base/errors.h"
 #include "codec/base/geometry.h"
 #include "codec/base/io.h"
 #include "codec/formats/bmp/bmp_record.h"
+#include "codec/formats/format.h"
 #include "codec/pixel/packers.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo::bmp {
 namespace {
 
+constexpr const char* kStage = "BMP header";
 constexpr int64_t kHeadBytes = 54;
 constexpr int64_t kFileHeader = 14;
 constexpr uint8_t kCoreHeader = 12;  // header of 16-bit sizes and three-byte palette entries
@@ -20,17 +23,30 @@ constexpr uint32_t kBitFields = 3;
 
 // Bytes [offset, offset + count) of a file or memory source; false when it ends before.
 bool read_at(TAVIRPELO_IO* io, int64_t offset, uint8_t* out, int64_t count) {
-  if (offset + count > io->size) return false;
+  if (offset + count > io->size) return refuse(Reason::kTruncated, kStage);
   if (io->ioType == TAVIRPELO_IO_MEMORY) {
     std::memcpy(out, static_cast<const uint8_t*>(io->pSource) + offset, static_cast<size_t>(count));
     return true;
   }
   const auto target = static_cast<int>(offset);
-  return io->ioType == TAVIRPELO_IO_FILE && seek_io(io, target, SEEK_SET) == target &&
-         read_io(io, out, static_cast<int>(count)) == count;
+  if (io->ioType != TAVIRPELO_IO_FILE) return refuse(Reason::kSource, kStage);
+  return (seek_io(io, target, SEEK_SET) == target &&
+          read_io(io, out, static_cast<int>(count)) == count) ||
+         refuse(Reason::kTruncated, kStage);
 }
 
 // ---- headers ----
+
+const char* name_of_header(uint8_t size) {
+  switch (size) {
+    case 108:
+      return "BMP with a 108-byte header";
+    case 124:
+      return "BMP with a 124-byte header";
+    default:
+      return "BMP with a header of unknown size";
+  }
+}
 
 bool read_sizes(PELOI_BMPRECORD& record, const uint8_t* head) {
   const uint8_t headerSize = head[kFileHeader];
@@ -46,12 +62,13 @@ bool read_sizes(PELOI_BMPRECORD& record, const uint8_t* head) {
     record.compression = load_le32(head + 30);
   } else {
     TAVIRPELO_PrintMessage("__ValorenBmpInitialize : invalid BMP head size");
-    return false;
+    return refuse(Reason::kVariant, kStage, name_of_header(headerSize));
   }
   record.topDown = height < 0;
   height = record.topDown ? -height : height;
   record.height = static_cast<int>(std::min<int64_t>(height, INT_MAX));
-  return record.width > 0 && height > 0 && height <= INT_MAX;
+  if (record.width == 0 || height == 0) return refuse(Reason::kZeroSize, kStage);
+  return (record.width > 0 && height <= INT_MAX) || refuse(Reason::kDamaged, kStage, "size");
 }
 
 // Run lengths, JPEG and PNG inside are not decoded; bit fields have 16 bits.
@@ -59,11 +76,13 @@ bool accepted_compression(const PELOI_BMPRECORD& record) {
   switch (record.compression) {
     case 1:
     case 2:
+      return refuse(Reason::kVariant, kStage, "BMP with run lengths");
     case 4:
     case 5:
-      return false;
+      return refuse(Reason::kVariant, kStage, "BMP around a JPEG or PNG");
     case kBitFields:
-      return record.bitCount == 16;
+      return record.bitCount == 16 ||
+             refuse(Reason::kVariant, kStage, "BMP with bit fields of other than 16 bits");
     default:
       return true;
   }
@@ -79,7 +98,8 @@ bool read_palette(PELOI_BMPRECORD& record, TAVIRPELO_IO* io, uint8_t headerSize)
   const int64_t entryBytes = headerSize == kCoreHeader ? 3 : 4;
   const int64_t start = kFileHeader + headerSize;
   const int64_t entries = (int64_t{record.dataOffset} - start) / entryBytes;
-  if (entries < 1 || start + entries * entryBytes > io->size) return false;
+  if (entries < 1) return refuse(Reason::kDamaged, kStage, "no palette");
+  if (start + entries * entryBytes > io->size) return refuse(Reason::kTruncated, kStage);
   uint8_t bytes[256 * 4];
   const int64_t kept = std::min<int64_t>(entries, 256);
   if (!read_at(io, start, bytes, kept * entryBytes)) return false;
@@ -112,12 +132,13 @@ bool read_fields(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
     record.colours.blue = layout.blue;
     return true;
   }
-  return false;
+  return refuse(Reason::kVariant, kStage, "BMP with uncommon bit fields");
 }
 
 bool read_headers(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
   uint8_t head[kHeadBytes];
-  if (!read_at(io, 0, head, kHeadBytes) || head[0] != 'B' || head[1] != 'M') return false;
+  if (!read_at(io, 0, head, kHeadBytes)) return false;
+  if (head[0] != 'B' || head[1] != 'M') return refuse(Reason::kUnknownFormat, kStage);
   record.dataOffset = load_le32(head + 10);
   if (!read_sizes(record, head) || !accepted_compression(record)) return false;
   for (auto& colour : record.colours.palette) colour = {0, 0, 0, 255};
@@ -130,10 +151,10 @@ bool read_headers(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
 // ---- output ----
 
 void choose_size(PELOI_BMPRECORD& record) {
-  const Size box = turned({record.requestWidth, record.requestHeight}, record.option);
+  const Size box = turned(record.request.buffer, record.request.option);
   const Size picture{record.width, record.height};
   Size out = box;
-  if ((record.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_STRETCH) {
+  if ((record.request.option & TAVIRPELO_FIT_MASK) != TAVIRPELO_FIT_STRETCH) {
     record.oneToOne = picture.width <= box.width && picture.height <= box.height;
     out = fit_by_width(picture.width, picture.height, box);
   }
@@ -144,13 +165,14 @@ void choose_size(PELOI_BMPRECORD& record) {
 bool prepare_resizing(PELOI_BMPRECORD& record) {
   if (record.oneToOne) return true;
   const auto width = static_cast<size_t>(record.outWidth);
-  if (int64_t{record.outWidth} * 8 > kMaxPictureBlock) return false;
-  if (!record.columns.allocate(2 * width) || !record.accumulators.allocate(width)) return false;
-  AxisStepper quarter(record.width, record.outWidth, record.width / 4);
-  AxisStepper threeQuarters(record.width, record.outWidth, int64_t{3} * record.width / 4);
-  for (size_t x = 0; x < width; ++x, quarter.advance(), threeQuarters.advance()) {
-    record.columns[x] = static_cast<uint32_t>(quarter.position());
-    record.columns[width + x] = static_cast<uint32_t>(threeQuarters.position());
+  const auto allocate = [&] {
+    return record.columns.allocate(2 * width) && record.accumulators.allocate(width);
+  };
+  if (!obtain_block(int64_t{record.outWidth} * 8, "BMP picture", allocate)) return false;
+  QuarterPoints columns(record.width, record.outWidth);
+  for (size_t x = 0; x < width; ++x, columns.advance()) {
+    record.columns[x] = static_cast<uint32_t>(columns.first());
+    record.columns[width + x] = static_cast<uint32_t>(columns.second());
   }
   return true;
 }
@@ -158,7 +180,7 @@ bool prepare_resizing(PELOI_BMPRECORD& record) {
 bool prepare_rows(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
   if (!known_bit_count(record.bitCount)) return true;  // nothing will be decoded
   const int64_t rowSize = row_size(record.width, record.bitCount);
-  if (rowSize > INT_MAX) return false;
+  if (rowSize > INT_MAX) return refuse(Reason::kBlockLimit, "BMP picture");
   const RowLayout layout{record.dataOffset, rowSize, record.width, record.bitCount};
   return record.reader.open(io, layout, io->readSize) &&
          (record.outWidth == 0 || record.outHeight == 0 || prepare_resizing(record));
@@ -167,14 +189,11 @@ bool prepare_rows(PELOI_BMPRECORD& record, TAVIRPELO_IO* io) {
 }  // namespace
 PELOI_BMPRECORD* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, void* output) {
   auto record = pelo::os_new<PELOI_BMPRECORD>();
-  if (record == nullptr || decInfo->pIO == nullptr || !read_headers(*record, decInfo->pIO))
-    return nullptr;
+  if (record == nullptr) return refuse(Reason::kNoMemory, kStage), nullptr;
+  if (decInfo->pIO == nullptr || !read_headers(*record, decInfo->pIO)) return nullptr;
   record->kind = PELOI_BMPRECORD::kKind;
   record->output = output;
-  record->requestWidth = width;
-  record->requestHeight = height;
-  record->outFormat = decInfo->outFormat;
-  record->option = decInfo->option;
+  record->request = request_of(*decInfo, width, height);
   record->decInfo = decInfo;
   decInfo->scaleDenom = 1;
   decInfo->imageWidth = record->width;
@@ -184,7 +203,7 @@ PELOI_BMPRECORD* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, 
   decInfo->outWidth = record->outWidth;
   decInfo->outHeight = record->outHeight;
   record->grid = pelo::OutputGrid(output, {width, height}, {record->outWidth, record->outHeight},
-                                  pelo::bytes_per_pixel(record->outFormat), record->option);
+                                  pelo::bytes_per_pixel(decInfo->outFormat), decInfo->option);
   return record.release();
 }
 

@@ -4,9 +4,9 @@
 #include <array>
 #include <cstdint>
 
-#include "codec/base/format_state.h"
 #include "codec/base/output_grid.h"
 #include "codec/formats/bmp/row_reader.h"
+#include "codec/formats/format.h"
 #include "tavirpelo/decode.h"
 
 // What pixels of up to 16 bits mean.
@@ -31,9 +31,7 @@ typedef struct PELOI_BMPRECORD : pelo::FormatState {
   TAVIRPELO_DECINFO* decInfo;  // of the current call
   // The request of the first call, which later ones must repeat.
   void* output;
-  int requestWidth, requestHeight;
-  int outFormat;
-  uint32_t option;
+  pelo::DecodeRequest request;
 
   int outWidth, outHeight;
   bool oneToOne;

@@ -11,6 +11,7 @@
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/pixel_layout.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo::bmp {
 namespace {
@@ -121,13 +122,15 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Depth& depth) {
     return record.reader.for_pieces(
         row_from_below(record, up), [&](const uint8_t* bytes, int64_t first, int64_t count) {
           const auto visible = static_cast<int>(std::min(count, span.count - first));
-          depth.write(bytes, span.first + first * span.step, visible, span.step, record.outFormat,
+          depth.write(bytes, span.first + first * span.step, visible, span.step, record.request.format,
                       &record.colours);
         });
   }
   std::fill_n(record.accumulators.data(), record.outWidth, 0u);
-  const int64_t quarters[2] = {record.height / 4, int64_t{3} * record.height / 4};
-  for (const int64_t phase : {quarters[record.topDown], quarters[!record.topDown]}) {  // in file order
+  const auto [quarter, threeQuarters] = quarter_phases(record.height);
+  const bool topDown = record.topDown;
+  for (const int64_t phase :
+       {topDown ? threeQuarters : quarter, topDown ? quarter : threeQuarters}) {  // in file order
     const int64_t row = row_from_below(record, (phase + up * record.height) / record.outHeight);
     const bool there =
         record.reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
@@ -135,7 +138,8 @@ bool decode_row(PELOI_BMPRECORD& record, int64_t up, const Depth& depth) {
         });
     if (!there) return false;
   }
-  depth.write_averages(record.accumulators.data(), span.first, span.count, span.step, record.outFormat);
+  depth.write_averages(record.accumulators.data(), span.first, span.count, span.step,
+                       record.request.format);
   return true;
 }
 
@@ -164,7 +168,7 @@ int decode_rows(PELOI_BMPRECORD& record, int rows, const Depth& depth) {
   const int done = record.rowsDone;
   const int64_t lowest = int64_t{record.outHeight} - done - count;
   record.rowsDone += count;
-  if (record.outWidth == 0 || !writes(record.outFormat)) return 1;
+  if (record.outWidth == 0 || !writes(record.request.format)) return 1;
   bool complete = true;
   for (int i = 0; i < count; ++i) {
     if (!caller_agrees(record.decInfo, done + i)) return 0;

@@ -3,6 +3,7 @@
 #include <cstdio>
 
 #include "codec/base/io.h"
+#include "codec/formats/format.h"
 
 namespace pelo::bmp {
 namespace {
@@ -24,10 +25,12 @@ bool RowReader::open(TAVIRPELO_IO* io, const RowLayout& layout, int readSize) {
   pieceWidth_ = kMaxChunk / layout.bits * 8;
   const int64_t rowSize = layout.rowSize;
   if (io->ioType == TAVIRPELO_IO_MEMORY) return true;
-  if (io->ioType != TAVIRPELO_IO_FILE || rowSize > kMaxPictureBlock) return false;
-  if (rowSize == 0) return true;
-  const int64_t rows = std::max<int64_t>(1, std::min<int64_t>(readSize, kMaxChunk) / rowSize);
-  return chunk_.allocate(static_cast<size_t>(std::min(rows * rowSize, kMaxChunk)));
+  if (io->ioType != TAVIRPELO_IO_FILE) return refuse(Reason::kSource, "bitmap rows");
+  return obtain_block(rowSize, "bitmap rows", [&] {
+    if (rowSize == 0) return true;
+    const int64_t rows = std::max<int64_t>(1, std::min<int64_t>(readSize, kMaxChunk) / rowSize);
+    return chunk_.allocate(static_cast<size_t>(std::min(rows * rowSize, kMaxChunk)));
+  });
 }
 
 bool RowReader::holds(int64_t offset) {

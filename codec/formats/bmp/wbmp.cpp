@@ -6,20 +6,22 @@
 #include <cstring>
 #include <utility>
 
-#include "codec/base/axis_stepper.h"
 #include "codec/base/geometry.h"
 #include "codec/base/io.h"
 #include "codec/base/output_grid.h"
 #include "codec/base/row_progress.h"
 #include "codec/formats/bmp/row_reader.h"
+#include "codec/formats/format.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_layout.h"
+#include "codec/pixel/quad_sampler.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::bmp {
 namespace {
 
+constexpr const char* kStage = "WBMP header";
 constexpr int kHeadBytes = 20;  // enough for any header that is accepted
 constexpr int kMaxGroups = 20;
 constexpr int kMaxIntGroups = 4;  // 28 bits
@@ -36,13 +38,14 @@ bool read_integer(const uint8_t* data, int size, int* position, uint32_t& value)
   uint8_t packed[kMaxGroups];
   int groups = 0;
   collect_groups(data, size, position, &groups, packed);
-  if (groups > kMaxIntGroups) return false;
+  if (groups > kMaxIntGroups) return refuse(Reason::kDamaged, kStage, "size");
   value = number_of_groups(packed, groups, groups);
   return true;
 }
 
 bool parse(const uint8_t* data, int size, Wbmp& wbmp) {
-  if (size < 2 || data[0] != 0 || (data[1] & 0x80) != 0) return false;
+  if (size < 2) return refuse(Reason::kTruncated, kStage);
+  if (data[0] != 0 || (data[1] & 0x80) != 0) return refuse(Reason::kUnknownFormat, kStage);
   wbmp.dataOffset = 2;
   if (!read_integer(data, size, &wbmp.dataOffset, wbmp.width)) return false;
   if (!read_integer(data, size, &wbmp.dataOffset, wbmp.height)) return false;
@@ -51,11 +54,12 @@ bool parse(const uint8_t* data, int size, Wbmp& wbmp) {
 }
 
 bool read_header(TAVIRPELO_IO* io, Wbmp& wbmp) {
-  if (seek_io(io, 0, SEEK_SET) != 0 || io->size <= 3) return false;
+  if (seek_io(io, 0, SEEK_SET) != 0) return refuse(Reason::kSource, kStage);
+  if (io->size <= 3) return refuse(Reason::kTruncated, kStage);
   if (io->ioType == TAVIRPELO_IO_MEMORY) {
     return parse(static_cast<const uint8_t*>(io->pSource), io->size, wbmp);
   }
-  if (io->ioType != TAVIRPELO_IO_FILE) return false;
+  if (io->ioType != TAVIRPELO_IO_FILE) return refuse(Reason::kSource, kStage);
   uint8_t head[kHeadBytes];
   return parse(head, read_io(io, head, kHeadBytes), wbmp);
 }
@@ -83,7 +87,7 @@ bool write_plain(TAVIRPELO_DECINFO* decInfo, RowReader& reader, const OutputGrid
                      [](uint8_t* out, bool white) { std::memset(out, white ? 255 : 0, 3); });
       }
     };
-    if (!reader.for_pieces(y, write)) return false;
+    if (!reader.for_pieces(y, write)) return refuse(Reason::kDamaged, "WBMP picture");
   }
   return true;
 }
@@ -95,8 +99,9 @@ bool add_row(RowReader& reader, int64_t row, const Wbmp& wbmp, OsBuffer<uint32_t
     size_t next;  // output pixel
   };
   const auto out = static_cast<int64_t>(words.size());
-  Point points[] = {{{wbmp.width, out, wbmp.width / 4}, 0},
-                    {{wbmp.width, out, int64_t{3} * wbmp.width / 4}, 0}};
+  // Steppers of their own: a piece may end between the two points of an output pixel.
+  const auto [quarter, threeQuarters] = quarter_phases(wbmp.width);
+  Point points[] = {{{wbmp.width, out, quarter}, 0}, {{wbmp.width, out, threeQuarters}, 0}};
   return reader.for_pieces(row, [&](const uint8_t* bytes, int64_t first, int64_t count) {
     for (auto& [at, next] : points) {
       for (; next < words.size() && at.position() < first + count; ++next, at.advance()) {
@@ -125,15 +130,15 @@ void write_words(const OsBuffer<uint32_t>& words, const RowSpan& span, int forma
 bool write_resized(TAVIRPELO_DECINFO* decInfo, const Wbmp& wbmp, RowReader& reader,
                    const OutputGrid& grid, Size out, int format) {
   OsBuffer<uint32_t> words;
-  if (int64_t{out.width} * 4 > kMaxPictureBlock || !words.allocate(static_cast<size_t>(out.width)))
+  if (!obtain_block(int64_t{out.width} * 4, "WBMP picture",
+                    [&] { return words.allocate(static_cast<size_t>(out.width)); }))
     return false;
-  AxisStepper quarter(wbmp.height, out.height, wbmp.height / 4);
-  AxisStepper threeQuarters(wbmp.height, out.height, int64_t{3} * wbmp.height / 4);
-  for (int y = 0; y < out.height; ++y, quarter.advance(), threeQuarters.advance()) {
+  QuarterPoints rows(wbmp.height, out.height);
+  for (int y = 0; y < out.height; ++y, rows.advance()) {
     if (!caller_agrees(decInfo, y)) return false;
     std::fill_n(words.data(), words.size(), 0u);
-    for (const int64_t source : {quarter.position(), threeQuarters.position()}) {
-      if (!add_row(reader, source, wbmp, words)) return false;
+    for (const int64_t source : {rows.first(), rows.second()}) {
+      if (!add_row(reader, source, wbmp, words)) return refuse(Reason::kDamaged, "WBMP picture");
     }
     write_words(words, grid.span(y, 0, out.width), format);
   }
@@ -169,12 +174,12 @@ uint32_t number_of_groups(const uint8_t* packed, int byteCount, int shift) {
 }
 
 int decode_wbmp(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (decInfo == nullptr || decInfo->pIO == nullptr || output == nullptr || width < 0 || height < 0)
-    return 0;
+  if (!usable(decInfo, output, width, height, "WBMP decoder")) return 0;
   TAVIRPELO_IO* io = decInfo->pIO;
   Wbmp wbmp{};
   if (!read_header(io, wbmp)) return 0;
-  if (int64_t{wbmp.height} * wbmp.rowBytes + wbmp.dataOffset > io->size) return 0;
+  if (int64_t{wbmp.height} * wbmp.rowBytes + wbmp.dataOffset > io->size)
+    return refuse(Reason::kDamaged, "WBMP picture", "shorter than its size says");
 
   const bool stretch = decInfo->option == TAVIRPELO_FIT_STRETCH;
   const pelo::Size out =

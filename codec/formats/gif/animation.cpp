@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "codec/base/checked.h"
+#include "codec/formats/format.h"
 #include "codec/formats/gif/driver.h"
 #include "codec/formats/gif/image.h"
 #include "codec/formats/gif/output.h"
@@ -76,9 +77,10 @@ int step(Record& record, void* output) {
 bool create_canvas(Record& record) {
   const int64_t pixels = int64_t{record.screen.width} * record.screen.height;
   if (pixels == 0) return true;
-  return pixels <= kMaxPictureBlock / int64_t{sizeof(Rgba)} &&
-         record.canvas.allocate(static_cast<size_t>(pixels)) &&
-         record.frameRow.allocate(static_cast<size_t>(record.screen.width));
+  return obtain_block(pixels * int64_t{sizeof(Rgba)}, "GIF canvas", [&] {
+    return record.canvas.allocate(static_cast<size_t>(pixels)) &&
+           record.frameRow.allocate(static_cast<size_t>(record.screen.width));
+  });
 }
 
 int compose_row(Record* record) {
@@ -104,7 +106,7 @@ int compose_row(Record* record) {
 int decode_frame_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
   Record* record = continue_or_start(decInfo, output, width, height, Mode::kAnimated);
   if (record == nullptr) return kFailure;
-  const int result = step(*record, output);
+  const int result = answer(step(*record, output));
   if (result != kMore && result != kImageFollows) release_state<Record>(*decInfo);
   return result;
 }

@@ -11,90 +11,84 @@
 namespace pelo::gif {
 namespace {
 
-bool valid(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
-  return decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 && height >= 0;
+constexpr const char* kStage = "GIF decoder";
+
+// How a picture is placed: by lines, rows are delivered as they are.
+uint32_t placing_option(Mode mode, uint32_t option) {
+  return mode == Mode::kLines ? option & ~uint32_t{TAVIRPELO_ROTATE_MASK} : option;
 }
 
-// What a mode needs beyond the geometry of all.
-bool prepare(Record& record) {
-  switch (record.request.mode) {
-    case Mode::kLines:  // rows are delivered as they are
-      return set_geometry(record, record.option & ~uint32_t{TAVIRPELO_ROTATE_MASK});
-    case Mode::kAnimated:
-      return true;
-    default:
-      return plan_reduction(record);
-  }
-}
-
-// A record that stands at the first image's data; null on failure.
-OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, void* output, int width, int height, Mode mode) {
-  OsPtr<Record> record(make_record(&decInfo, width, height, mode == Mode::kAnimated, output));
+// A record with the header read and the output's geometry computed.
+OsPtr<Record> open(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode) {
+  OsPtr<Record> record(new_record());
   if (record == nullptr) return nullptr;
-  record->request.mode = mode;
-  if (seek_image(decInfo.pIO, record.get()) != kImageFollows || !prepare(*record)) return nullptr;
+  decInfo.scaleDenom = 1;
+  record->decInfo = &decInfo;
+  record->animated = mode == Mode::kAnimated;
+  record->mode = mode;
+  record->request = request_of(decInfo, width, height);
+  record->store = gif_storer(decInfo.outFormat);
+  if (!parse_header(decInfo.pIO, record.get())) return nullptr;
+  if (!set_geometry(*record, placing_option(mode, decInfo.option))) return nullptr;
+  if (record->animated && !create_canvas(*record)) return nullptr;
+  decInfo.imageWidth = record->screen.width;
+  decInfo.imageHeight = record->screen.height;
   decInfo.outWidth = record->picture.width;
   decInfo.outHeight = record->picture.height;
   return record;
 }
 
-bool foreign_state(const TAVIRPELO_DECINFO& decInfo) {
-  return decInfo.pFormatInfo != nullptr && held_state<Record>(decInfo) == nullptr;
+bool averages(Mode mode) {
+  return mode == Mode::kWhole || mode == Mode::kIterative;
+}
+
+// A record that stands at the first image's data; null on failure.
+OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode) {
+  OsPtr<Record> record = open(decInfo, width, height, mode);
+  if (record == nullptr) return nullptr;
+  if (seek_image(decInfo.pIO, record.get()) != kImageFollows)
+    return refuse(Reason::kDamaged, kStage, "no image"), nullptr;
+  if (averages(mode) && !plan_reduction(*record)) return nullptr;
+  return record;
 }
 
 }  // namespace
 
 Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode) {
-  if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return nullptr;
+  if (!usable(decInfo, output, width, height, kStage)) return nullptr;
+  const auto same = [&](const Record& held) {
+    return held.mode == mode && held.request == request_of(*decInfo, width, height);
+  };
+  if (!may_go_on<Record>(*decInfo, kStage, same)) return nullptr;
   if (Record* held = held_state<Record>(*decInfo)) {
-    const Request asked{mode, {width, height}, decInfo->outFormat, decInfo->option};
     held->decInfo = decInfo;
-    if (held->request == asked) return held;
-    release_state<Record>(*decInfo);
-    return nullptr;
+    return held;
   }
-  decInfo->pFormatInfo = start(*decInfo, output, width, height, mode).release();
+  decInfo->pFormatInfo = start(*decInfo, width, height, mode).release();
   return held_state<Record>(*decInfo);
 }
 
 Record* make_record(TAVIRPELO_DECINFO* decInfo, int width, int height, int animated, void* output) {
-  if (!valid(decInfo, output, width, height)) return nullptr;
-  OsPtr<Record> record(new_record());
-  if (record == nullptr) return nullptr;
-  decInfo->scaleDenom = 1;
-  record->decInfo = decInfo;
-  record->animated = animated != 0;
-  record->request = {animated != 0 ? Mode::kAnimated : Mode::kWhole,
-                     {width, height},
-                     decInfo->outFormat,
-                     decInfo->option};
-  record->store = gif_storer(decInfo->outFormat);
-  if (!parse_header(decInfo->pIO, record.get())) return nullptr;
-  if (!set_geometry(*record, decInfo->option)) return nullptr;
-  if (record->animated && !create_canvas(*record)) return nullptr;
-  decInfo->imageWidth = record->screen.width;
-  decInfo->imageHeight = record->screen.height;
-  decInfo->outWidth = record->picture.width;
-  decInfo->outHeight = record->picture.height;
-  return record.release();
+  if (!usable(decInfo, output, width, height, kStage)) return nullptr;
+  return open(*decInfo, width, height, animated != 0 ? Mode::kAnimated : Mode::kWhole).release();
 }
 
 int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (!valid(decInfo, output, width, height) || foreign_state(*decInfo)) return kFailure;
-  release_state<Record>(*decInfo);
-  const auto record = start(*decInfo, output, width, height, Mode::kWhole);
+  if (!usable(decInfo, output, width, height, kStage) || !may_start<Record>(*decInfo, kStage))
+    return kFailure;
+  const auto record = start(*decInfo, width, height, Mode::kWhole);
   if (record == nullptr) return kFailure;
-  const int result = decode_image(decInfo->pIO, record.get(), output);
+  const int result = answer(decode_image(decInfo->pIO, record.get(), output));
   if (record->ended || !finish_picture(*record, output)) return kFailure;
   return result;
 }
 
 int decode_lines(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
-  if (lines < 1) return kFailure;
+  if (lines < 1) return refuse(Reason::kArgument, kStage);
   const bool first = decInfo != nullptr && decInfo->pFormatInfo == nullptr;
   Record* record = continue_or_start(decInfo, output, width, height, Mode::kLines);
   if (record == nullptr) return kFailure;
-  const int result = decode_image_lines(decInfo->pIO, record, output, lines, first);
+  const int result = answer(decode_image_lines(decInfo->pIO, record, output, lines, first));
   if (result != kMore) release_state<Record>(*decInfo);
   return result == kFailure ? kFailure : kDone;
 }
@@ -112,9 +106,9 @@ int decode_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height)
 }
 
 int abort(TAVIRPELO_DECINFO* decInfo) {
-  if (decInfo == nullptr || foreign_state(*decInfo)) return 0;
+  if (decInfo == nullptr) return 0;
   release_state<Record>(*decInfo);
-  return 1;
+  return decInfo->pFormatInfo == nullptr;
 }
 
 }  // namespace pelo::gif

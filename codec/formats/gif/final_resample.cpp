@@ -1,10 +1,11 @@
 #include "codec/formats/gif/final_resample.h"
 
-#include "codec/base/axis_stepper.h"
+#include "codec/base/errors.h"
 #include "codec/formats/gif/geometry.h"
 #include "codec/formats/gif/output.h"
 #include "codec/formats/gif/store_span.h"
 #include "codec/pixel/packers.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo::gif {
 namespace {
@@ -49,32 +50,18 @@ class Samples {
   const uint8_t* rows_[2] = {};
 };
 
-// The two sampling points of each output pixel along one axis: a quarter and three quarters of the way
-// through its span.
-struct QuarterPoints {
-  AxisStepper first, second;
-
-  QuarterPoints(int64_t inputs, int64_t outputs, int64_t from)
-      : first(inputs, outputs, inputs / 4 + from * inputs),
-        second(inputs, outputs, 3 * inputs / 4 + from * inputs) {}
-  void advance() {
-    first.advance();
-    second.advance();
-  }
-};
-
 // Enlarging, copying and reducing alike: at equal sizes both points are the pixel itself.
 bool resample(Record& record, Size target, const OutputGrid& grid) {
   const Size source = record.plane.size;
   Samples samples(record);
-  QuarterPoints rows(source.height, target.height, 0);
+  QuarterPoints rows(source.height, target.height);
   for (int y = 0; y < target.height; ++y, rows.advance()) {
     if (!may_write(record, 1)) return false;
-    samples.select_rows(rows.first.position(), rows.second.position());
+    samples.select_rows(rows.first(), rows.second());
     const RowSpan span = grid.span(y, 0, target.width);
-    QuarterPoints columns(source.width, target.width, span.skip);
+    QuarterPoints columns(source.width, target.width, quarter_phases(source.width), span.skip);
     store_span(record.store, span, [&](int) {
-      const uint64_t sums = samples.at(columns.first.position()) + samples.at(columns.second.position());
+      const uint64_t sums = samples.at(columns.first()) + samples.at(columns.second());
       columns.advance();
       return average_of_four(sums);
     });
@@ -88,7 +75,8 @@ bool plan_reduction(Record& record) {
   const Size reduced = reduced_size(record);
   if (record.store == nullptr || !is_reduced(record)) return true;
   if (reduced == record.picture) {  // sampling straight into the output gives the same pixels
-    return record.plane.painted.allocate(static_cast<size_t>(record.picture.height));
+    return record.plane.painted.allocate(static_cast<size_t>(record.picture.height)) ||
+           refuse(Reason::kNoMemory, "GIF picture");
   }
   return set_sampling(record.sampling, record.screen, reduced) && record.plane.allocate(reduced);
 }

@@ -3,10 +3,13 @@
 #include <algorithm>
 
 #include "codec/base/axis_stepper.h"
+#include "codec/formats/format.h"
 #include "codec/pixel/packers.h"
 
 namespace pelo::gif {
 namespace {
+
+constexpr int kWholePicture = -1;  // in place of a number of lines
 
 // The least row o whose centre floor((height / 2 + o * height) / rows) is not above the screen row.
 int64_t first_row(const Sampling& s, int64_t screenRow) {
@@ -46,6 +49,7 @@ Size reduced_size(const Record& record) {
 
 bool set_geometry(Record& record, uint32_t option) {
   record.option = option;
+  record.target = {};
   record.picture = fit_screen(record.screen, box_of(record), option);
   return set_sampling(record.sampling, record.screen, record.picture);
 }
@@ -56,7 +60,9 @@ bool set_sampling(Sampling& sampling, Size from, Size to) {
   sampling.columns.reset();
   if (from == to || to.width == 0 || from.width == 0) return true;
   const auto count = static_cast<size_t>(to.width);
-  if (to.width > kMaxPictureBlock / 2 || !sampling.columns.allocate(count)) return false;
+  if (!obtain_block(int64_t{2} * to.width, "GIF picture",
+                    [&] { return sampling.columns.allocate(count); }))
+    return false;
   AxisStepper stepper(from.width, to.width, from.width / 2);
   for (size_t k = 0; k < count; ++k, stepper.advance()) {
     sampling.columns[k] = static_cast<uint16_t>(stepper.position());
@@ -88,15 +94,25 @@ OutputRows rows_of(const Sampling& sampling, int screenRow) {
           static_cast<int>(first_row(sampling, int64_t{screenRow} + 1))};
 }
 
-OutputGrid grid_of(const Record& record, void* output) {
-  return OutputGrid(output, record.request.buffer, record.picture,
-                    bytes_per_pixel(record.request.format), record.option);
+const OutputGrid& grid_of(Record& record, void* output) {
+  Target& target = record.target;
+  if (target.bytes != output || target.lines != kWholePicture) {
+    target = {output, kWholePicture,
+              OutputGrid(output, record.request.buffer, record.picture,
+                         bytes_per_pixel(record.request.format), record.option)};
+  }
+  return target.grid;
 }
 
-OutputGrid line_grid_of(const Record& record, void* output) {
-  const Placement placed = place(record.request.buffer, record.picture, record.option);
-  return OutputGrid(output, {placed.buffer.width, record.lines}, placed.left, 0,
-                    bytes_per_pixel(record.request.format));
+const OutputGrid& line_grid_of(Record& record, void* output) {
+  Target& target = record.target;
+  if (target.bytes != output || target.lines != record.lines) {
+    const Placement placed = place(record.request.buffer, record.picture, record.option);
+    target = {output, record.lines,
+              OutputGrid(output, {placed.buffer.width, record.lines}, placed.left, 0,
+                         bytes_per_pixel(record.request.format))};
+  }
+  return target.grid;
 }
 
 }  // namespace pelo::gif

@@ -31,10 +31,10 @@ void cover_frame(Sampling& sampling, const Frame& frame);
 // The picture rows that are made of a screen row (0 to from.height - 1).
 OutputRows rows_of(const Sampling& sampling, int screenRow);
 
-// The picture in the caller's buffer.
-OutputGrid grid_of(const Record& record, void* output);
+// The picture in the caller's buffer: placed once, and again when a call comes with another.
+const OutputGrid& grid_of(Record& record, void* output);
 
 // Line mode: rows of the picture, the first of a call in the buffer's first row.
-OutputGrid line_grid_of(const Record& record, void* output);
+const OutputGrid& line_grid_of(Record& record, void* output);
 
 }  // namespace pelo::gif

@@ -1,6 +1,7 @@
 // The given names of this room; each forwards to the room's own function.
 #include "codec/formats/gif/gif_abi.h"
 
+#include "codec/base/errors.h"
 #include "tavirpelo/api.h"
 #include "tavirpelo/decinfo.h"
 #include "tavirpelo/decode.h"
@@ -84,15 +85,18 @@ int PELOI_InitializeTransTBL(int minimumCodeSize, TranslationTable* table) {
 }
 
 int TAVIRPELOI_DecodeGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return gif::decode(decInfo, output, width, height);
 }
 
 int TAVIRPELOI_DecodeGIFLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
                              int lines) {
+  begin_operation();
   return gif::decode_lines(decInfo, output, width, height, lines);
 }
 
 int TAVIRPELOI_DecodeGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return gif::decode_step(decInfo, output, width, height);
 }
 
@@ -101,10 +105,12 @@ int TAVIRPELOI_AbortGIFIter(TAVIRPELO_DECINFO* decInfo) {
 }
 
 int TAVIRPELOI_DecodeAGIF(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return gif::decode_frame(decInfo, output, width, height);
 }
 
 int TAVIRPELOI_DecodeAGIFIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return gif::decode_frame_step(decInfo, output, width, height);
 }
 

@@ -58,7 +58,7 @@ int decode_rows(Record& record, void* output, int rowLimit) {
 
 // Output rows that no image row is left for: from the plane, or untouched.
 bool emit_plane_rows(Record& record, void* output) {
-  const OutputGrid grid = line_grid_of(record, output);
+  const OutputGrid& grid = line_grid_of(record, output);
   for (; record.linesHere < record.lines && record.lineRow < record.picture.height; ++record.linesHere) {
     if (!may_write(record, 1)) return false;
     const int row = record.lineRow++;

@@ -1,6 +1,7 @@
 // Decoding one image, row by row: whole, in batches of image rows, or by output rows.
 #pragma once
 
+#include "codec/base/errors.h"
 #include "codec/formats/gif/record.h"
 #include "tavirpelo/api.h"
 
@@ -10,6 +11,12 @@ namespace pelo::gif {
 constexpr int kFailure = 0;
 constexpr int kDone = 1;
 constexpr int kMore = 4;
+
+// The answer of an operation on image data, which are to blame when nothing else is.
+inline int answer(int result) {
+  if (result == kFailure) refuse(Reason::kDamaged, "GIF image data");
+  return result;
+}
 
 // Ready to decode the image that the reader stands at. False for a minimum code size above 11 or when
 // memory is short.

@@ -2,6 +2,8 @@
 
 #include <cstring>
 
+#include "codec/base/errors.h"
+
 namespace pelo::gif {
 
 int init_table(int minimumCodeSize, TranslationTable* table) {
@@ -156,11 +158,12 @@ void compact(Record& record) {
 }  // namespace
 
 bool start_lzw(Record& record) {
-  if (!init_table(record.minimumCodeSize, &record.table)) return false;
+  if (!init_table(record.minimumCodeSize, &record.table))
+    return refuse(Reason::kDamaged, "GIF image data", "minimum code size");
   const int needed = record.frame.width + kMaxString + kStringSlack;
   if (record.line.size() < static_cast<size_t>(needed) &&
       !record.line.allocate(static_cast<size_t>(needed))) {
-    return false;
+    return refuse(Reason::kNoMemory, "GIF image data");
   }
   record.lzw = {};
   clear_table(record, record.lzw);

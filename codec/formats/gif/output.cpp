@@ -68,7 +68,7 @@ void clear_span(const Record& record, const RowSpan& span) {
 // The output rows of the current row, left and right of what the frame covers.
 void clear_beside_frame(Record& record, void* output) {
   const Sampling& sampling = record.sampling;
-  const OutputGrid grid = grid_of(record, output);
+  const OutputGrid& grid = grid_of(record, output);
   const OutputRows rows = rows_of(sampling, record.currentRow);
   for (int row = rows.begin; row < rows.end; ++row) {
     record.plane.painted[static_cast<size_t>(row)] = 1;
@@ -99,9 +99,9 @@ bool may_write(Record& record, int rows) {
   return !record.ended;
 }
 
-void clear_unpainted_rows(const Record& record, void* output) {
+void clear_unpainted_rows(Record& record, void* output) {
   const OsBuffer<uint8_t>& painted = record.plane.painted;
-  const OutputGrid grid = grid_of(record, output);
+  const OutputGrid& grid = grid_of(record, output);
   for (size_t row = 0; row < painted.size(); ++row) {
     if (painted[row] == 0)
       clear_span(record, grid.span(static_cast<int64_t>(row), 0, record.picture.width));
@@ -154,7 +154,7 @@ int write_row(Record* record, void* output) {
 
 int write_sampled_rows(Record* record, void* output) {
   if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
-  const OutputGrid grid = grid_of(*record, output);
+  const OutputGrid& grid = grid_of(*record, output);
   const OutputRows rows = rows_of(record->sampling, record->currentRow);
   for (int row = rows.begin; row < rows.end; ++row) write_sampled_row(*record, grid, row);
   return 1;
@@ -170,7 +170,7 @@ int write_screen_pixels(Record* record, void* output) {
 int write_sampled_screen(Record* record, void* output) {
   if (record->store == nullptr || record->currentRow >= record->screen.height) return 1;
   if (!record->sampling.columns) return 1;  // an empty picture
-  const OutputGrid grid = grid_of(*record, output);
+  const OutputGrid& grid = grid_of(*record, output);
   const OutputRows rows = rows_of(record->sampling, record->currentRow);
   const uint16_t* columns = record->sampling.columns.data();
   const Rgba* source = record->rowSource;

@@ -18,7 +18,7 @@ void set_palette(Record& record);
 [[nodiscard]] bool may_write(Record& record, int rows);
 
 // Makes the rows of a reduced picture that no image row was written to zero bytes.
-void clear_unpainted_rows(const Record& record, void* output);
+void clear_unpainted_rows(Record& record, void* output);
 
 // True when some output is made of the current row.
 bool row_is_wanted(const Record& record);

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "codec/base/byte_order.h"
+#include "codec/base/errors.h"
 #include "codec/base/io.h"
 #include "codec/pixel/lanes.h"
 
@@ -27,10 +28,17 @@ bool is_signature(const uint8_t* b) {
          b[5] <= 'z';
 }
 
+// Bytes that a block must have.
+const uint8_t* take_whole(Reader& reader, int n) {
+  const uint8_t* bytes = take(reader, n);
+  if (bytes == nullptr) refuse(Reason::kTruncated, "GIF blocks");
+  return bytes;
+}
+
 // The colour table that a descriptor's flags announce. Entries it does not have are black.
 bool read_table(Reader& reader, uint8_t flags, uint32_t* table) {
   const int count = 2 << (flags & 7);
-  const uint8_t* bytes = take(reader, 3 * count);
+  const uint8_t* bytes = take_whole(reader, 3 * count);
   if (bytes == nullptr) return false;
   std::fill_n(table, 256, 0u);
   pack_table(bytes, count, table);
@@ -38,8 +46,9 @@ bool read_table(Reader& reader, uint8_t flags, uint32_t* table) {
 }
 
 bool read_graphic_control(Reader& reader, GraphicControl& control) {
-  const uint8_t* b = take(reader, 6);  // block size, flags, delay, transparent index, terminator
-  if (b == nullptr || b[0] != 4 || b[5] != 0) return false;
+  const uint8_t* b = take_whole(reader, 6);  // size, flags, delay, transparent index, terminator
+  if (b == nullptr) return false;
+  if (b[0] != 4 || b[5] != 0) return refuse(Reason::kDamaged, "GIF blocks", "graphic control");
   control.disposal = b[1] >> 2 & 7;
   control.transparent = (b[1] & 1) != 0;
   control.delay = load_le16(b + 2) * 10;
@@ -49,7 +58,7 @@ bool read_graphic_control(Reader& reader, GraphicControl& control) {
 
 // Of an unknown extension the label alone is passed.
 bool read_extension(Record& record) {
-  const uint8_t* label = take(record.reader, 1);
+  const uint8_t* label = take_whole(record.reader, 1);
   if (label == nullptr) return false;
   switch (*label) {
     case kGraphicControl:
@@ -57,14 +66,14 @@ bool read_extension(Record& record) {
     case kPlainText:
     case kComment:
     case kApplication:
-      return skip_sub_blocks(record.reader);
+      return skip_sub_blocks(record.reader) || refuse(Reason::kTruncated, "GIF blocks");
     default:
       return true;
   }
 }
 
 bool read_image_descriptor(Record& record) {
-  const uint8_t* b = take(record.reader, 9);
+  const uint8_t* b = take_whole(record.reader, 9);
   if (b == nullptr) return false;
   record.frame = {load_le16(b), load_le16(b + 2), load_le16(b + 4), load_le16(b + 6)};
   const uint8_t flags = b[8];
@@ -75,7 +84,7 @@ bool read_image_descriptor(Record& record) {
     if (!read_table(record.reader, flags, record.localTable)) return false;
     record.colours = record.localTable;
   }
-  const uint8_t* size = take(record.reader, 1);
+  const uint8_t* size = take_whole(record.reader, 1);
   if (size == nullptr) return false;
   record.minimumCodeSize = *size;
   return true;
@@ -93,9 +102,10 @@ int parse_header(TAVIRPELO_IO* source, Record* record) {
   Reader& reader = record->reader;
   reader.source = source;
   reader.remaining = 0;
-  if (seek_io(source, 0, SEEK_SET) < 0) return 0;
-  const uint8_t* b = take(reader, 13);
-  if (b == nullptr || !is_signature(b)) return 0;
+  if (seek_io(source, 0, SEEK_SET) < 0) return refuse(Reason::kSource, "GIF screen");
+  const uint8_t* b = take_whole(reader, 13);
+  if (b == nullptr) return 0;
+  if (!is_signature(b)) return refuse(Reason::kUnknownFormat, "GIF screen");
   record->screen = {load_le16(b + 6), load_le16(b + 8)};
   const uint8_t flags = b[10];
   record->backgroundIndex = b[11];
@@ -105,7 +115,7 @@ int parse_header(TAVIRPELO_IO* source, Record* record) {
 int seek_image(TAVIRPELO_IO* source, Record* record) {
   record->reader.source = source;
   for (;;) {
-    const uint8_t* introducer = take(record->reader, 1);
+    const uint8_t* introducer = take_whole(record->reader, 1);
     if (introducer == nullptr) return kFailed;
     switch (*introducer) {
       case kImageSeparator:

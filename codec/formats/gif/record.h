@@ -3,10 +3,10 @@
 
 #include <cstdint>
 
-#include "codec/base/format_state.h"
-#include "codec/base/geometry.h"
 #include "codec/base/lsb_bits.h"
 #include "codec/base/os_memory.h"
+#include "codec/base/output_grid.h"
+#include "codec/formats/format.h"
 #include "codec/formats/gif/reader.h"
 #include "codec/formats/gif/translation_table.h"
 #include "codec/pixel/rgba_store.h"
@@ -14,15 +14,6 @@
 namespace pelo::gif {
 
 enum class Mode { kWhole, kLines, kIterative, kAnimated };
-
-// What a decode was started with; its later calls must ask for the same.
-struct Request {
-  Mode mode;
-  Size buffer;  // the caller's, pixels
-  int format;
-  uint32_t option;
-  bool operator==(const Request&) const = default;
-};
 
 // A colour in memory order; a transparent or unpainted pixel is all zeros.
 struct alignas(4) Rgba {
@@ -50,6 +41,13 @@ struct Sampling {
 
 struct OutputRows {
   int begin, end;
+};
+
+// The rows of the picture in the caller's buffer, as long as calls name the same.
+struct Target {
+  void* bytes;
+  int lines;  // of a call by lines
+  OutputGrid grid;
 };
 
 // Sampled rows of indices, kept until they can be written.
@@ -97,12 +95,14 @@ struct Record : FormatState {
   Reader reader;
 
   TAVIRPELO_DECINFO* decInfo;  // of the current call; null: nobody to ask
-  Request request;
+  Mode mode;
+  DecodeRequest request;
   uint32_t option;  // the option word that the output is placed by
   StoreRgba store;  // null: the output format has no writer
   Size picture;     // produced size before rotation
   Sampling sampling;
   IndexPlane plane;
+  Target target;
   OsBuffer<uint8_t> line;  // indices of the current row and the rest of the string behind it
   int currentRow;          // on the screen
   int rowsWritten;         // output rows of the image or frame

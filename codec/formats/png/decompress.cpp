@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "codec/base/byte_order.h"
+#include "codec/base/errors.h"
 #include "codec/base/io.h"
 #include "codec/formats/png/crc32.h"
 #include "codec/formats/png/png_context.h"
@@ -11,6 +12,7 @@
 namespace pelo::png {
 namespace {
 
+constexpr const char* kStage = "PNG image data";
 constexpr uint8_t kEmptyIend[12] = {0, 0, 0, 0, 'I', 'E', 'N', 'D', 0xAE, 0x42, 0x60, 0x82};
 
 // Makes one IDAT chunk, followed by IEND, of all IDAT chunks inside the caller's buffer, so that their
@@ -38,7 +40,8 @@ bool merge_chunks(PELOI_PNGCONTEXT& context) {
 
 Result open_memory_input(PELOI_PNGCONTEXT& context) {
   if (context.inputReady) return kDone;
-  if (context.info.idatCount > 1 && !merge_chunks(context)) return kFailed;
+  if (context.info.idatCount > 1 && !merge_chunks(context))
+    return refuse(Reason::kDamaged, kStage), kFailed;
   InflateInput& input = context.inflater.input();
   input.next = context.reader.base + context.info.idat[0].offset;
   input.end = input.next + context.info.idat[0].length;
@@ -67,11 +70,11 @@ Result open_stream_input(PELOI_PNGCONTEXT& context) {
 Result result_of(InflateStop stop) {
   switch (stop) {
     case InflateStop::kCorrupt:
-      return kCorrupt;
+      return refuse(Reason::kDamaged, kStage), kCorrupt;
     case InflateStop::kInputEnded:
-      return kFailed;
+      return refuse(Reason::kDamaged, kStage, "cut inside the picture"), kFailed;
     case InflateStop::kNoMemory:
-      return kNoMemory;
+      return refuse(Reason::kNoMemory, kStage), kNoMemory;
     default:
       return kDone;
   }
@@ -96,7 +99,8 @@ Result run(PELOI_PNGCONTEXT& context) {
 
 Result open_decompression(PELOI_PNGCONTEXT& context) {
   if (context.inflaterOpen) return kDone;
-  if (!context.inflater.open() || !begin_scanlines(context)) return kNoMemory;
+  if (!context.inflater.open()) return refuse(Reason::kNoMemory, kStage), kNoMemory;
+  if (!begin_scanlines(context)) return kNoMemory;
   context.inflaterOpen = true;
   return kDone;
 }

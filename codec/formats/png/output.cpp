@@ -140,9 +140,9 @@ void write_interlaced(PELOI_PNGCONTEXT& context, const uint8_t* row) {
 // ---- set-up ----
 
 void choose_size(PELOI_PNGCONTEXT& context) {
-  const Request& request = context.request;
+  const DecodeRequest& request = context.request;
   const int64_t width = context.info.width, height = context.info.height;
-  const Size box = turned({request.width, request.height}, request.option);
+  const Size box = turned(request.buffer, request.option);
   const bool stretch = (request.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_STRETCH;
   const Size size = stretch ? box : fit_by_ratio(width, height, box);
   context.output.width = static_cast<uint32_t>(size.width);
@@ -152,7 +152,8 @@ void choose_size(PELOI_PNGCONTEXT& context) {
 
 bool map_columns(PELOI_PNGCONTEXT& context) {
   OutputState& output = context.output;
-  if (uint64_t{output.width} * 8 > kMaxPictureBlock || !output.columns.allocate(output.width))
+  if (!obtain_block(int64_t{output.width} * 8, "PNG picture",
+                    [&] { return output.columns.allocate(output.width); }))
     return false;
   const uint32_t width = context.info.width;
   AxisStepper columns(width, output.width, width / 4);
@@ -160,15 +161,17 @@ bool map_columns(PELOI_PNGCONTEXT& context) {
     output.columns[k] = static_cast<uint32_t>(columns.position());
   }
   if (context.info.interlace == 0) return true;
-  if (!output.passColumns.allocate(size_t{2} * output.width)) return false;
+  if (!output.passColumns.allocate(size_t{2} * output.width))
+    return refuse(Reason::kNoMemory, "PNG picture");
   output.passTargets = output.passColumns.data() + output.width;
   return true;
 }
 
 bool reserve_whole_image(PELOI_PNGCONTEXT& context) {
   OutputState& output = context.output;
-  const uint64_t pixels = uint64_t{output.width} * output.height;
-  return pixels <= kMaxPictureBlock / 4 && output.wholeImage.allocate(static_cast<size_t>(pixels * 4));
+  const int64_t pixels = int64_t{output.width} * output.height;
+  return obtain_block(std::min(pixels, kMaxPictureBlock) * 4, "PNG picture",
+                      [&] { return output.wholeImage.allocate(static_cast<size_t>(pixels * 4)); });
 }
 
 bool gathers(const PELOI_PNGCONTEXT& context) {
@@ -179,7 +182,7 @@ bool gathers(const PELOI_PNGCONTEXT& context) {
 bool scanlines_are_output(const PELOI_PNGCONTEXT& context) {
   const PELOI_PNGINFO& info = context.info;
   return info.colourType == kTruecolour && info.bitDepth == 8 && !has_transparency(info) &&
-         context.request.outFormat == TAVIRPELO_RGB888 && one_to_one(context);
+         context.request.format == TAVIRPELO_RGB888 && one_to_one(context);
 }
 
 }  // namespace
@@ -188,7 +191,7 @@ Result set_up_output(PELOI_PNGCONTEXT& context) {
   OutputState& output = context.output;
   choose_size(context);
   if (output.width == 0 || output.height == 0) return kDone;
-  const int format = context.request.outFormat;
+  const int format = context.request.format;
   const Alpha alpha = has_transparency(context.info) ? Alpha::kBlended : Alpha::kIgnored;
   output.store = writes(format) ? rgba_storer(format, alpha) : nullptr;
   output.bytesPerPixel = bytes_per_pixel(format);
@@ -203,13 +206,13 @@ Result set_up_output(PELOI_PNGCONTEXT& context) {
 
 void aim_output(PELOI_PNGCONTEXT& context, void* bytes, int lines) {
   OutputState& output = context.output;
-  const Request& request = context.request;
+  const DecodeRequest& request = context.request;
   const auto width = static_cast<int>(output.width), height = static_cast<int>(output.height);
   const bool tight = (request.option & TAVIRPELO_FIT_MASK) == TAVIRPELO_FIT_TIGHT;
   const Size shown = turned({width, height}, request.option);
-  Size box = tight ? Size{width, height} : Size{request.width, request.height};
-  const int64_t x = tight ? 0 : (int64_t{request.width} - shown.width) / 2;
-  int64_t y = tight ? 0 : (int64_t{request.height} - shown.height) / 2;
+  Size box = tight ? Size{width, height} : request.buffer;
+  const int64_t x = tight ? 0 : (int64_t{request.buffer.width} - shown.width) / 2;
+  int64_t y = tight ? 0 : (int64_t{request.buffer.height} - shown.height) / 2;
   output.base = 0;
   output.stop = 0;
   if (lines > 0) {  // the buffer receives these rows alone; an interlaced image comes whole
@@ -221,8 +224,8 @@ void aim_output(PELOI_PNGCONTEXT& context, void* bytes, int lines) {
     y = 0;
   }
   if (output.wholeImage) {
-    output.grid = OutputGrid(bytes, {request.width, request.height}, {width, height},
-                             output.bytesPerPixel, request.option);
+    output.grid =
+        OutputGrid(bytes, request.buffer, {width, height}, output.bytesPerPixel, request.option);
   } else {
     output.grid = OutputGrid(bytes, box, x, y, output.bytesPerPixel);
   }
@@ -277,7 +280,7 @@ void blend_gathered_row(const uint8_t* rgba, int count, uint8_t* out, ptrdiff_t 
 
 // Of the formats without alpha only RGB565 is blended here, and only with the alpha that tRNS gives.
 StoreRgba gathered_storer(const PELOI_PNGCONTEXT& context) {
-  const int format = context.request.outFormat;
+  const int format = context.request.format;
   const bool blends = format == TAVIRPELO_RGB565 && (context.info.ancillaryFlags & kTrnsRead) != 0;
   return blends ? blend_gathered_row : rgba_storer(format, Alpha::kIgnored);
 }
@@ -305,7 +308,7 @@ int write_gathered_image(PELOI_PNGCONTEXT* context) {
     const pelo::RowSpan span = output.grid.span(static_cast<int64_t>(y), 0, output.width);
     const uint8_t* row = output.wholeImage.data() + y * output.width * 4;
     store(row + size_t{4} * static_cast<size_t>(span.skip), span.count, span.first, span.step);
-    if (!may_go_on()) return 0;
+    if (!host_agrees()) return 0;
   }
   return 1;
 }

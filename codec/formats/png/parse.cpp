@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "codec/base/byte_order.h"
+#include "codec/base/errors.h"
 #include "codec/formats/png/crc32.h"
 #include "codec/formats/png/png_info.h"
 
@@ -12,6 +13,7 @@ namespace {
 constexpr uint8_t kSignature[8] = {137, 'P', 'N', 'G', 13, 10, 26, 10};
 constexpr uint32_t kIhdr = 0x49484452, kPlte = 0x504C5445, kIdat = 0x49444154, kIend = 0x49454E44,
                    kTrns = 0x74524E53;
+constexpr const char* kStage = "PNG chunks";
 constexpr uint32_t kCrcBytes = 4;
 constexpr uint32_t kChunkFrame = 12;  // bytes around the data of a chunk
 
@@ -21,6 +23,19 @@ struct Chunk {
   int64_t data;  // stream position
 };
 
+int refuse_damaged(const char* detail) {
+  return refuse(Reason::kDamaged, kStage, detail), kFailed;
+}
+
+int refuse_variant(const char* detail) {
+  return refuse(Reason::kVariant, kStage, detail), kFailed;
+}
+
+// Bytes that a chunk must have.
+bool need_whole(PELOI_PNGREADBUFFER& buffer, uint32_t n) {
+  return need(buffer, n) || refuse(Reason::kTruncated, kStage);
+}
+
 // Runs over type and data and compares with the stored checksum; leaves the reader behind it.
 int verify(PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
   uint8_t type[4];
@@ -28,13 +43,14 @@ int verify(PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
   store_be16(type + 2, chunk.type);
   uint32_t crc = crc32_update(kCrcPreset, type, sizeof type);
   for (uint32_t left = chunk.length; left != 0;) {
-    if (!need(buffer, 1)) return kFailed;
+    if (!need_whole(buffer, 1)) return kFailed;
     const uint32_t part = std::min(left, buffer.remaining);
     crc = crc32_update(crc, take(buffer, part), part);
     left -= part;
   }
-  if (!need(buffer, kCrcBytes)) return kFailed;
-  return load_be32(take(buffer, kCrcBytes)) == ~crc ? kDone : kCorrupt;
+  if (!need_whole(buffer, kCrcBytes)) return kFailed;
+  if (load_be32(take(buffer, kCrcBytes)) == ~crc) return kDone;
+  return refuse(Reason::kDamaged, kStage, "checksum"), kCorrupt;
 }
 
 int channels(uint8_t colourType) {
@@ -66,15 +82,18 @@ bool accepted_depth(uint8_t colourType, uint8_t depth) {
   }
 }
 
-// Sides and combinations of depth and type (table 11.1). Sides are 31 bits by the standard.
+// Sides, and combinations of depth and type (table 11.1).
 bool accepted(const PELOI_PNGINFO& info) {
-  constexpr uint32_t kMaxSide = 0x7FFFFFFF;
-  return info.width != 0 && info.height != 0 && info.width <= kMaxSide && info.height <= kMaxSide &&
-         accepted_depth(info.colourType, info.bitDepth);
+  constexpr uint32_t kMaxSide = 0x7FFFFFFF;  // by the standard
+  if (info.width == 0 || info.height == 0) return refuse(Reason::kZeroSize, kStage);
+  if (info.width > kMaxSide || info.height > kMaxSide) return refuse(Reason::kDamaged, kStage, "size");
+  return accepted_depth(info.colourType, info.bitDepth) ||
+         refuse(Reason::kVariant, kStage, "PNG of an invalid depth");
 }
 
 int parse_ihdr(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
-  if (length != 13 || !need(buffer, length)) return kFailed;
+  if (length != 13) return refuse_damaged("IHDR of another length");
+  if (!need_whole(buffer, length)) return kFailed;
   const uint8_t* p = take(buffer, length);
   info.width = load_uint32(p);
   info.height = load_uint32(p + 4);
@@ -82,7 +101,8 @@ int parse_ihdr(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length
   info.colourType = p[9];
   const uint8_t compression = p[10], filter = p[11];
   info.interlace = p[12];
-  if (compression != 0 || filter != 0 || info.interlace > 1) return kFailed;
+  if (compression != 0 || filter != 0 || info.interlace > 1)
+    return refuse_variant("PNG of an unknown compression, filter or interlace method");
   info.hasAlpha = (info.colourType & 4) != 0;
   if (!accepted(info)) return kFailed;
   const int planes = channels(info.colourType);
@@ -97,9 +117,10 @@ int parse_ihdr(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length
 }
 
 int parse_plte(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
-  if ((info.criticalFlags & kIhdrRead) == 0) return kFailed;
+  if ((info.criticalFlags & kIhdrRead) == 0) return refuse_damaged("PLTE before IHDR");
   if (info.colourType != kPalette) return kDone;
-  if (length % 3 != 0 || length > info.palette.size() || !need(buffer, length)) return kFailed;
+  if (length % 3 != 0 || length > info.palette.size()) return refuse_damaged("PLTE");
+  if (!need_whole(buffer, length)) return kFailed;
   info.palette.fill(0);
   info.paletteAlpha.fill(0xFFFF);
   if (length != 0) std::memcpy(info.palette.data(), take(buffer, length), length);
@@ -109,7 +130,8 @@ int parse_plte(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length
 }
 
 int parse_trns(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length) {
-  if (parse_transparency(&info, &buffer, length, kTrns, &info.colourKey) != 1) return kFailed;
+  if (parse_transparency(&info, &buffer, length, kTrns, &info.colourKey) != kDone)
+    return refuse_damaged("tRNS");
   info.ancillaryFlags |= kTrnsRead;
   return kDone;
 }
@@ -117,10 +139,11 @@ int parse_trns(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, uint32_t length
 int note_idat(PELOI_PNGINFO& info, const PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
   constexpr size_t kFirstEntries = 16;
   // Streams may deliver more than they said.
-  if (info.idatCount >= buffer.limit / kChunkFrame || chunk.data > UINT32_MAX) return kFailed;
+  if (info.idatCount >= buffer.limit / kChunkFrame || chunk.data > UINT32_MAX)
+    return refuse_damaged("more IDAT chunks than its size allows");
   if (info.idatCount == info.idat.size() &&
       !info.idat.grow(std::max(kFirstEntries, 2 * info.idat.size())))
-    return kNoMemory;
+    return refuse(Reason::kNoMemory, kStage), kNoMemory;
   info.idat[info.idatCount++] = {chunk.length, static_cast<uint32_t>(chunk.data)};
   info.idatLength += chunk.length;
   return kDone;
@@ -143,24 +166,25 @@ ReadChunk reader_of(uint32_t type) {
 }
 
 bool read_chunk_head(PELOI_PNGREADBUFFER& buffer, Chunk& chunk) {
-  if (!need(buffer, 8)) return false;
+  if (!need_whole(buffer, 8)) return false;
   const uint8_t* head = take(buffer, 8);
   chunk.length = load_uint32(head);
   chunk.type = load_uint32(head + 4);
   chunk.data = tell(buffer);
-  return chunk.length <= buffer.limit;
+  return chunk.length <= buffer.limit || refuse(Reason::kTruncated, kStage);
 }
 
 // Leaves the reader behind the chunk. Only chunks whose data are wanted are visited twice.
 int parse_chunk(PELOI_PNGINFO& info, PELOI_PNGREADBUFFER& buffer, const Chunk& chunk) {
   if (const int result = verify(buffer, chunk); result != kDone) return result;
   if (chunk.type == kIdat) return note_idat(info, buffer, chunk);
-  if (chunk.type == kIend) return chunk.length == 0 ? kDone : kFailed;
+  if (chunk.type == kIend) return chunk.length == 0 ? kDone : refuse_damaged("IEND with data");
   const ReadChunk read = reader_of(chunk.type);
   if (read == nullptr) return kDone;
-  if (!move_to(buffer, chunk.data)) return kFailed;
+  if (!move_to(buffer, chunk.data)) return refuse_damaged("a chunk out of reach");
   if (const int result = read(info, buffer, chunk.length); result != kDone) return result;
-  return move_to(buffer, chunk.data + chunk.length + kCrcBytes) ? kDone : kFailed;
+  if (move_to(buffer, chunk.data + chunk.length + kCrcBytes)) return kDone;
+  return refuse_damaged("a chunk out of reach");
 }
 
 // 16-bit sample to the 16-bit key that decoded samples are compared with. A greyscale key is widened as
@@ -215,7 +239,8 @@ int parse_chunks(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer) {
   info->idatCount = 0;
   info->ancillaryFlags = 0;
   for (const uint8_t byte : kSignature) {
-    if (!need(*buffer, 1) || *take(*buffer, 1) != byte) return kFailed;
+    if (!need_whole(*buffer, 1)) return kFailed;
+    if (*take(*buffer, 1) != byte) return refuse(Reason::kUnknownFormat, kStage), kFailed;
   }
   Chunk chunk;
   do {

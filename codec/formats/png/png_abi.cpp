@@ -1,9 +1,10 @@
 // The given names of this room; each forwards to the room's own function.
 #include "codec/formats/png/png_abi.h"
 
-#include "codec/base/axis_stepper.h"
+#include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "codec/pixel/blend.h"
+#include "codec/pixel/quad_sampler.h"
 #include "tavirpelo/api.h"
 #include "tavirpelo/decinfo.h"
 #include "tavirpelo/decode.h"
@@ -97,15 +98,18 @@ int __checkbuffer_util2(PELOI_PNGREADBUFFER* buffer, uint32_t need) {
 }
 
 int TAVIRPELOI_DecodePNG(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return png::decode(decInfo, output, width, height);
 }
 
 int TAVIRPELOI_DecodePNGLine(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height,
                              int lines) {
+  begin_operation();
   return png::decode_lines(decInfo, output, width, height, lines);
 }
 
 int TAVIRPELOI_DecodePNGIter(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
+  begin_operation();
   return png::decode_step(decInfo, output, width, height);
 }
 
@@ -126,11 +130,10 @@ template <size_t Channels, class Write>
 void resize_row(const uint8_t* upper, const uint8_t* lower, uint32_t sourceWidth, uint32_t outWidth,
                 uint8_t* output, Write write) {
   if (sourceWidth == 0 || outWidth == 0) return;
-  AxisStepper quarter(sourceWidth, outWidth, sourceWidth / 4);
-  AxisStepper threeQuarters(sourceWidth, outWidth, int64_t{3} * sourceWidth / 4);
-  for (uint32_t k = 0; k < outWidth; ++k, quarter.advance(), threeQuarters.advance()) {
-    const size_t a = static_cast<size_t>(quarter.position()) * Channels;
-    const size_t b = static_cast<size_t>(threeQuarters.position()) * Channels;
+  QuarterPoints columns(sourceWidth, outWidth);
+  for (uint32_t k = 0; k < outWidth; ++k, columns.advance()) {
+    const size_t a = static_cast<size_t>(columns.first()) * Channels;
+    const size_t b = static_cast<size_t>(columns.second()) * Channels;
     const uint8_t* const samples[4] = {upper + a, upper + b, lower + a, lower + b};
     write(samples, output + k * Channels);
   }

@@ -4,8 +4,8 @@
 #include <cstdint>
 
 #include "codec/base/axis_stepper.h"
-#include "codec/base/format_state.h"
 #include "codec/base/output_grid.h"
+#include "codec/formats/format.h"
 #include "codec/formats/png/expand.h"
 #include "codec/formats/png/inflate.h"
 #include "codec/formats/png/png_info.h"
@@ -13,14 +13,6 @@
 #include "tavirpelo/decode.h"
 
 namespace pelo::png {
-
-// What the caller asked for at the first call; later calls must ask for the same.
-struct Request {
-  int width, height;
-  int outFormat;
-  uint32_t option;
-  bool operator==(const Request&) const = default;
-};
 
 // The pass of an Adam7 image being read (ISO/IEC 15948, 8.2).
 struct PassState {
@@ -66,7 +58,7 @@ struct OutputState {
 typedef struct PELOI_PNGCONTEXT : pelo::FormatState {
   static constexpr pelo::FormatKind kKind = pelo::FormatKind::kPng;
   PELOI_PNGINFO info;
-  pelo::png::Request request;
+  pelo::DecodeRequest request;
   uint32_t iterFlag;
   PELOI_PNGREADBUFFER reader;
   bool inputReady;     // memory: chunks merged
@@ -121,7 +113,7 @@ Result consume(PELOI_PNGCONTEXT& context);
 bool completes_row(const PELOI_PNGCONTEXT& context, int64_t sourceRow);
 
 // Asked after every output row: the external status may pause the decode; false cancels it.
-bool may_go_on();
+bool host_agrees();
 
 // ---- output.cpp ----
 

@@ -1,15 +1,22 @@
 #include "codec/formats/png/png_driver.h"
 
+#include "codec/base/errors.h"
+
 namespace pelo::png {
 namespace {
+
+constexpr const char* kStage = "PNG decoder";
 
 // The state of a first call: reader, header, output.
 Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
   if (!open_read_buffer(context.reader, decInfo.pIO)) return kNoMemory;
   if (parse_chunks(&context.info, &context.reader) != kDone) return kUnreadable;
   const PELOI_PNGINFO& info = context.info;
-  if (info.width == 0 || info.height == 0 || info.idatCount == 0) return kUnreadable;
-  if (info.colourType == kPalette && (info.criticalFlags & kPlteRead) == 0) return kUnreadable;
+  if (info.width == 0 || info.height == 0)
+    return refuse(Reason::kDamaged, kStage, "no header"), kUnreadable;
+  if (info.idatCount == 0) return refuse(Reason::kDamaged, kStage, "no image data"), kUnreadable;
+  if (info.colourType == kPalette && (info.criticalFlags & kPlteRead) == 0)
+    return refuse(Reason::kDamaged, kStage, "no palette"), kUnreadable;
   decInfo.imageWidth = static_cast<int>(info.width);
   decInfo.imageHeight = static_cast<int>(info.height);
   const Result result = set_up_output(context);
@@ -19,12 +26,13 @@ Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
 }
 
 // The object's state: the one it holds when the request is the same, else a new one.
-Result obtain(TAVIRPELO_DECINFO& decInfo, const Request& request, PELOI_PNGCONTEXT*& context) {
+Result obtain(TAVIRPELO_DECINFO& decInfo, const DecodeRequest& request, PELOI_PNGCONTEXT*& context) {
+  const auto same = [&](const PELOI_PNGCONTEXT& held) { return held.request == request; };
+  if (!may_go_on<PELOI_PNGCONTEXT>(decInfo, kStage, same)) return kFailed;
   context = held_state<PELOI_PNGCONTEXT>(decInfo);
-  if (context != nullptr) return context->request == request ? kDone : kFailed;
-  if (decInfo.pFormatInfo != nullptr) return kFailed;  // another format's
+  if (context != nullptr) return kDone;
   context = os_new<PELOI_PNGCONTEXT>().release();
-  if (context == nullptr) return kNoMemory;
+  if (context == nullptr) return refuse(Reason::kNoMemory, kStage), kNoMemory;
   context->kind = PELOI_PNGCONTEXT::kKind;
   decInfo.pFormatInfo = context;
   context->request = request;
@@ -47,20 +55,17 @@ bool accepts_lines(const PELOI_PNGCONTEXT& context, int lines) {
   return static_cast<uint32_t>(lines) == height;
 }
 
-int decode(TAVIRPELO_DECINFO& decInfo, void* output, const Request& request, int lines) {
+int decode(TAVIRPELO_DECINFO& decInfo, void* output, const DecodeRequest& request, int lines) {
   PELOI_PNGCONTEXT* context;
   if (const Result result = obtain(decInfo, request, context); result != kDone) return result;
   if (context->output.width == 0 || context->output.height == 0) return kDone;
-  if (!accepts_lines(*context, lines)) return kLineMode;
+  if (!accepts_lines(*context, lines))
+    return refuse(Reason::kArgument, kStage, "rows of an interlaced PNG"), kLineMode;
   context->reader.source = decInfo.pIO;
   context->decInfo = &decInfo;
   context->iterFlag = decInfo.pngIterFlag != 0 ? 1 : 0;
   aim_output(*context, output, lines);
   return decompress(*context);
-}
-
-bool usable(const TAVIRPELO_DECINFO* decInfo, const void* output, int width, int height) {
-  return decInfo != nullptr && decInfo->pIO != nullptr && output != nullptr && width >= 0 && height >= 0;
 }
 
 // The codes of the public operations: 1 complete, 4 more to come, 0 failed.
@@ -69,7 +74,8 @@ int public_result(int result) {
 }
 
 int start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines, int iterFlag) {
-  if (!usable(decInfo, output, width, height) || lines < 0) return 0;
+  if (!usable(decInfo, output, width, height, kStage)) return 0;
+  if (lines < 0) return refuse(Reason::kArgument, kStage);
   decInfo->scaleDenom = 1;
   decInfo->pngIterFlag = iterFlag;
   return public_result(decode_request(decInfo, output, width, height, lines));
@@ -77,8 +83,7 @@ int start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int l
 
 }  // namespace
 int decode_request(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
-  const Request request{width, height, decInfo->outFormat, decInfo->option};
-  const int result = decode(*decInfo, output, request, lines);
+  const int result = decode(*decInfo, output, request_of(*decInfo, width, height), lines);
   if (result != kMore) release(decInfo);
   return result;
 }
@@ -100,7 +105,7 @@ int needs_alpha(TAVIRPELO_DECINFO* decInfo) {
 }
 
 int decode(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height) {
-  if (decInfo == nullptr) return 0;
+  if (decInfo == nullptr) return refuse(Reason::kArgument, kStage);
   release(decInfo);
   return start(decInfo, output, width, height, 0, 0);
 }

@@ -4,11 +4,13 @@
 #include <cstdio>
 #include <cstring>
 
+#include "codec/base/errors.h"
 #include "codec/base/io.h"
 
 namespace pelo::png {
 namespace {
 
+constexpr const char* kStage = "PNG source";
 constexpr int kReadFailed = 11;
 
 // Reads up to `space` bytes behind the unread ones, which start at the base.
@@ -25,18 +27,18 @@ int fill(PELOI_PNGREADBUFFER& buffer, uint32_t space) {
 }  // namespace
 
 bool open_read_buffer(PELOI_PNGREADBUFFER& buffer, TAVIRPELO_IO* source) {
-  if (source == nullptr) return false;
+  if (source == nullptr) return refuse(Reason::kArgument, kStage);
   buffer.source = source;
   buffer.limit = static_cast<uint32_t>(std::max(source->size, 0));
   if (is_memory(buffer)) {
     buffer.base = static_cast<uint8_t*>(source->pSource);
     buffer.remaining = buffer.limit;
     buffer.consumed = buffer.limit;
-    return buffer.base != nullptr;
+    return buffer.base != nullptr || refuse(Reason::kEmpty, kStage);
   }
-  if (!buffer.window.allocate(kReadWindow)) return false;
+  if (!buffer.window.allocate(kReadWindow)) return refuse(Reason::kNoMemory, kStage);
   buffer.base = buffer.window.data();
-  return seek_io(source, 0, SEEK_SET) == 0;
+  return seek_io(source, 0, SEEK_SET) == 0 || refuse(Reason::kSource, kStage);
 }
 
 bool need(PELOI_PNGREADBUFFER& buffer, uint32_t n) {

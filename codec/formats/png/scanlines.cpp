@@ -76,7 +76,7 @@ Result write_pending(PELOI_PNGCONTEXT& context) {
     write_output_row(&context);
     if (output.stop != 0 && output.written >= output.stop && output.written < output.height)
       return kMore;
-    if (!may_go_on()) return kFailed;
+    if (!host_agrees()) return kFailed;
   }
   if (context.scanline.finished != nullptr) {
     context.scanline.finished = nullptr;
@@ -90,9 +90,10 @@ Result write_pending(PELOI_PNGCONTEXT& context) {
 bool begin_scanlines(PELOI_PNGCONTEXT& context) {
   ScanlineState& scanline = context.scanline;
   const uint64_t rowBytes = (uint64_t{context.info.bitsPerPixel} * context.info.width + 7) / 8;
-  if (2 * (rowBytes + 1 + context.info.width) > kMaxPictureBlock) return false;
   const auto rowSize = static_cast<size_t>(rowBytes) + 1;
-  if (!scanline.rows.allocate(2 * rowSize)) return false;
+  if (!obtain_block(static_cast<int64_t>(2 * (rowBytes + 1 + context.info.width)), "PNG rows",
+                    [&] { return scanline.rows.allocate(2 * rowSize); }))
+    return false;
   scanline.current = scanline.rows.data();
   scanline.above = scanline.rows.data() + rowSize;
   context.fullWidth = context.info.width;
@@ -112,11 +113,11 @@ bool completes_row(const PELOI_PNGCONTEXT& context, int64_t sourceRow) {
   return true;
 }
 
-bool may_go_on() {
+bool host_agrees() {
   int status = 0;
   TAVIRPELO_CheckExStatus(&status);
   if (status > 0) TAVIRPELO_OsSleep(status);
-  return status >= 0;
+  return status >= 0 || refuse(Reason::kCancelled, "writing rows");
 }
 
 Result consume(PELOI_PNGCONTEXT& context) {
