@@ -5,12 +5,8 @@
 #include <iterator>
 #include <utility>
 
+#include "slideshow/container_edit.h"
 #include "slideshow/container_format.h"
-#include "slideshow/container_session.h"
-#include "slideshow/container_undo.h"
-#include "slideshow/data_shift.h"
-#include "slideshow/edit_end.h"
-#include "slideshow/persist.h"
 #include "slideshow/subfile_table.h"
 
 namespace pelo::slideshow {
@@ -39,34 +35,31 @@ void read_stored(ContainerSession& session, const subfileInfo& entry, subfileInf
 
 // Lists the pictures to keep and the moves that close the gaps. Pictures in front of the first marked
 // one stay where they are.
-bool plan(SlideShow& show, Table& kept, DataShift& shift) {
-  ContainerSession session(show, "rb");
+bool plan(ContainerEdit& edit, const SlideShow& show, Table& kept) {
   int64_t end = int64_t{show.musicSize} + kHeaderSize;
   for (int i = 0; i < show.subfileCount; ++i) {
     const subfileInfo& entry = show.subfiles[i];
     if ((entry.state & kMarked) != 0) continue;
-    read_stored(session, entry, kept.entries[kept.count++]);
-    if (entry.offset != end) shift.add(entry.offset, end, entry.size, entry.size);
+    read_stored(edit.session(), entry, kept.entries[kept.count++]);
+    if (entry.offset != end) edit.shift().add(entry.offset, end, entry.size, entry.size);
     end += entry.size;
   }
-  return session.close();
+  return edit.session().good();
 }
 
 }  // namespace
 
 bool compact(SlideShow& show) {
-  ContainerUndo undo;
+  ContainerEdit edit(show);
   Table table;
-  DataShift shift;
-  if (!undo.remember(show, true, kEndMarkSize) || !plan(show, table, shift)) return false;
+  if (!edit.remember(true, kEndMarkSize) || !plan(edit, show, table)) return false;
 
-  if (shift.forth(show, kTries)) {
+  if (edit.move(kTries)) {
     exchange(show, table);
-    if (finish_file(show, data_end(show))) return true;
+    if (edit.finish(data_end(show))) return true;
     exchange(show, table);
   }
-  shift.back(show);
-  undo.put_back(show);
+  edit.roll_back();
   return false;
 }
 

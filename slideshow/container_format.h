@@ -19,16 +19,20 @@ struct EndMark {
   int musicSize;  // bytes: the header's offset
 };
 
-// Each transfers one record at the session's position, field by field in file order; 32-bit numbers are
-// little-endian, text fields are terminated when read. Whether it worked is the session's good(); values
-// are as found and still to be checked.
-void write_header(ContainerSession& session, const SlideShow& show);
+// Each reads one record at the session's position, field by field in file order; 32-bit numbers are
+// little-endian, text fields are terminated. Whether it worked is the session's good(); values are as
+// found and still to be checked.
 void read_header(ContainerSession& session, SlideShow& show);
-
-void write_subfile_header(ContainerSession& session, const subfileInfo& entry);
 void read_subfile_header(ContainerSession& session, subfileInfo& entry);
-
-void write_end_mark(ContainerSession& session, int musicSize);
 EndMark read_end_mark(ContainerSession& session);
+
+// Each writes one part of the container at the place that the show gives it, and answers the session's
+// good(): the bytes may still wait in the stream.
+bool write_header(ContainerSession& session, const SlideShow& show);
+bool write_subfile_headers(ContainerSession& session, const SlideShow& show);
+bool write_subfile(ContainerSession& session, const subfileInfo& entry, const void* jpeg);
+
+// At the session's position: an end mark stands wherever the file ends.
+bool write_end_mark(ContainerSession& session, int musicSize);
 
 }  // namespace pelo::slideshow

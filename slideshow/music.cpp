@@ -4,12 +4,8 @@
 #include <cstdint>
 #include <utility>
 
+#include "slideshow/container_edit.h"
 #include "slideshow/container_format.h"
-#include "slideshow/container_session.h"
-#include "slideshow/container_undo.h"
-#include "slideshow/data_shift.h"
-#include "slideshow/edit_end.h"
-#include "slideshow/persist.h"
 #include "slideshow/subfile_table.h"
 
 namespace pelo::slideshow {
@@ -19,8 +15,7 @@ namespace {
 constexpr int kTailInMemory = 4096;
 
 // Exactly `size` bytes, whatever became of the source since it was measured.
-bool copy_in(SlideShow& show, FILE* source, int size, uint8_t* buffer) {
-  ContainerSession session(show, "r+b");
+bool copy_in(ContainerSession& session, FILE* source, int size, uint8_t* buffer) {
   session.seek(0);
   for (int left = size; session.good() && left > 0;) {
     const int chunk = std::min(left, kMusicChunk);
@@ -29,7 +24,7 @@ bool copy_in(SlideShow& show, FILE* source, int size, uint8_t* buffer) {
     session.write(buffer, chunk);
     left -= chunk;
   }
-  return session.close();
+  return session.flush();
 }
 
 }  // namespace
@@ -50,43 +45,39 @@ void exchange_music(SlideShow& show, Music& music) {
 bool put_music(SlideShow& show, FILE* source, Music music) {
   const int size = music.size;
   const int inMemory = std::min(size, kTailInMemory);
-  ContainerUndo undo;
-  if (!undo.remember(show, true, inMemory)) return false;
+  ContainerEdit edit(show);
+  if (!edit.remember(true, inMemory)) return false;
   const int64_t tail = data_end(show) + inMemory;
-  const int64_t aside = std::clamp<int64_t>(undo.length() - tail, 0, size - inMemory);
-  if (!file_stays_small(show, undo.length() + aside, size + aside)) return false;
+  const int64_t aside = std::clamp<int64_t>(edit.old_length() - tail, 0, size - inMemory);
+  if (!file_stays_small(show, edit.old_length() + aside, size + aside)) return false;
 
   exchange_music(show, music);
-  const int64_t end = std::max(undo.length(), data_end(show));
-  DataShift shift;
-  if (aside > 0) shift.add(tail, end + kEndMarkSize, aside, kMusicChunk);
-  plan_data_up(shift, show, 0, size);
-  if (shift.forth(show, 1, std::min(size, kMusicChunk)) && copy_in(show, source, size, shift.spare()) &&
-      finish_file(show, end)) {
+  const int64_t end = std::max(edit.old_length(), data_end(show));
+  if (aside > 0) edit.shift().add(tail, end + kEndMarkSize, aside, kMusicChunk);
+  plan_data_up(edit.shift(), show, 0, size);
+  if (edit.move(1, std::min(size, kMusicChunk)) &&
+      copy_in(edit.session(), source, size, edit.shift().spare()) && edit.finish(end)) {
     return true;
   }
-  shift.back(show);
-  undo.put_back(show);
+  edit.roll_back();
   exchange_music(show, music);
   return false;
 }
 
 // Everything behind the music moves to the front, old end marks included.
 bool take_music(SlideShow& show) {
-  ContainerUndo undo;
-  if (!undo.remember(show, true, 0)) return false;
-  const int64_t size = undo.length() - show.musicSize;
-  DataShift shift;
-  shift.add(show.musicSize, 0, size, kMusicChunk);
+  ContainerEdit edit(show);
+  if (!edit.remember(true, 0)) return false;
+  const int64_t size = edit.old_length() - show.musicSize;
+  edit.shift().add(show.musicSize, 0, size, kMusicChunk);
 
-  if (shift.forth(show, kTries)) {
+  if (edit.move(kTries)) {
     Music music;
     exchange_music(show, music);
-    if (finish_file(show, size)) return true;
+    if (edit.finish(size)) return true;
     exchange_music(show, music);
   }
-  shift.back(show);
-  undo.put_back(show);
+  edit.roll_back();
   return false;
 }
 

@@ -11,18 +11,13 @@ int SlideShow::writeVssHeader(const char* openMode) {
   // A stream opened for appending writes at the file's end whatever the seek says: only an empty file
   // will do.
   if (session.good() && openMode[0] == 'a' && session.seek_end() != 0) session.fail();
-  session.seek(musicSize);
   write_header(session, *this);
   return session.close() ? 1 : 0;
 }
 
 int SlideShow::writeSubfileHeader() {
   ContainerSession session(*this, "r+b");
-  session.seek(int64_t{musicSize} + kHeaderSize);
-  for (int i = 0; session.good() && i < subfileCount; ++i) {
-    write_subfile_header(session, subfiles[i]);
-    session.skip(int64_t{subfiles[i].size} - kSubfileHeaderSize);
-  }
+  write_subfile_headers(session, *this);
   return session.close() ? 1 : 0;
 }
 
@@ -31,9 +26,7 @@ int SlideShow::writeSubfile(int index, const void* data) {
   const subfileInfo& entry = subfiles[index];
   if (entry.size <= kSubfileHeaderSize) return 0;
   ContainerSession session(*this, "r+b");
-  session.seek(entry.offset);
-  write_subfile_header(session, entry);
-  session.write(data, int64_t{entry.size} - kSubfileHeaderSize);
+  write_subfile(session, entry, data);
   return session.close() ? 1 : 0;
 }
 

@@ -2,8 +2,8 @@
 
 #include <cstdint>
 
-#include "slideshow/container_undo.h"
-#include "slideshow/data_shift.h"
+#include "slideshow/container_edit.h"
+#include "slideshow/container_format.h"
 #include "slideshow/subfile_table.h"
 #include "slideshow/text_field.h"
 
@@ -14,27 +14,31 @@ bool usable(const PictureSource& source) {
   return source.path != nullptr ? usable_path(source.path) : source.data != nullptr;
 }
 
+bool append_end_mark(ContainerSession& session, const SlideShow& show) {
+  return session.seek_end() >= 0 && write_end_mark(session, show.musicSize);
+}
+
 // The container's side, once the table holds the new picture. The mark behind the header keeps the
 // file's end valid while the picture is written; at the end of the data the picture covers every older
 // mark, and the last mark closes the file again.
-bool write_picture(SlideShow& show, DataShift& shift, int position, const uint8_t* jpeg) {
+bool write_picture(ContainerEdit& edit, const SlideShow& show, int position, const uint8_t* jpeg) {
+  ContainerSession& session = edit.session();
   const bool last = position == show.subfileCount - 1;
-  plan_data_up(shift, show, position + 1, show.subfiles[position].size);
-  return shift.forth(show, 1) && show.writeVssHeader("r+b") == 1 && show.writeEndMark() == 1 &&
-         show.writeSubfile(position, jpeg) == 1 && (last || show.writeSubfileHeader() == 1) &&
-         show.writeEndMark() == 1;
+  plan_data_up(edit.shift(), show, position + 1, show.subfiles[position].size);
+  return edit.move(1) && write_header(session, show) && append_end_mark(session, show) &&
+         write_subfile(session, show.subfiles[position], jpeg) &&
+         (last || write_subfile_headers(session, show)) && append_end_mark(session, show) &&
+         session.close();
 }
 
 bool store_in_file(SlideShow& show, const subfileInfo& entry, const uint8_t* jpeg, int position) {
-  ContainerUndo undo;
-  if (!undo.remember(show, position < show.subfileCount, entry.size)) return false;
-  if (!file_stays_small(show, undo.length(), entry.size)) return false;
+  ContainerEdit edit(show);
+  if (!edit.remember(position < show.subfileCount, entry.size)) return false;
+  if (!file_stays_small(show, edit.old_length(), entry.size)) return false;
 
   insert_entry(show, position, entry);
-  DataShift shift;
-  if (write_picture(show, shift, position, jpeg)) return true;
-  shift.back(show);
-  undo.put_back(show);
+  if (write_picture(edit, show, position, jpeg)) return true;
+  edit.roll_back();
   erase_entry(show, position);
   return false;
 }
