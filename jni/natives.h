@@ -9,8 +9,20 @@
 
 #include "jni/java_values.h"
 #include "jni/show_table.h"
+#include "platform/android_log.h"
 
 namespace pelo::bridge {
+
+// ---- the bridge's lines in the Android log ----
+
+// `format` and its one argument as in printf.
+inline void log(int priority, const char* format, const char* argument) {
+  __android_log_print(priority, "TavirSlideShowNative", format, argument);
+}
+
+inline void log(int priority, const char* text) {
+  log(priority, "%s", text);
+}
 
 // ---- shows ----
 

@@ -3,7 +3,6 @@
 #include <cstddef>
 
 #include "codec/base/byte_order.h"
-#include "slideshow/text_field.h"
 
 namespace pelo::slideshow {
 namespace {

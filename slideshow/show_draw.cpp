@@ -6,8 +6,8 @@
 #include "slideshow/SlideShow.h"
 #include "slideshow/container_format.h"
 #include "slideshow/container_session.h"
-#include "slideshow/picture.h"
 #include "slideshow/subfile_table.h"
+#include "slideshow/vss_wrappers.h"
 #include "tavirpelo/tavirpelo.h"
 
 using namespace pelo::slideshow;

@@ -13,13 +13,6 @@ struct PictureSource {
   int length;
 };
 
-// A picture as the show displays it, in pixels.
-struct DisplaySize {
-  int width;
-  int height;
-};
-DisplaySize display_size(const SlideShow& show, const subfileInfo& entry);
-
 // Frees what the encoder allocated.
 using JpegBytes = std::unique_ptr<uint8_t, VssFree>;
 

@@ -1,4 +1,4 @@
-#include "slideshow/picture.h"
+#include "slideshow/picture_intake.h"
 
 #include <algorithm>
 #include <climits>
@@ -8,7 +8,7 @@
 
 #include "codec/base/errors.h"
 #include "slideshow/container_format.h"
-#include "slideshow/text_field.h"
+#include "slideshow/subfile_table.h"
 #include "tavirpelo/tavirpelo.h"
 
 namespace pelo::slideshow {
@@ -76,16 +76,6 @@ bool encode(const SlideShow& show, const TAVIRPELO_RAWINFO& raw, subfileInfo& en
 }
 
 }  // namespace
-
-DisplaySize display_size(const SlideShow& show, const subfileInfo& entry) {
-  const auto scaled = [](int64_t limit, int other, int side) {
-    return side == 0 ? 0 : static_cast<int>(limit * other / side);
-  };
-  const int w = entry.width;
-  const int h = entry.height;
-  if (w >= h) return {std::min(w, show.width), w <= show.width ? h : scaled(show.width, h, w)};
-  return {h <= show.height ? w : scaled(show.height, w, h), std::min(h, show.height)};
-}
 
 bool make_picture(const SlideShow& show, const PictureSource& source, const char* name, char flag,
                   subfileInfo& entry, JpegBytes& jpeg) {
