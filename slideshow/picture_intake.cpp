@@ -4,27 +4,15 @@
 #include <climits>
 #include <cstdint>
 #include <cstdlib>
-#include <memory>
 
 #include "codec/base/errors.h"
 #include "slideshow/container_format.h"
 #include "slideshow/subfile_table.h"
-#include "tavirpelo/tavirpelo.h"
 
 namespace pelo::slideshow {
 namespace {
 
 constexpr int kStoredQuality = 100;
-
-struct DestroyRaw {
-  void operator()(TAVIRPELO_RAWINFO* raw) const { TAVIRPELO_DestroyRawInfo(raw); }
-};
-using RawImage = std::unique_ptr<TAVIRPELO_RAWINFO, DestroyRaw>;
-
-struct DestroyDecInfo {
-  void operator()(TAVIRPELO_DECINFO* decInfo) const { TAVIRPELO_DestroyDecInfo(decInfo); }
-};
-using DecInfo = std::unique_ptr<TAVIRPELO_DECINFO, DestroyDecInfo>;
 
 DecInfo open(const PictureSource& source) {
   constexpr int kFormat = TAVIRPELO_RGB888;

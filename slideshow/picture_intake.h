@@ -2,7 +2,7 @@
 #pragma once
 
 #include "slideshow/SlideShow.h"
-#include "slideshow/vss_wrappers.h"
+#include "slideshow/codec_objects.h"
 
 namespace pelo::slideshow {
 
@@ -12,9 +12,6 @@ struct PictureSource {
   void* data;
   int length;
 };
-
-// Frees what the encoder allocated.
-using JpegBytes = std::unique_ptr<uint8_t, VssFree>;
 
 // Fills a fresh entry from the source, all but its offset; in file mode `jpeg` receives the stored data.
 // False when the source cannot be read, is no picture, or memory is short.

@@ -2,10 +2,10 @@
 #include <algorithm>
 #include <climits>
 #include <cstdint>
-#include <memory>
 #include <utility>
 
 #include "slideshow/SlideShow.h"
+#include "slideshow/codec_objects.h"
 #include "slideshow/container_edit.h"
 #include "slideshow/container_format.h"
 #include "slideshow/subfile_table.h"
@@ -96,11 +96,6 @@ bool take_music(SlideShow& show) {
   edit.roll_back();
   return false;
 }
-
-struct CloseStream {
-  void operator()(FILE* stream) const { (void)vss_fclose(stream); }
-};
-using Stream = std::unique_ptr<FILE, CloseStream>;
 
 // Bytes of the file, whose stream then stands at its start again; 0 when a show cannot hold it.
 int measure(FILE* stream) {
