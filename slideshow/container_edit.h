@@ -1,4 +1,11 @@
 // One edit of a container: its session, and the way back should a step fail.
+//
+// How to read this room: include/slideshow/SlideShow.h says what a show does, and each show_*.cpp
+// defines the operations of its name. The container's records stand in container_format, the table of
+// pictures and their offsets in subfile_table, a picture's way from its source to stored JPEG in
+// picture_intake. An edit is a ContainerEdit: one container_session, the bytes that it will overwrite in
+// container_undo, what moves to make room in data_shift. show_remove.cpp is the shortest that uses all
+// of it. Files and memory are reached through vss_wrappers, where tests make any call fail.
 #pragma once
 
 #include <cstdint>
