@@ -4,7 +4,6 @@
 
 #include <iterator>
 
-#include "jni/log.h"
 #include "jni/natives.h"
 #include "jni/registration.h"
 

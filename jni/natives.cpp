@@ -1,7 +1,5 @@
 #include "jni/natives.h"
 
-#include "jni/log.h"
-
 namespace pelo::bridge {
 namespace {
 

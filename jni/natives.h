@@ -1,5 +1,9 @@
-// What the Java class's native methods do. Methods alike are one template; the table in
-// TavirSlideShowNative.cpp names its members.
+// What the Java class's native methods do. Methods alike are one template.
+//
+// How to read this room: the table in TavirSlideShowNative.cpp lists every native method with the
+// function behind it, and registration.h makes the compiler compare the two. A function finds its show
+// by handle in show_table and takes strings and arrays on loan from java_values.h; what it then does is
+// a method of SlideShow. Nothing is decided here but how handles count and what Java is told.
 //
 // Every method but the first four answers 0, or does nothing, for a handle outside the open shows. A
 // free slot among them makes the getters answer -2 or 254 and the methods of SlideShow refuse.
@@ -9,8 +13,20 @@
 
 #include "jni/java_values.h"
 #include "jni/show_table.h"
+#include "platform/android_log.h"
 
 namespace pelo::bridge {
+
+// ---- the bridge's lines in the Android log ----
+
+// `format` and its one argument as in printf.
+inline void log(int priority, const char* format, const char* argument) {
+  __android_log_print(priority, "TavirSlideShowNative", format, argument);
+}
+
+inline void log(int priority, const char* text) {
+  log(priority, "%s", text);
+}
 
 // ---- shows ----
 

@@ -3,7 +3,6 @@
 #include <cstddef>
 
 #include "codec/base/byte_order.h"
-#include "slideshow/text_field.h"
 
 namespace pelo::slideshow {
 namespace {
@@ -84,27 +83,12 @@ void subfile_fields(Fields fields, Entry& entry) {
 
 }  // namespace
 
-void write_header(ContainerSession& session, const SlideShow& show) {
-  header_fields(FieldWriter{session}, show);
-}
-
 void read_header(ContainerSession& session, SlideShow& show) {
   header_fields(FieldReader{session}, show);
 }
 
-void write_subfile_header(ContainerSession& session, const subfileInfo& entry) {
-  subfile_fields(FieldWriter{session}, entry);
-}
-
 void read_subfile_header(ContainerSession& session, subfileInfo& entry) {
   subfile_fields(FieldReader{session}, entry);
-}
-
-void write_end_mark(ContainerSession& session, int musicSize) {
-  for (const char byte : kMagic) session.write(&byte, 1);
-  FieldWriter fields{session};
-  fields.number(kVersion);
-  fields.number(musicSize);
 }
 
 EndMark read_end_mark(ContainerSession& session) {
@@ -118,6 +102,35 @@ EndMark read_end_mark(ContainerSession& session) {
   fields.number(mark.version);
   fields.number(mark.musicSize);
   return mark;
+}
+
+bool write_header(ContainerSession& session, const SlideShow& show) {
+  session.seek(show.musicSize);
+  header_fields(FieldWriter{session}, show);
+  return session.good();
+}
+
+bool write_subfile_headers(ContainerSession& session, const SlideShow& show) {
+  session.seek(int64_t{show.musicSize} + kHeaderSize);
+  for (int i = 0; session.good() && i < show.subfileCount; ++i) {
+    subfile_fields(FieldWriter{session}, show.subfiles[i]);
+    session.skip(int64_t{show.subfiles[i].size} - kSubfileHeaderSize);
+  }
+  return session.good();
+}
+
+bool write_subfile(ContainerSession& session, const subfileInfo& entry, const void* jpeg) {
+  session.seek(entry.offset);
+  subfile_fields(FieldWriter{session}, entry);
+  return session.write(jpeg, int64_t{entry.size} - kSubfileHeaderSize);
+}
+
+bool write_end_mark(ContainerSession& session, int musicSize) {
+  for (const char byte : kMagic) session.write(&byte, 1);
+  FieldWriter fields{session};
+  fields.number(kVersion);
+  fields.number(musicSize);
+  return session.good();
 }
 
 }  // namespace pelo::slideshow

@@ -7,22 +7,30 @@
 
 namespace pelo::slideshow {
 
-ContainerSession::ContainerSession(SlideShow& show, const char* openMode)
-    : show_(show), open_(false), good_(false) {
-  if (show.mode != SlideShow::kFileMode || show.file != nullptr || openMode == nullptr) return;
-  show.file = vss_fopen(show.pathName, openMode);
-  open_ = good_ = show.file != nullptr;
+ContainerSession::ContainerSession(SlideShow& show, const char* openMode) : show_(show) {
+  open(openMode);
 }
 
 ContainerSession::~ContainerSession() {
   (void)close();
 }
 
-bool ContainerSession::close() {
-  if (std::exchange(open_, false)) {
-    if (vss_fclose(std::exchange(show_.file, nullptr)) != 0) good_ = false;
-  }
+void ContainerSession::open(const char* openMode) {
+  if (show_.mode != SlideShow::kFileMode || show_.file != nullptr || openMode == nullptr) return;
+  show_.file = vss_fopen(show_.pathName, openMode);
+  open_ = good_ = show_.file != nullptr;
+}
+
+bool ContainerSession::reopen() {
+  (void)close();
+  open("r+b");
   return good_;
+}
+
+bool ContainerSession::close() {
+  const bool complete = std::exchange(good_, false);
+  if (!std::exchange(open_, false)) return false;
+  return vss_fclose(std::exchange(show_.file, nullptr)) == 0 && complete;
 }
 
 bool ContainerSession::move(int64_t distance, int whence) {

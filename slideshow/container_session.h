@@ -1,5 +1,5 @@
 // One open container: opened by the show's path into the show's `file`, closed and cleared on every way
-// out.
+// out. An edit has one from its first look at the file to its last write.
 #pragma once
 
 #include <cstddef>
@@ -22,6 +22,10 @@ class ContainerSession {
   bool good() const { return good_; }
   void fail() { good_ = false; }
 
+  // Ends what a step that failed has begun, and opens the file again to read and write: for second tries
+  // and the way back alone, since the file at the path may be another by now.
+  bool reopen();
+
   // Each answers good().
   bool seek(int64_t position);  // from the start
   bool skip(int64_t bytes);     // from the current position
@@ -33,15 +37,35 @@ class ContainerSession {
   int64_t seek_end();
 
   // True when every step completed and the file's last bytes are written. The stream is closed in any
-  // case; the destructor closes what is left open.
+  // case, so nothing is good() afterwards; the destructor closes what is left open.
   [[nodiscard]] bool close();
 
  private:
+  void open(const char* openMode);
   bool move(int64_t distance, int whence);
 
   SlideShow& show_;
-  bool open_;
-  bool good_;
+  bool open_ = false;
+  bool good_ = false;
 };
+
+// A call that fails once does not decide.
+constexpr int kTries = 2;
+
+// Runs a step until it answers true, kTries times at the most. For steps behind the point from which an
+// edit cannot be undone without loss, and for those that undo.
+template <class Step>
+bool persist(Step step) {
+  for (int i = 0; i < kTries; ++i) {
+    if (step()) return true;
+  }
+  return false;
+}
+
+// The same on an open container; a second try has a stream of its own.
+template <class Step>
+bool persist(ContainerSession& session, Step step) {
+  return persist([&] { return (session.good() || session.reopen()) && step(); });
+}
 
 }  // namespace pelo::slideshow

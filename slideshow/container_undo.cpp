@@ -4,7 +4,6 @@
 
 #include "slideshow/container_format.h"
 #include "slideshow/container_session.h"
-#include "slideshow/persist.h"
 #include "slideshow/subfile_table.h"
 
 namespace pelo::slideshow {
@@ -15,8 +14,8 @@ void ContainerUndo::add(int64_t offset, int64_t size) {
   byteCount_ += size;
 }
 
-bool ContainerUndo::remember(SlideShow& show, bool withSubfileHeaders, int64_t tail) {
-  ContainerSession session(show, "rb");
+bool ContainerUndo::remember(ContainerSession& session, const SlideShow& show, bool withSubfileHeaders,
+                             int64_t tail) {
   length_ = session.seek_end();
   if (length_ < data_end(show)) return false;  // cut short by someone else
   add(show.musicSize, kHeaderSize);
@@ -33,20 +32,21 @@ bool ContainerUndo::remember(SlideShow& show, bool withSubfileHeaders, int64_t t
     session.read(destination, pieces_[i].size);
     destination += pieces_[i].size;
   }
-  return session.close();
+  return session.good();
 }
 
-void ContainerUndo::put_back(SlideShow& show) const {
+// The stream is closed before the file is cut: what it may still hold must not lengthen the file again.
+void ContainerUndo::put_back(ContainerSession& session, const SlideShow& show) const {
   const uint8_t* source = bytes_.get();
   for (int i = 0; i < pieceCount_; ++i) {
-    (void)persist([&] {
-      ContainerSession session(show, "r+b");
+    (void)persist(session, [&] {
       session.seek(pieces_[i].offset);
       session.write(source, pieces_[i].size);
-      return session.close();
+      return session.flush();
     });
     source += pieces_[i].size;
   }
+  (void)session.close();
   (void)persist([&] { return truncate_file(show.pathName, length_); });
 }
 

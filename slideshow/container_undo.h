@@ -9,19 +9,22 @@
 
 namespace pelo::slideshow {
 
+class ContainerSession;
+
 class ContainerUndo {
  public:
   // Copies the container's header, its picture headers if `withSubfileHeaders`, and up to `tail` bytes
   // behind the data (old end marks). To be called before the show or the file changes. False when the
   // file cannot be read or memory is short.
-  [[nodiscard]] bool remember(SlideShow& show, bool withSubfileHeaders, int64_t tail);
+  [[nodiscard]] bool remember(ContainerSession& session, const SlideShow& show, bool withSubfileHeaders,
+                              int64_t tail);
 
   // Bytes of the file as remembered.
   int64_t length() const { return length_; }
 
   // Writes the copies back and cuts the file to its old length. Needs no memory and no room on the disk;
-  // each step is tried twice, even when another failed.
-  void put_back(SlideShow& show) const;
+  // each step is tried twice, even when another failed. Closes the session.
+  void put_back(ContainerSession& session, const SlideShow& show) const;
 
  private:
   struct Piece {

@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "slideshow/container_session.h"
-#include "slideshow/persist.h"
 
 namespace pelo::slideshow {
 
@@ -15,7 +14,7 @@ int64_t DataShift::piece_size() const {
   return std::min(runs_[run_].piece, runs_[run_].size - done_);
 }
 
-bool DataShift::forth(SlideShow& show, int tries, int64_t spare) {
+bool DataShift::forth(ContainerSession& session, int tries, int64_t spare) {
   if (moved_all() && spare == 0) return true;
   int64_t room = spare;
   for (int i = 0; i < runCount_; ++i) room = std::max(room, runs_[i].piece);
@@ -24,9 +23,9 @@ bool DataShift::forth(SlideShow& show, int tries, int64_t spare) {
   if (moved_all()) return true;
 
   for (int failures = 0; failures < tries; ++failures) {
-    ContainerSession session(show, "r+b");
+    if (!session.good() && !session.reopen()) continue;
     while (!moved_all() && move_piece(session)) failures = 0;
-    if (session.close() && moved_all()) return true;
+    if (moved_all()) return true;
   }
   return false;
 }
@@ -51,10 +50,10 @@ bool DataShift::move_piece(ContainerSession& session) {
   return true;
 }
 
-void DataShift::back(SlideShow& show) {
+void DataShift::back(ContainerSession& session) {
   if (buffer_ == nullptr) return;
   for (bool more = held_ || step_back(); more; more = step_back()) {
-    (void)persist([&] { return return_piece(show); });
+    (void)persist(session, [&] { return return_piece(session); });
     held_ = false;
   }
 }
@@ -70,8 +69,7 @@ bool DataShift::step_back() {
 }
 
 // A second try has the piece at hand: the first may have written over its copy in the file.
-bool DataShift::return_piece(SlideShow& show) {
-  ContainerSession session(show, "r+b");
+bool DataShift::return_piece(ContainerSession& session) {
   const Run& run = runs_[run_];
   if (!held_) {
     session.seek(run.to + done_);
@@ -79,7 +77,7 @@ bool DataShift::return_piece(SlideShow& show) {
   }
   session.seek(run.from + done_);
   session.write(buffer_.get(), piece_size());
-  return session.close();
+  return session.flush();
 }
 
 }  // namespace pelo::slideshow

@@ -20,14 +20,14 @@ class DataShift {
   // Moves the runs through one buffer, which holds the largest piece and at least `spare` bytes. Each
   // step is tried `tries` times before the whole is given up. True when all arrived; without memory
   // nothing moves.
-  [[nodiscard]] bool forth(SlideShow& show, int tries, int64_t spare = 0);
+  [[nodiscard]] bool forth(ContainerSession& session, int tries, int64_t spare = 0);
 
   // After forth() was true: its buffer, free for other use.
   uint8_t* spare() { return buffer_.get(); }
 
   // Undoes forth(), however far it came, as long as the file was not cut since. Needs no memory; each
   // piece is tried twice, even when another failed.
-  void back(SlideShow& show);
+  void back(ContainerSession& session);
 
  private:
   struct Run {
@@ -41,7 +41,7 @@ class DataShift {
   int64_t piece_size() const;
   bool move_piece(ContainerSession& session);
   bool step_back();
-  bool return_piece(SlideShow& show);
+  bool return_piece(ContainerSession& session);
 
   Run runs_[SlideShow::kMaxFileSubfiles + 1] = {};
   int runCount_ = 0;

@@ -1,23 +1,17 @@
 // Getting pictures back: stored JPEG data, and pixels for the application's bitmaps.
 #include <climits>
 #include <cstdint>
-#include <memory>
 
 #include "slideshow/SlideShow.h"
+#include "slideshow/codec_objects.h"
 #include "slideshow/container_format.h"
 #include "slideshow/container_session.h"
-#include "slideshow/picture.h"
 #include "slideshow/subfile_table.h"
-#include "tavirpelo/tavirpelo.h"
+#include "slideshow/vss_wrappers.h"
 
 using namespace pelo::slideshow;
 
 namespace {
-
-struct DestroyDecInfo {
-  void operator()(TAVIRPELO_DECINFO* decInfo) const { TAVIRPELO_DestroyDecInfo(decInfo); }
-};
-using DecInfo = std::unique_ptr<TAVIRPELO_DECINFO, DestroyDecInfo>;
 
 // Bytes of the pixel array; 0 for a size that no Java array holds.
 size_t pixel_bytes(int width, int height) {

@@ -6,7 +6,6 @@
 #include "slideshow/SlideShow.h"
 #include "slideshow/container_format.h"
 #include "slideshow/subfile_table.h"
-#include "slideshow/text_field.h"
 #include "slideshow/vss_wrappers.h"
 
 using namespace pelo::slideshow;

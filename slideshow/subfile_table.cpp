@@ -8,6 +8,16 @@
 
 namespace pelo::slideshow {
 
+DisplaySize display_size(const SlideShow& show, const subfileInfo& entry) {
+  const auto scaled = [](int64_t limit, int other, int side) {
+    return side == 0 ? 0 : static_cast<int>(limit * other / side);
+  };
+  const int w = entry.width;
+  const int h = entry.height;
+  if (w >= h) return {std::min(w, show.width), w <= show.width ? h : scaled(show.width, h, w)};
+  return {h <= show.height ? w : scaled(show.height, w, h), std::min(h, show.height)};
+}
+
 bool has_room(const SlideShow& show) {
   switch (show.mode) {
     case SlideShow::kFileMode:

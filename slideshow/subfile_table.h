@@ -9,9 +9,20 @@ namespace pelo::slideshow {
 
 class DataShift;
 
+// subfileInfo.state, bit 0: to be removed by the next compaction. Never outlives an open show: what a
+// file says of it is ignored.
+constexpr int kMarked = 1;
+
 inline bool valid_index(const SlideShow& show, int index) {
   return show.mode != SlideShow::kFree && index >= 0 && index < show.subfileCount;
 }
+
+// A picture as the show displays it, in pixels.
+struct DisplaySize {
+  int width;
+  int height;
+};
+DisplaySize display_size(const SlideShow& show, const subfileInfo& entry);
 
 // One more picture fits.
 bool has_room(const SlideShow& show);

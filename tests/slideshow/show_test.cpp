@@ -1,5 +1,6 @@
 // Shows in use: creating, adding, inserting, drawing, in a file and in memory.
 #include <gtest/gtest.h>
+#include <sys/inotify.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -91,6 +92,48 @@ TEST(Show, AWriterFindsTheStreamTaken) {
   EXPECT_EQ(0, show.GetSubfile(0, &byte));
   EXPECT_EQ(stdin, show.file);
   show.file = nullptr;
+}
+
+// Counts how often a file is opened: each opening is followed by its close before the next one.
+class Openings {
+ public:
+  explicit Openings(const TempFile& file) : queue_(inotify_init1(IN_NONBLOCK)) {
+    inotify_add_watch(queue_, file.c_str(), IN_OPEN | IN_CLOSE);
+  }
+  ~Openings() { close(queue_); }
+  Openings(const Openings&) = delete;
+  Openings& operator=(const Openings&) = delete;
+
+  int since_last() const {
+    uint32_t words[256];  // an event of one file: its watch, mask, cookie and the length 0 of a name
+    const ssize_t bytes = ::read(queue_, words, sizeof words);
+    int count = 0;
+    for (ssize_t i = 0; i < bytes / 16; ++i) count += (words[4 * i + 1] & IN_OPEN) != 0;
+    return count;
+  }
+
+ private:
+  int queue_;
+};
+
+// What is measured is what is stored, whoever replaces the files meanwhile. A cut opens the file by its
+// path.
+TEST(Show, AnEditOpensItsFilesOnce) {
+  const TempFile file, source(".jpg");
+  source.write(encode_own(64, 48, 80));
+  SlideShow show;
+  ASSERT_EQ(1, show.CreateShow(file.c_str(), 480, 480));
+  const Openings container(file), picture(source);
+  const auto openings = [&](int result) {
+    EXPECT_EQ(1, result);
+    return std::pair(container.since_last(), picture.since_last());
+  };
+  EXPECT_EQ(std::pair(1, 1), openings(show.AddImageToFile(source.c_str(), "A")));
+  EXPECT_EQ(std::pair(1, 1), openings(show.InsertImageToFile(source.c_str(), "B", 0)));
+  EXPECT_EQ(std::pair(2, 1), openings(show.AddMusic(source.c_str())));
+  EXPECT_EQ(std::pair(2, 0), openings(show.RemoveMusic()));
+  ASSERT_EQ(1, show.RemoveImage(0));
+  EXPECT_EQ(std::pair(2, 0), openings(show.RemoveSubfile()));
 }
 
 TEST(Show, EditsKeepOrderAndLimits) {

@@ -2,7 +2,7 @@
 #pragma once
 
 #include "slideshow/SlideShow.h"
-#include "slideshow/vss_wrappers.h"
+#include "slideshow/codec_objects.h"
 
 namespace pelo::slideshow {
 
@@ -12,16 +12,6 @@ struct PictureSource {
   void* data;
   int length;
 };
-
-// A picture as the show displays it, in pixels.
-struct DisplaySize {
-  int width;
-  int height;
-};
-DisplaySize display_size(const SlideShow& show, const subfileInfo& entry);
-
-// Frees what the encoder allocated.
-using JpegBytes = std::unique_ptr<uint8_t, VssFree>;
 
 // Fills a fresh entry from the source, all but its offset; in file mode `jpeg` receives the stored data.
 // False when the source cannot be read, is no picture, or memory is short.

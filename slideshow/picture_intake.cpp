@@ -1,39 +1,42 @@
-#include "slideshow/picture.h"
+#include "slideshow/picture_intake.h"
 
 #include <algorithm>
 #include <climits>
 #include <cstdint>
 #include <cstdlib>
 
+#include "codec/base/errors.h"
 #include "slideshow/container_format.h"
-#include "slideshow/text_field.h"
-#include "tavirpelo/tavirpelo.h"
+#include "slideshow/subfile_table.h"
 
 namespace pelo::slideshow {
 namespace {
 
 constexpr int kStoredQuality = 100;
 
-struct DestroyRaw {
-  void operator()(TAVIRPELO_RAWINFO* raw) const { TAVIRPELO_DestroyRawInfo(raw); }
-};
-using RawImage = std::unique_ptr<TAVIRPELO_RAWINFO, DestroyRaw>;
+DecInfo open(const PictureSource& source) {
+  constexpr int kFormat = TAVIRPELO_RGB888;
+  return DecInfo(
+      source.path != nullptr
+          ? TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_FILE, const_cast<char*>(source.path), 0, kFormat, 0)
+          : TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, source.data, source.length, kFormat, 0));
+}
 
 // The source's size; a picture stored bottom up and one stored top down have the same.
-bool measure(const PictureSource& source, subfileInfo& entry) {
+bool measure(TAVIRPELO_DECINFO* decInfo, subfileInfo& entry) {
   TAVIRPELO_HINFO header;
-  const int format = source.path != nullptr
-                         ? TAVIRPELO_ParseFromFile(source.path, &header)
-                         : TAVIRPELO_ParseFromBuffer(source.data, source.length, &header);
+  const int format = TAVIRPELO_Parser(decInfo, &header);
   if (format == TAVIRPELO_FORMAT_UNKNOWN || header.height == INT_MIN) return false;
   entry.width = header.width;
   entry.height = std::abs(header.height);
   return true;
 }
 
-bool decode(const PictureSource& source, TAVIRPELO_RAWINFO* raw) {
-  if (source.path != nullptr) return TAVIRPELO_DecodeImageFromFile(source.path, raw, 0) != 0;
-  return TAVIRPELO_DecodeImageFromBuffer(source.data, source.length, raw, 0) != 0;
+// The picture at its display size; null when it cannot be decoded or memory is short.
+RawImage decode(TAVIRPELO_DECINFO* decInfo, const DisplaySize& size) {
+  RawImage raw(TAVIRPELO_CreateRawInfo(size.width, size.height, TAVIRPELO_RGB888));
+  if (!raw || TAVIRPELO_DecodeParsed(decInfo, raw->pData, size.width, size.height) == 0) return nullptr;
+  return raw;
 }
 
 // A first guess at the JPEG's size; the encoder enlarges it when needed.
@@ -62,27 +65,19 @@ bool encode(const SlideShow& show, const TAVIRPELO_RAWINFO& raw, subfileInfo& en
 
 }  // namespace
 
-DisplaySize display_size(const SlideShow& show, const subfileInfo& entry) {
-  const auto scaled = [](int64_t limit, int other, int side) {
-    return side == 0 ? 0 : static_cast<int>(limit * other / side);
-  };
-  const int w = entry.width;
-  const int h = entry.height;
-  if (w >= h) return {std::min(w, show.width), w <= show.width ? h : scaled(show.width, h, w)};
-  return {h <= show.height ? w : scaled(show.height, w, h), std::min(h, show.height)};
-}
-
 bool make_picture(const SlideShow& show, const PictureSource& source, const char* name, char flag,
                   subfileInfo& entry, JpegBytes& jpeg) {
+  begin_operation();
   entry.flag = static_cast<unsigned char>(flag);
   if (name != nullptr) set_text(entry.name, name);
   if (source.path != nullptr) set_text(entry.path, source.path);
-  if (!measure(source, entry)) return false;
+  DecInfo decInfo = open(source);
+  if (!decInfo || !measure(decInfo.get(), entry)) return false;
   if (show.mode == SlideShow::kMemoryMode) return true;
 
-  const DisplaySize size = display_size(show, entry);
-  const RawImage raw(TAVIRPELO_CreateRawInfo(size.width, size.height, TAVIRPELO_RGB888));
-  return raw && decode(source, raw.get()) && encode(show, *raw, entry, jpeg);
+  const RawImage raw = decode(decInfo.get(), display_size(show, entry));
+  decInfo.reset();  // the encoder's memory takes the place of the decoder's
+  return raw && encode(show, *raw, entry, jpeg);
 }
 
 }  // namespace pelo::slideshow
