@@ -5,6 +5,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include "tavirpelo/error.h"
 #include "tavirpelo/io.h"
 
 namespace pelo_tool {
@@ -51,7 +52,9 @@ Exit Input::open(const std::string& path) {
   }
   if (!info_) return fail(Exit::kCannotOpen, "{}: empty, or no file", path);
   if (TAVIRPELO_Parser(info_.get(), &header_) == TAVIRPELO_FORMAT_UNKNOWN) {
-    return fail(Exit::kRefused, "{}: not a picture that can be read, or above 5000 pixels", path);
+    TAVIRPELO_ERROR error;
+    const bool known = TAVIRPELO_LastError(&error) == 1;
+    return fail(Exit::kRefused, "{}: {}", path, known ? error.text : "not a picture that can be read");
   }
   return Exit::kDone;
 }

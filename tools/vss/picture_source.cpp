@@ -8,6 +8,7 @@
 #include <cstring>
 #include <filesystem>
 
+#include "tavirpelo/error.h"
 #include "tavirpelo/io.h"
 #include "tools/common/text.h"
 #include "tools/vss/picture.h"
@@ -17,17 +18,19 @@ namespace vss {
 namespace {
 
 constexpr size_t kMaxPathBytes = sizeof(subfileInfo::path) - 1;
-constexpr int kMaxSourceSide = 5000;  // what the decoders take
 
-// The part of an addition that depends on the picture alone; true when it works.
-bool decodes(const SlideShow& show, const std::string& path, const TAVIRPELO_HINFO& header) {
-  // The longer side is limited by the show's width or height; the other follows in proportion.
-  int limit = header.width >= header.height ? show.width : show.height;
-  int longer = std::max(header.width, header.height);
-  int shorter = std::min(header.width, header.height);
-  bool tooThin = longer > limit && static_cast<int64_t>(shorter) * limit / longer < 1;
-  RawImage trial = create_canvas({limit, limit}, 0);
-  return !tooThin && trial && TAVIRPELO_DecodeImageFromFile(path.c_str(), trial.get(), 0) == 1;
+// Why the codec failed last, or what to say when it did not.
+std::string codec_reason(const char* otherwise) {
+  TAVIRPELO_ERROR error;
+  return TAVIRPELO_LastError(&error) == 1 ? error.text : otherwise;
+}
+
+// The longer side is limited by the show's width or height; the other follows in proportion.
+bool too_thin(const SlideShow& show, const TAVIRPELO_HINFO& header) {
+  const int limit = header.width >= header.height ? show.width : show.height;
+  const int longer = std::max(header.width, header.height);
+  const int shorter = std::min(header.width, header.height);
+  return longer > limit && static_cast<int64_t>(shorter) * limit / longer < 1;
 }
 
 Exit check_source(const SlideShow& show, const std::string& path, TAVIRPELO_HINFO& header) {
@@ -42,8 +45,11 @@ Exit check_source(const SlideShow& show, const std::string& path, TAVIRPELO_HINF
     return fail(Exit::kRefused, "{}: longer than {} bytes", path, kMaxPathBytes);
   }
   if (TAVIRPELO_ParseFromFile(path.c_str(), &header) == TAVIRPELO_FORMAT_UNKNOWN) {
-    return fail(Exit::kRefused, "{}: not a picture that can be read, or above {} pixels", path,
-                kMaxSourceSide);
+    return fail(Exit::kRefused, "{}: {}", path, codec_reason("not a picture that can be read"));
+  }
+  if (too_thin(show, header)) {
+    return fail(Exit::kRefused, "{}: {}x{}, less than a pixel wide in this show", path, header.width,
+                header.height);
   }
   return Exit::kDone;
 }
@@ -67,9 +73,11 @@ Exit add_picture(SlideShow& show, const std::string& path, int index, const std:
   int result = add();
   std::chrono::duration<double, std::milli> time = std::chrono::steady_clock::now() - start;
   if (result != 1) {
-    if (!decodes(show, path, header)) {
-      return fail(Exit::kRefused, "{}: this picture cannot be decoded", path);
-    }
+    // The codec's last step in an addition that fails later is the measuring of the new JPEG, which
+    // succeeds.
+    const std::string reason = codec_reason("");
+    if (!reason.empty())
+      return fail(Exit::kRefused, "{}: this picture cannot be decoded: {}", path, reason);
     return fail(Exit::kWriteFailure, "{}: cannot be written", show.pathName);
   }
   const subfileInfo& entry = show.subfiles[index];
