@@ -4,7 +4,8 @@
 
 namespace pelo::slideshow {
 
-// A close that fails may have lost any of the writes before it, so all of them are made again.
+// A close that fails does not say which write was lost, so all of the headers are written again. The
+// data need no second time: each piece was flushed when it was moved.
 bool ContainerEdit::finish(int64_t end) {
   const bool written = persist(session_, [&] {
     return write_header(session_, show_) && write_subfile_headers(session_, show_) &&
