@@ -5,7 +5,6 @@
 #include <cstdint>
 #include <cstdlib>
 
-#include "codec/base/errors.h"
 #include "slideshow/container_format.h"
 #include "slideshow/subfile_table.h"
 
@@ -67,7 +66,6 @@ bool encode(const SlideShow& show, const TAVIRPELO_RAWINFO& raw, subfileInfo& en
 
 bool make_picture(const SlideShow& show, const PictureSource& source, const char* name, char flag,
                   subfileInfo& entry, JpegBytes& jpeg) {
-  begin_operation();
   entry.flag = static_cast<unsigned char>(flag);
   if (name != nullptr) set_text(entry.name, name);
   if (source.path != nullptr) set_text(entry.path, source.path);

@@ -3,6 +3,7 @@
 
 #include "codec/base/dec_info.h"
 #include "codec/base/dec_ratio.h"
+#include "codec/base/errors.h"
 #include "codec/base/io.h"
 #include "codec/base/os.h"
 #include "tavirpelo/io.h"
@@ -100,12 +101,14 @@ int TAVIRPELO_SetStreamReadSize(TAVIRPELO_DECINFO* decInfo, int readSize) {
 
 TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfo(int ioType, void* source, int size, int outFormat,
                                            uint32_t option) {
+  begin_operation();
   return pelo::create_dec_info(ioType, source, size, outFormat, option);
 }
 
 TAVIRPELO_DECINFO* TAVIRPELO_CreateDecInfoWithStream(void* context, int size, TAVIRPELO_READFN pfRead,
                                                      TAVIRPELO_SKIPFN pfSkip, TAVIRPELO_RESETFN pfReset,
                                                      int outFormat, uint32_t option) {
+  begin_operation();
   return pelo::create_dec_info_with_stream(context, size, pfRead, pfSkip, pfReset, outFormat, option);
 }
 
