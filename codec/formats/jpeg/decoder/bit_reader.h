@@ -15,7 +15,9 @@ namespace pelo::jpeg {
 using BitBuffer = std::conditional_t<sizeof(size_t) == 8, uint64_t, uint32_t>;
 constexpr int kBitBufferSize = static_cast<int>(sizeof(BitBuffer) * 8);
 
-// Held after every fill. 32 are a code and its extra bits (16 + 15) in one fill.
+// Held after every fill. In 64 bits 32 are enough for a code and its extra bits (16 + 15), and fewer
+// than 32 leave room for four bytes at once. In 32 bits whole bytes fit in while at most 24 are held, so
+// that 25 are sure: a code, or its extra bits after another fill.
 constexpr int kFilledBits = kBitBufferSize == 64 ? 32 : 25;
 
 // What outlives an MCU. The unread bits are the lowest `left` bits of `bits`; of these the lowest

@@ -1,4 +1,11 @@
 // The decode driver: set-up of a decode and its row loop.
+//
+// How to read this room: decode_jpeg.cpp chooses between picture and thumbnail, driver.cpp sets a decode
+// up and runs it, over the records of jd_info.h.
+//   headers  markers, then decode_size, convert and upsample (which choose their methods), scan_setup
+//   a row    row_process asks imcu_row for one iMCU row: mcu_decode over bit_reader and huffman, then an
+//            idct_*; of several scans progressive does, over scan_list and progressive_mcu
+//   shown    upsample brings it to the full grid, convert to the target size, row_output to pixels
 #pragma once
 
 #include "codec/base/os_memory.h"

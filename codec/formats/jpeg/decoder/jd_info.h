@@ -26,8 +26,8 @@ namespace pelo::jpeg {
 
 constexpr int kMaxComponents = 3;
 constexpr int kMaxSampling = 4;
-constexpr int kMaxMcuBlocks = 10;  // T.81 B.2.3
-constexpr size_t kTablePoolSize = 120;
+constexpr int kMaxMcuBlocks = 10;       // T.81 B.2.3
+constexpr size_t kTablePoolSize = 120;  // four for each of kMaxScans; a file with more is not read on
 
 enum class ColourSpace : uint8_t { kNone = 0, kGrey = 1, kRgb = 2, kYcc = 3 };
 enum class FrameType : uint8_t { kNone = 0, kBaseline = 1, kProgressive = 2 };
@@ -215,6 +215,7 @@ struct Resampling {
   Sampling sampling;
   int continueFlag;  // the input row must still yield more output rows
   int inputRow;
+  // Columns of an input row fit 16 bits: none has more than kMaxSide samples.
   OsBuffer<uint16_t> centres;  // of each output column; for sampling at quarters instead:
   QuadSampler<ColourLanes, uint16_t> quarters;
 };

@@ -1,4 +1,9 @@
 // The state of one JPEG encoding, its steps in calling order, and the band interface.
+//
+// How to read this room: initialise makes the state, headers writes what stands before the data. For
+// each MCU row input_rows turns pixels into samples, mcu_row walks over its blocks, forward_dct
+// transforms and quantises one, block_coder codes an MCU through bit_writer into the destination. bands
+// feeds the rows from outside, encode_jpeg whole images.
 #pragma once
 
 #include <array>
@@ -137,9 +142,9 @@ ELO_ENCODER* begin_bands(const TAVIRPELO_RAWINFO* image, ELO_DESTINATION* destin
                          const TAVIRPELO_ENCOPTION* options,
                          const pelo::jpeg::CodingParameters* parameters);
 
-// The next row of MCUs, from a planar 4:2:0 picture 16 rows high without gaps between its planes. What lies
-// below the image in the last one is not read. *position, where it is given, becomes the number of image
-// rows coded so far; 1 or 0.
+// The next row of MCUs, from a planar 4:2:0 picture 16 rows high without gaps between its planes. What
+// lies below the image in the last one is not read. *position, where it is given, becomes the number of
+// image rows coded so far; 1 or 0.
 int encode_band(ELO_ENCODER* encoder, const uint8_t* band, int* position);
 
 // Ends the image, reports the working buffer and the bytes produced (either may be null), and frees the

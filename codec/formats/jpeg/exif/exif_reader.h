@@ -1,4 +1,9 @@
 // The steps of reading EXIF: finding the segment, its TIFF header, the directories, one entry.
+//
+// How to read this room: exif_segment finds the structure, exif_directories has a table for each of its
+// directories, in the terms of exif_members, and exif_thumbnail reads IFD1; exif_field bounds one entry,
+// on ../tiff.h. exif_info makes and frees records. exif_writer goes the other way, from a record to a
+// segment.
 #pragma once
 
 #include "codec/base/buffered_source.h"

@@ -1,4 +1,10 @@
 // A turn in progress.
+//
+// How to read this room: coefficient_source reads a JPEG's quantised blocks MCU row by MCU row,
+// block_transform turns blocks, coding_parameters carries tables and sampling over to the encoder. Turns
+// that reverse rows read them again from row_snapshots; sideways ones code a column at a time into the
+// streams of stream_encoder, which are joined by restart markers. reencode makes a picture fit a number
+// of bytes: coarser steps first (requantise), then fewer pixels.
 #pragma once
 
 #include "codec/base/geometry.h"
