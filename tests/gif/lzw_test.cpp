@@ -1,8 +1,5 @@
 // Code streams that no encoder writes, and the steps of the translation table.
 #include "codec/formats/gif/gif_abi.h"
-#include "codec/formats/gif/driver.h"
-#include "codec/formats/gif/parse.h"
-#include "codec/formats/gif/gif_abi.h"
 #include "tests/gif/gif_decode.h"
 
 namespace tests {

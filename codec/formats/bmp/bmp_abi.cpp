@@ -6,8 +6,8 @@
 #include "tavirpelo/decode.h"
 #include "tavirpelo/io.h"
 
-using namespace pelo;
-using namespace pelo::bmp;
+namespace bmp = pelo::bmp;
+using pelo::begin_operation;
 
 PELOI_BMPRECORD* PELOI_BMP_Initialize(TAVIRPELO_DECINFO* decInfo, int width, int height, void* output) {
   return bmp::make_record(decInfo, width, height, output);

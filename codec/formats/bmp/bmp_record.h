@@ -1,4 +1,9 @@
 // The state of one BMP decode, its row decoders and row writers.
+//
+// How to read this room: bmp_driver.cpp is where each call of a decode begins and ends, bmp_header.cpp
+// sets a decode up, bmp_rows.cpp decodes rows that row_reader.h finds. wbmp.cpp is the decoder of
+// wireless bitmaps, which have a reader of rows in common with these. head.h is all that format
+// detection needs. bmp_abi.h has the given names.
 #pragma once
 
 #include <array>

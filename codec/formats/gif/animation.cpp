@@ -1,14 +1,12 @@
-#include "codec/formats/gif/animation.h"
-
 #include <algorithm>
 #include <cstring>
 
 #include "codec/base/checked.h"
 #include "codec/formats/format.h"
 #include "codec/formats/gif/driver.h"
-#include "codec/formats/gif/image.h"
 #include "codec/formats/gif/output.h"
-#include "codec/formats/gif/parse.h"
+#include "codec/formats/gif/rows.h"
+#include "codec/formats/gif/stream.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::gif {

@@ -1,11 +1,8 @@
 #include "codec/formats/gif/driver.h"
 
-#include "codec/formats/gif/animation.h"
-#include "codec/formats/gif/final_resample.h"
-#include "codec/formats/gif/geometry.h"
-#include "codec/formats/gif/image.h"
 #include "codec/formats/gif/output.h"
-#include "codec/formats/gif/parse.h"
+#include "codec/formats/gif/rows.h"
+#include "codec/formats/gif/stream.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::gif {
@@ -53,6 +50,18 @@ OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode
 }
 
 }  // namespace
+
+Record* new_record(void) {
+  auto record = os_new<Record>();
+  if (record == nullptr) return refuse(Reason::kNoMemory, "GIF decoder"), nullptr;
+  record->kind = Record::kKind;
+  record->control.transparentIndex = -1;
+  return record.release();
+}
+
+void delete_record(Record* record) {
+  OsDelete{}(record);
+}
 
 Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode) {
   if (!usable(decInfo, output, width, height, kStage)) return nullptr;

@@ -1,9 +1,5 @@
-#include "codec/formats/gif/final_resample.h"
-
 #include "codec/base/errors.h"
-#include "codec/formats/gif/geometry.h"
 #include "codec/formats/gif/output.h"
-#include "codec/formats/gif/store_span.h"
 #include "codec/pixel/packers.h"
 #include "codec/pixel/quad_sampler.h"
 

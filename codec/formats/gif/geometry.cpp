@@ -1,9 +1,8 @@
-#include "codec/formats/gif/geometry.h"
-
 #include <algorithm>
 
 #include "codec/base/axis_stepper.h"
 #include "codec/formats/format.h"
+#include "codec/formats/gif/output.h"
 #include "codec/pixel/packers.h"
 
 namespace pelo::gif {
@@ -18,6 +17,16 @@ int64_t first_row(const Sampling& s, int64_t screenRow) {
 }
 
 }  // namespace
+
+bool IndexPlane::allocate(Size wanted) {
+  size = wanted;
+  const int64_t pixels = int64_t{wanted.width} * wanted.height;
+  if (pixels == 0) return true;
+  return obtain_block(pixels, "GIF picture", [&] {
+    return indices.allocate(static_cast<size_t>(pixels)) &&
+           painted.allocate(static_cast<size_t>(wanted.height));
+  });
+}
 
 Size box_of(const Record& record) {
   return turned(record.request.buffer, record.option);

@@ -7,8 +7,9 @@
 #include "tavirpelo/decode.h"
 #include "tavirpelo/io.h"
 
-using namespace pelo;
-using namespace pelo::gif;
+namespace gif = pelo::gif;
+using namespace gif;
+using pelo::begin_operation;
 
 int PELOI_MakeFrameLineBuffer(Record* record) {
   return gif::compose_row(record);

@@ -1,14 +1,12 @@
 // Given names of this room that no public header has; each is what the room's own function says.
 #pragma once
 
-#include "codec/formats/gif/animation.h"
 #include "codec/formats/gif/driver.h"
-#include "codec/formats/gif/image.h"
+#include "codec/formats/gif/lzw.h"
 #include "codec/formats/gif/output.h"
-#include "codec/formats/gif/parse.h"
-#include "codec/formats/gif/reader.h"
 #include "codec/formats/gif/record.h"
-#include "codec/formats/gif/translation_table.h"
+#include "codec/formats/gif/rows.h"
+#include "codec/formats/gif/stream.h"
 
 // Composes the image row in the line buffer onto the current screen row, and points the row source at
 // what is to be shown. 1.

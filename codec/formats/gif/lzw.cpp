@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "codec/base/errors.h"
+#include "codec/formats/gif/record.h"
 
 namespace pelo::gif {
 

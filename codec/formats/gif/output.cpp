@@ -4,9 +4,7 @@
 #include <cstring>
 
 #include "codec/base/row_progress.h"
-#include "codec/formats/gif/geometry.h"
-#include "codec/formats/gif/interlace.h"
-#include "codec/formats/gif/store_span.h"
+#include "codec/formats/gif/rows.h"
 #include "codec/pixel/lanes.h"
 #include "codec/pixel/packers.h"
 

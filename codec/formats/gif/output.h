@@ -1,11 +1,69 @@
-// Row writers: from colour indices or screen pixels into the caller's buffer.
+// From an image's rows to the caller's buffer: how large a GIF comes out and which screen pixels it is
+// made of, the row writers, and the averaging of reduced still images.
 #pragma once
+
+#include <algorithm>
 
 #include "codec/base/output_grid.h"
 #include "codec/formats/gif/record.h"
 #include "tavirpelo/api.h"
 
 namespace pelo::gif {
+
+// ---- size and place ----
+
+// The box that a picture is fitted into: a request's sides exchanged when it is turned sideways.
+Size box_of(const Record& record);
+
+// The produced size, before rotation, of a screen in a box. Never enlarges unless stretched.
+Size fit_screen(Size screen, Size box, uint32_t option);
+
+// Whether a still image comes out smaller than its screen on both sides.
+bool is_reduced(const Record& record);
+
+// The size to which a still image is sampled before its pixels are averaged: a whole fraction of the
+// screen's width. The picture's own size when it is not reduced.
+Size reduced_size(const Record& record);
+
+// Fits the record's screen for an option word: picture size, sampling. False when memory is short.
+[[nodiscard]] bool set_geometry(Record& record, uint32_t option);
+
+// Samples `from` down or up to `to`. False when memory is short.
+[[nodiscard]] bool set_sampling(Sampling& sampling, Size from, Size to);
+
+// The picture columns that a frame covers, for the rows to come.
+void cover_frame(Sampling& sampling, const Frame& frame);
+
+// The picture rows that are made of a screen row (0 to from.height - 1).
+OutputRows rows_of(const Sampling& sampling, int screenRow);
+
+// The picture in the caller's buffer: placed once, and again when a call comes with another.
+const OutputGrid& grid_of(Record& record, void* output);
+
+// Line mode: rows of the picture, the first of a call in the buffer's first row.
+const OutputGrid& line_grid_of(Record& record, void* output);
+
+// ---- pixels into spans of the output ----
+
+// Stores `count` colours that stand in a row.
+inline void store_colours(StoreRgba store, const Rgba* colours, int count, uint8_t* out,
+                          ptrdiff_t step) {
+  store(reinterpret_cast<const uint8_t*>(colours), count, out, step);
+}
+
+// Stores the colours that `pick(i)` yields for i = span.skip, span.skip + 1, ...
+template <class Pick>
+void store_span(StoreRgba store, const RowSpan& span, Pick pick) {
+  constexpr int kChunk = 256;
+  Rgba chunk[kChunk];
+  for (int done = 0; done < span.count; done += kChunk) {
+    const int count = std::min(kChunk, span.count - done);
+    for (int i = 0; i < count; ++i) chunk[i] = pick(span.skip + done + i);
+    store_colours(store, chunk, count, span.first + done * span.step, span.step);
+  }
+}
+
+// ---- rows ----
 
 // The row store of an output format that GIF pictures are written in (0, 1, 5, 7, 8, 10, 11); null for
 // the others, which are decoded without writing.
@@ -31,17 +89,29 @@ void write_plane_row(const Record& record, int planeRow, const OutputGrid& grid,
 
 // Each writes the current row of an image (its indices stand in the line buffer) or of an animation's
 // screen; rows below the screen are ignored. 1.
-int write_row(pelo::gif::Record* record, void* output);
-int write_sampled_rows(pelo::gif::Record* record, void* output);
-int write_screen_pixels(pelo::gif::Record* record, void* output);
-int write_sampled_screen(pelo::gif::Record* record, void* output);
+int write_row(Record* record, void* output);
+int write_sampled_rows(Record* record, void* output);
+int write_screen_pixels(Record* record, void* output);
+int write_sampled_screen(Record* record, void* output);
 
 // Writes the current row where the record's mode wants it and moves on to the next image row. 1, or 0
 // when the caller ends the decode or there is no such interlace pass.
-int write_line(pelo::gif::Record* record, void* output);
+int write_line(Record* record, void* output);
 
 // Line mode: writes the next output row, unrotated, when it is made of the current image row. *consumed
 // becomes 1 when no further output row is; the current row has then moved on. Answers as the one above.
-int write_output_row(pelo::gif::Record* record, void* output, int* consumed);
+int write_output_row(Record* record, void* output, int* consumed);
+
+// ---- averaging ----
+
+// Reduced still images are averaged in a last step, unless sampling them is all there is to it.
+
+// Prepares the plane of sampled indices when the picture is to be averaged, or the note of the rows that
+// are there when it is sampled into the output. False when memory is short.
+[[nodiscard]] bool plan_reduction(Record& record);
+
+// Averages the plane, if there is one, into the caller's buffer, or clears the rows that did not come.
+// False when the caller ends the decode.
+bool finish_picture(Record& record, void* output);
 
 }  // namespace pelo::gif

@@ -3,12 +3,11 @@
 
 #include <cstdint>
 
-#include "codec/base/lsb_bits.h"
 #include "codec/base/os_memory.h"
 #include "codec/base/output_grid.h"
 #include "codec/formats/format.h"
-#include "codec/formats/gif/reader.h"
-#include "codec/formats/gif/translation_table.h"
+#include "codec/formats/gif/lzw.h"
+#include "codec/formats/gif/stream.h"
 #include "codec/pixel/rgba_store.h"
 
 namespace pelo::gif {
@@ -65,19 +64,6 @@ struct IndexPlane {
   const uint8_t* row(int y) const { return const_cast<IndexPlane*>(this)->row(y); }
 };
 
-// The decompressor between two codes.
-struct LzwState {
-  LsbBits bits;
-  const uint8_t* next;  // the unread part of the current sub-block, in the reader's buffer
-  const uint8_t* end;
-  int codeSize;       // bits
-  uint32_t nextCode;  // the code that gets the next entry
-  uint32_t previous;  // the code before; kNoCode behind a clear code
-  int start, fill;    // indices in the line buffer that no row has taken yet
-  int rows;           // image rows finished
-};
-constexpr uint32_t kNoCode = kCodes;
-
 struct Record : FormatState {
   static constexpr FormatKind kKind = FormatKind::kGif;
 
@@ -122,9 +108,9 @@ struct Record : FormatState {
 };
 
 // An empty record; null when memory is short.
-pelo::gif::Record* new_record(void);
+Record* new_record(void);
 
 // Frees a record and all it owns; null is ignored.
-void delete_record(pelo::gif::Record* record);
+void delete_record(Record* record);
 
 }  // namespace pelo::gif

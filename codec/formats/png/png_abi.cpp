@@ -10,8 +10,9 @@
 #include "tavirpelo/decode.h"
 #include "tavirpelo/io.h"
 
-using namespace pelo;
-using namespace pelo::png;
+namespace png = pelo::png;
+using namespace png;
+using pelo::begin_operation;
 
 uint32_t __PELOI_PngCrc32(const uint8_t* data, uint32_t length) {
   return png::crc32(data, length);
@@ -130,7 +131,7 @@ template <size_t Channels, class Write>
 void resize_row(const uint8_t* upper, const uint8_t* lower, uint32_t sourceWidth, uint32_t outWidth,
                 uint8_t* output, Write write) {
   if (sourceWidth == 0 || outWidth == 0) return;
-  QuarterPoints columns(sourceWidth, outWidth);
+  pelo::QuarterPoints columns(sourceWidth, outWidth);
   for (uint32_t k = 0; k < outWidth; ++k, columns.advance()) {
     const size_t a = static_cast<size_t>(columns.first()) * Channels;
     const size_t b = static_cast<size_t>(columns.second()) * Channels;
@@ -160,7 +161,7 @@ void __PELOI_PngFreeTextList(PELOI_PNGTEXT* head) {
 }
 
 PELOI_PNGTRINFO* PELOI_FastImgCreatePngTrInfo(void) {
-  return os_new<PELOI_PNGTRINFO>().release();
+  return pelo::os_new<PELOI_PNGTRINFO>().release();
 }
 
 void PELOI_FastImgDestroyPngTrInfo(PELOI_PNGTRINFO* info) {
@@ -211,10 +212,10 @@ void __PELOI_PngResize_24bit_TR(const PELOI_PNGCONTEXT* context, const uint8_t* 
 }
 
 uint8_t APPLY_ALPHA_BYTE_TO_BYTE(uint32_t foreground, uint32_t alpha, uint32_t background) {
-  return blend_channel(foreground & 255, alpha & 255, background & 255);
+  return pelo::blend_channel(foreground & 255, alpha & 255, background & 255);
 }
 
 uint16_t APPLY_ALPHA_RGB_TO_SHORT(uint32_t red, uint32_t green, uint32_t blue, uint32_t alpha,
                                   uint32_t background565) {
-  return blend_rgb565(red & 255, green & 255, blue & 255, alpha & 255, background565);
+  return pelo::blend_rgb565(red & 255, green & 255, blue & 255, alpha & 255, background565);
 }

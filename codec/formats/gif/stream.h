@@ -1,4 +1,5 @@
-// The GIF decoder's buffered reader.
+// The GIF stream outside the image data: a buffered reader, and by it screen, colour tables, extensions
+// and image descriptors.
 #pragma once
 
 #include <cstdint>
@@ -7,6 +8,8 @@
 #include "tavirpelo/io.h"
 
 namespace pelo::gif {
+
+struct Record;
 
 constexpr int kReaderBytes = 4096;
 
@@ -27,5 +30,23 @@ const uint8_t* take(Reader& reader, int n);
 // Makes `need` bytes stand at *cursor, moving unread ones to the buffer's start and reading behind them.
 // 1, or 0 when the source ends before.
 int fill_buffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining, uint8_t** cursor);
+
+// ---- blocks ----
+
+// Answers of seek_image.
+constexpr int kFailed = 0;
+constexpr int kImageFollows = 1;
+constexpr int kTrailer = 3;
+
+// Packs `count` (up to 256) R, G, B triples into table entries.
+void pack_table(const uint8_t* rgbBytes, int count, uint32_t* table);
+
+// Reads the signature, the logical screen descriptor and the global colour table from the source's
+// start. 1, or 0 when it is no GIF or ends before.
+int parse_header(TAVIRPELO_IO* source, Record* record);
+
+// Goes on to the next image's data: 1 with its descriptor, tables and minimum code size read, 3 at the
+// trailer, 0 for a malformed graphic control extension or the source's end.
+int seek_image(TAVIRPELO_IO* source, Record* record);
 
 }  // namespace pelo::gif

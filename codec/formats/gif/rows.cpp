@@ -1,16 +1,15 @@
-#include "codec/formats/gif/image.h"
+#include "codec/formats/gif/rows.h"
 
 #include <algorithm>
 #include <climits>
 
 #include "codec/base/io.h"
-#include "codec/formats/gif/animation.h"
-#include "codec/formats/gif/geometry.h"
-#include "codec/formats/gif/interlace.h"
+#include "codec/formats/gif/driver.h"
 #include "codec/formats/gif/lzw.h"
 #include "codec/formats/gif/output.h"
 
 namespace pelo::gif {
+
 namespace {
 
 constexpr int kRowsOfBatch = 16;
@@ -112,6 +111,25 @@ int decode_image_lines(TAVIRPELO_IO* source, Record* record, void* output, int l
   }
   if (record->imageDone && !emit_plane_rows(*record, output)) return kFailure;
   return record->lineRow < record->picture.height ? kMore : kDone;
+}
+
+bool advance_row(Record& record) {
+  constexpr int kFirst[] = {0, 4, 2, 1};
+  constexpr int kStep[] = {8, 8, 4, 2};
+  int& pass = record.interlacePass;
+  if (pass < 0 || pass > 4) return false;
+  if (pass == 0) {
+    ++record.currentRow;
+    return true;
+  }
+  int row = record.currentRow - record.frame.top + kStep[pass - 1];
+  // Low frames have no row in some passes.
+  while (row >= record.frame.height && pass != 0) {
+    pass = (pass + 1) % 5;
+    if (pass != 0) row = kFirst[pass - 1];
+  }
+  record.currentRow = record.frame.top + row;
+  return true;
 }
 
 }  // namespace pelo::gif
