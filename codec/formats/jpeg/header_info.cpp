@@ -1,5 +1,6 @@
 // The JPEG part of the header information record: the picture's size and its thumbnail's.
 #include "codec/base/errors.h"
+#include "codec/base/io.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
@@ -20,7 +21,7 @@ int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
     refuse(Reason::kNoMemory, "JPEG headers");
     return fail("PELOJ_GetHInfo : malloc Fail");
   }
-  if (TAVIRPELO_Seek_IO(io, 0, SEEK_SET) < 0) return fail("PELOJ_GetHInfo : seek Fail");
+  if (seek_io(io, 0, SEEK_SET) < 0) return fail("PELOJ_GetHInfo : seek Fail");
   PELOJ_FILEHEADER header{};
   if (scan_file_header(source.get(), kScanMode, &header) != PELOJ_OK) {
     return fail("PELOJ_GetHInfo : PELOJ_SimpleParser Fail");

@@ -1,5 +1,6 @@
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 
+#include "codec/base/io.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
@@ -10,7 +11,7 @@ namespace {
 int next_byte(BitReader& reader) {
   if (reader.next == reader.end) {
     PELOJ_SOURCE& source = *reader.jd->source;
-    const int count = TAVIRPELO_Read_IO(source.io, source.buffer, static_cast<int>(kSourceBufferSize));
+    const int count = read_io(source.io, source.buffer, static_cast<int>(kSourceBufferSize));
     if (count <= 0) return -1;
     source.consumed += static_cast<uint32_t>(count);
     reader.next = source.buffer;

@@ -1,5 +1,6 @@
 // The JPEG decode entry: an embedded thumbnail when the option word allows it, else the main picture.
 #include "codec/base/errors.h"
+#include "codec/base/io.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
@@ -103,7 +104,7 @@ bool open_source(TAVIRPELO_DECINFO& decInfo, BufferedSource& source) {
     log_error("TAVIRPELO_DecodeJPEG : malloc Fail");
     return false;
   }
-  if (TAVIRPELO_Seek_IO(decInfo.pIO, 0, SEEK_SET) < 0) {
+  if (seek_io(decInfo.pIO, 0, SEEK_SET) < 0) {
     log_error("TAVIRPELO_DecodeJPEG : seek Fail");
     return false;
   }

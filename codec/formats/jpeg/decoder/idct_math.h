@@ -13,9 +13,10 @@ inline Vector scaled(Vector a, int32_t constant) {
 }
 
 // A coefficient times its multiplier, 10 fraction bits dropped. Real pictures stay below 16 K; the clamp
-// keeps every product and sum of hostile ones within 32 bits. An output of the 8-point butterfly is at most
-// 11.4 times its largest input, the sum of the magnitudes of its weights; the largest product of the second
-// pass is that of four such outputs (z10 + z12) with 473: 4 * 11.4 * 65536 * 473 = 0.66 * 2^31.
+// keeps every product and sum of hostile ones within 32 bits. An output of the 8-point butterfly is at
+// most 11.4 times its largest input, the sum of the magnitudes of its weights; the largest product of
+// the second pass is that of four such outputs (z10 + z12) with 473: 4 * 11.4 * 65536 * 473 = 0.66 *
+// 2^31.
 constexpr int32_t kDequantisedMax = 65536;
 inline int32_t dequantise(int32_t coefficient, int32_t multiplier) {
   const int64_t value = int64_t{coefficient} * multiplier >> 10;

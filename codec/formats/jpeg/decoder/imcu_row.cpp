@@ -1,5 +1,6 @@
 #include "codec/formats/jpeg/decoder/imcu_row.h"
 
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/decoder/idct.h"
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
 #include "codec/formats/jpeg/decoder/progressive.h"
@@ -75,7 +76,7 @@ bool decode_scan_row(PELOJ_JDINFO& jd, DecodeMcu decode) {
   const auto used = static_cast<size_t>(jd.scan.mcuBlocks) * 64 * sizeof(int32_t);
   for (int blockRow = 0; blockRow < jd.scan.mcuRowsPerImcu; ++blockRow) {
     for (int mcu = 0; mcu < jd.scan.mcusPerRow; ++mcu) {
-      TAVIRPELO_OsMemset(jd.entropy.coefficients.data(), 0, used);
+      os_memset(jd.entropy.coefficients.data(), 0, used);
       jd.entropy.lastPosition = {};
       if (!decode(&jd, jd.entropy.blocks.data())) return false;
       transform_mcu<Size>(jd, mcu, blockRow);

@@ -33,7 +33,7 @@ enum class ColourSpace : uint8_t { kNone = 0, kGrey = 1, kRgb = 2, kYcc = 3 };
 enum class FrameType : uint8_t { kNone = 0, kBaseline = 1, kProgressive = 2 };
 
 struct OsFreeDelete {
-  void operator()(void* block) const { TAVIRPELO_OsFree(block); }
+  void operator()(void* block) const { os_free(block); }
 };
 // Row pointers and the samples behind them, one allocation (allocate_rows).
 using SampleRows = std::unique_ptr<uint8_t*, OsFreeDelete>;

@@ -1,5 +1,6 @@
 #include "codec/formats/jpeg/decoder/progressive.h"
 
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/decoder/idct.h"
 #include "codec/formats/jpeg/decoder/markers.h"
 #include "codec/formats/jpeg/decoder/scan_setup.h"
@@ -78,7 +79,7 @@ void transform_row(PELOJ_JDINFO& jd, const Component& component, InverseDct tran
 
 int decode_coefficient_row(PELOJ_JDINFO& jd) {
   for (OsBuffer<int32_t>& plane : jd.rowCoefficients) {
-    if (plane) TAVIRPELO_OsMemset(plane.data(), 0, plane.size() * sizeof(int32_t));
+    if (plane) os_memset(plane.data(), 0, plane.size() * sizeof(int32_t));
   }
   for (size_t i = 0; i < jd.scanCount; ++i) {
     ScanRecord* record = jd.scans[i].get();

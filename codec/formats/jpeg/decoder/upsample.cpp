@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "codec/base/errors.h"
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
@@ -109,7 +110,7 @@ uint8_t** allocate_rows(int width, int rows) {
   const auto count = static_cast<size_t>(rows);
   const auto row = checked_add(stride, sizeof(uint8_t*));
   const auto bytes = row ? checked_mul(*row, count) : std::nullopt;
-  void* block = bytes ? TAVIRPELO_OsMalloc(*bytes) : nullptr;
+  void* block = bytes ? os_malloc(*bytes) : nullptr;
   if (block == nullptr) {
     refuse(Reason::kNoMemory, "JPEG decoder");
     log_error("PELOJ_AllocSampleArry : malloc fail");
@@ -118,7 +119,7 @@ uint8_t** allocate_rows(int width, int rows) {
   auto** pointers = static_cast<uint8_t**>(block);
   uint8_t* samples = static_cast<uint8_t*>(block) + count * sizeof(uint8_t*);
   // Neutral grey for components that no scan delivers.
-  TAVIRPELO_OsMemset(samples, 128, stride * count);
+  os_memset(samples, 128, stride * count);
   for (size_t i = 0; i < count; ++i) pointers[i] = samples + i * stride;
   return pointers;
 }

@@ -6,6 +6,7 @@
 
 #include "codec/base/checked.h"
 #include "codec/base/errors.h"
+#include "codec/base/os.h"
 #include "tavirpelo/io.h"
 
 namespace pelo::jpeg {
@@ -13,7 +14,7 @@ namespace pelo::jpeg {
 uint8_t* grow_block(uint8_t* old, int oldSize, int extra) {
   if (oldSize < 0 || extra < 1 || oldSize > INT_MAX - extra) return nullptr;
   const auto size = static_cast<size_t>(oldSize) + static_cast<size_t>(extra);
-  return static_cast<uint8_t*>(TAVIRPELO_OsRealloc(old, size));
+  return static_cast<uint8_t*>(os_realloc(old, size));
 }
 
 namespace {
@@ -33,7 +34,7 @@ bool flush(ELO_DESTINATION& destination) {
   const auto total = checked_int(int64_t{destination.total} + destination.used);
   if (!total || destination.file == nullptr) return false;
   errno = 0;
-  if (count != 0 && TAVIRPELO_OsFwrite(destination.buffer, 1, count, destination.file) != count) {
+  if (count != 0 && os_write(destination.buffer, 1, count, destination.file) != count) {
     const bool full = errno == ENOSPC || errno == EDQUOT || errno == EFBIG;
     return refuse(full ? Reason::kDiskFull : Reason::kNotWritable, "encoder output");
   }
@@ -51,7 +52,7 @@ int growth_for(size_t shortfall) {
 bool append_to_memory(ELO_DESTINATION& destination, const uint8_t* bytes, size_t count) {
   const auto room = static_cast<size_t>(destination.capacity - destination.used);
   if (count > room && !grow(destination, growth_for(count - room))) return false;
-  TAVIRPELO_OsMemcpy(destination.buffer + destination.used, bytes, count);
+  os_memcpy(destination.buffer + destination.used, bytes, count);
   destination.used += static_cast<int>(count);
   return true;
 }
@@ -61,7 +62,7 @@ bool append_to_file(ELO_DESTINATION& destination, const uint8_t* bytes, size_t c
   while (count != 0) {
     if (destination.used == destination.capacity && !flush(destination)) return false;
     const size_t part = std::min(count, static_cast<size_t>(destination.capacity - destination.used));
-    TAVIRPELO_OsMemcpy(destination.buffer + destination.used, bytes, part);
+    os_memcpy(destination.buffer + destination.used, bytes, part);
     destination.used += static_cast<int>(part);
     bytes += part;
     count -= part;
@@ -89,7 +90,7 @@ bool finish(ELO_DESTINATION& destination) {
 }
 
 void discard(ELO_DESTINATION& destination) {
-  TAVIRPELO_OsFree(destination.buffer);
+  os_free(destination.buffer);
   destination.buffer = nullptr;
   destination.capacity = destination.used = destination.total = 0;
 }

@@ -2,6 +2,7 @@
 #include <algorithm>
 
 #include "codec/base/errors.h"
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
 
 namespace pelo::jpeg {
@@ -45,12 +46,12 @@ int encode_to_buffer(const TAVIRPELO_RAWINFO* image, uint8_t** buffer, int* size
 
 int encode_to_file(const TAVIRPELO_RAWINFO* image, const char* path,
                    const TAVIRPELO_ENCOPTION* options) {
-  FILE* file = TAVIRPELO_OsFopen(path, "wb");
+  FILE* file = os_open(path, "wb");
   if (file == nullptr) return refuse(Reason::kNotWritable, "opening the output");
   ELO_DESTINATION destination{ELO_TO_FILE, 0, 0, 0, file, nullptr};
   const bool done = encode(image, destination, options);
   // The last bytes may reach the disk only now.
-  const bool closed = TAVIRPELO_OsFclose(file) == 0;
+  const bool closed = os_close(file) == 0;
   return (done && closed) || refuse(Reason::kNotWritable, "closing the output");
 }
 

@@ -63,9 +63,9 @@ TAVIRPELO_API ELO_ENCODER* elo_jpeg_enc_mcu_init(const TAVIRPELO_RAWINFO* image,
                                                  const TAVIRPELO_ENCOPTION* options,
                                                  const pelo::jpeg::CodingParameters* parameters);
 
-// The next row of MCUs, from a planar 4:2:0 picture 16 rows high without gaps between its planes. What lies
-// below the image in the last one is not read. *position, where it is given, becomes the number of image
-// rows coded so far; 1 or 0.
+// The next row of MCUs, from a planar 4:2:0 picture 16 rows high without gaps between its planes. What
+// lies below the image in the last one is not read. *position, where it is given, becomes the number of
+// image rows coded so far; 1 or 0.
 TAVIRPELO_API int elo_jpeg_enc_muc_process(ELO_ENCODER* encoder, const uint8_t* band, int* position);
 
 // Ends the image, reports the working buffer and the bytes produced (either may be null), and frees the

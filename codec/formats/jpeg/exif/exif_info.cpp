@@ -2,6 +2,9 @@
 #include <memory>
 
 #include "codec/base/byte_order.h"
+#include "codec/base/dec_info.h"
+#include "codec/base/io.h"
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/exif/exif_reader.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/jpeg/marker_codes.h"
@@ -26,9 +29,9 @@ TAVIRPELO_EXIFINFO* fail(const char* text) {
 
 void destroy_gps(TAVIRPELO_GPSINFO* gps) {
   if (gps == nullptr) return;
-  TAVIRPELO_OsFree(gps->mapDatum);
-  TAVIRPELO_OsFree(gps->processingMethod);
-  TAVIRPELO_OsFree(gps);
+  os_free(gps->mapDatum);
+  os_free(gps->processingMethod);
+  os_free(gps);
 }
 
 // Bytes of the TIFF data behind the ten of marker, length and identifier; 0 when they do not fit.
@@ -48,7 +51,7 @@ TAVIRPELO_EXIFINFO* create_info(TAVIRPELO_DECINFO* decInfo) {
   if (!info) return fail("PELOJ_CreatExifInfo : TAVIRPELO_EXIFINFO is null");
   BufferedSource cursor;
   if (!cursor.open(decInfo->pIO)) return fail("PELOJ_CreatExifInfo : malloc fail");
-  if (TAVIRPELO_Seek_IO(decInfo->pIO, 0, SEEK_SET) < 0) {
+  if (seek_io(decInfo->pIO, 0, SEEK_SET) < 0) {
     return fail("PELOJ_CreatExifInfo : seek fail");
   }
   if (find_and_read(cursor.get(), info.get()) != PELOJ_OK) {
@@ -58,10 +61,10 @@ TAVIRPELO_EXIFINFO* create_info(TAVIRPELO_DECINFO* decInfo) {
 }
 
 TAVIRPELO_EXIFINFO* create_info_of_source(int ioType, void* source, int size) {
-  TAVIRPELO_DECINFO* decInfo = TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_RGB565, 0);
+  TAVIRPELO_DECINFO* decInfo = create_dec_info(ioType, source, size, TAVIRPELO_RGB565, 0);
   if (decInfo == nullptr) return nullptr;
   TAVIRPELO_EXIFINFO* info = create_info(decInfo);
-  TAVIRPELO_DestroyDecInfo(decInfo);
+  destroy_dec_info(decInfo);
   return info;
 }
 
@@ -82,11 +85,11 @@ int destroy_info(TAVIRPELO_EXIFINFO* info) {
   }
   for (char* text : {info->make, info->model, info->software, info->rights, info->captureTime,
                      info->digitizingTime}) {
-    TAVIRPELO_OsFree(text);
+    os_free(text);
   }
-  TAVIRPELO_OsFree(info->exifVersion);
+  os_free(info->exifVersion);
   destroy_gps(info->gps);
-  TAVIRPELO_OsFree(info);
+  os_free(info);
   return 1;
 }
 

@@ -38,7 +38,7 @@ bool store_copy(T*& member, const Field& field) {
   OsBuffer<T> copy;
   if (!copy.allocate(size_t{field.length} + 1)) return false;
   if (field.length != 0) std::memcpy(copy.data(), field.value, field.length);
-  TAVIRPELO_OsFree(member);
+  os_free(member);
   member = copy.release();
   return true;
 }

@@ -147,8 +147,7 @@ uint32_t create_exif(uint8_t* tiff, const ELO_EXIFCONTENT* content) {
   return tiff == nullptr || content == nullptr ? 0 : put_structure(tiff, *content, kMaxTiff);
 }
 
-uint32_t write_exif_segment(uint8_t* segment, const ELO_EXIFCONTENT& content,
-                                        uint32_t capacity) {
+uint32_t write_exif_segment(uint8_t* segment, const ELO_EXIFCONTENT& content, uint32_t capacity) {
   if (capacity < kSegmentHead) return 0;
   const uint32_t room = std::min(capacity - kSegmentHead, kMaxTiff);
   const uint32_t length = put_structure(segment + kSegmentHead, content, room);

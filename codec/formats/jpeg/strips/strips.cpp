@@ -5,6 +5,8 @@
 #include <utility>
 
 #include "codec/base/errors.h"
+#include "codec/base/io.h"
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/decoder/progressive.h"
 #include "codec/formats/jpeg/decoder/row_process.h"
@@ -15,8 +17,8 @@ namespace {
 
 struct DeleteSource {
   void operator()(PELOJ_SOURCE* source) const {
-    TAVIRPELO_OsFree(source->buffer);
-    TAVIRPELO_OsFree(source);
+    os_free(source->buffer);
+    os_free(source);
   }
 };
 // The reader and its buffer, which the state only points at.
@@ -62,7 +64,7 @@ void release(PELOJ_JDINFO* state) {
 
 PELOJ_JDINFO* begin_strips(TAVIRPELO_DECINFO* decInfo, int width, int height, int outFormat) {
   if (decInfo == nullptr || width < 1 || height < 1) return nullptr;
-  if (TAVIRPELO_Seek_IO(decInfo->pIO, 0, SEEK_SET) < 0) return nullptr;
+  if (seek_io(decInfo->pIO, 0, SEEK_SET) < 0) return nullptr;
   OwnedSource source = new_source(decInfo->pIO);
   if (!source) return nullptr;
   decInfo->outFormat = outFormat;

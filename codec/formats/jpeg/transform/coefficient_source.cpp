@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "codec/base/dec_info.h"
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
 #include "codec/formats/jpeg/decoder/progressive.h"
 
@@ -28,8 +29,7 @@ bool CoefficientSource::progressive() const {
 }
 
 bool CoefficientSource::open(int ioType, void* source, int size, int width, int height) {
-  decInfo_.reset(
-      TAVIRPELO_CreateDecInfo(ioType, source, size, TAVIRPELO_YUV420, TAVIRPELO_THUMBNAIL_NEVER));
+  decInfo_.reset(create_dec_info(ioType, source, size, TAVIRPELO_YUV420, TAVIRPELO_THUMBNAIL_NEVER));
   if (!decInfo_) return false;
   decoder_.reset(
       begin_strips(decInfo_.get(), std::max(width, 1), std::max(height, 1), TAVIRPELO_YUV420));

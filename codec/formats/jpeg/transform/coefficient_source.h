@@ -4,6 +4,7 @@
 #include <array>
 #include <memory>
 
+#include "codec/base/dec_info.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
 #include "codec/formats/jpeg/strips/strips.h"
 
@@ -38,7 +39,7 @@ class CoefficientSource {
 
  private:
   struct DestroyDecInfo {
-    void operator()(TAVIRPELO_DECINFO* d) const { TAVIRPELO_DestroyDecInfo(d); }
+    void operator()(TAVIRPELO_DECINFO* d) const { destroy_dec_info(d); }
   };
   struct FinishDecoder {
     void operator()(PELOJ_JDINFO* d) const { end_strips(d); }

@@ -5,7 +5,9 @@
 #include <cstring>
 #include <utility>
 
+#include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/exif/exif_writer.h"
 #include "codec/formats/jpeg/head.h"
 #include "codec/formats/jpeg/transform/requantise.h"
@@ -40,8 +42,7 @@ enum class Outcome { kFits, kTooLarge, kFailed };
 
 using OpenInput = std::unique_ptr<TAVIRPELO_DECINFO, int (*)(TAVIRPELO_DECINFO*)>;
 OpenInput open(const Input& input) {
-  return {TAVIRPELO_CreateDecInfo(input.kind, input.address, input.size, TAVIRPELO_YUV420, 0),
-          TAVIRPELO_DestroyDecInfo};
+  return {create_dec_info(input.kind, input.address, input.size, TAVIRPELO_YUV420, 0), destroy_dec_info};
 }
 
 // Size of the picture and its orientation; false when it is no JPEG.
@@ -198,22 +199,22 @@ ELO_DESTINATION working_memory(int target) {
   const int64_t capacity =
       std::clamp<int64_t>(int64_t{target} * 1200 / 1024, kDestinationStep, INT_MAX / 2);
   ELO_DESTINATION work{ELO_TO_MEMORY, 0, 0, 0, nullptr, nullptr};
-  work.buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(static_cast<size_t>(capacity)));
+  work.buffer = static_cast<uint8_t*>(os_malloc(static_cast<size_t>(capacity)));
   if (work.buffer != nullptr) work.capacity = static_cast<int>(capacity);
   return work;
 }
 
 bool write_out(const ELO_DESTINATION& work, FILE* file) {
   const auto count = static_cast<size_t>(work.total);
-  return TAVIRPELO_OsFwrite(work.buffer, 1, count, file) == count;
+  return os_write(work.buffer, 1, count, file) == count;
 }
 
 // The file is opened last: it may be the source.
 bool write_out(const ELO_DESTINATION& work, const char* path) {
-  FILE* file = TAVIRPELO_OsFopen(path, "wb");
+  FILE* file = os_open(path, "wb");
   if (file == nullptr) return false;
   const bool written = write_out(work, file);
-  const bool closed = TAVIRPELO_OsFclose(file) == 0;
+  const bool closed = os_close(file) == 0;
   return written && closed;
 }
 

@@ -4,6 +4,7 @@
 #include <climits>
 #include <utility>
 
+#include "codec/base/os.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
 namespace pelo::jpeg {
@@ -73,7 +74,7 @@ int begin_column(ColumnEncoder* columns, ELO_ENCODER* encoder, int sourceSize) {
   for (size_t i = 0; i < columns->streams.size(); ++i) {
     ELO_DESTINATION& destination = columns->streams[i].destination;
     destination.kind = ELO_TO_MEMORY;
-    destination.buffer = static_cast<uint8_t*>(TAVIRPELO_OsMalloc(static_cast<size_t>(capacity)));
+    destination.buffer = static_cast<uint8_t*>(os_malloc(static_cast<size_t>(capacity)));
     if (destination.buffer == nullptr) return 0;
     destination.capacity = capacity;
   }
