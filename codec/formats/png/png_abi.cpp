@@ -154,8 +154,8 @@ void write_average(const uint8_t* const (&samples)[4], uint8_t* out) {
 void __PELOI_PngFreeTextList(PELOI_PNGTEXT* head) {
   while (head != nullptr) {
     PELOI_PNGTEXT* const next = head->next;
-    os_free(head->text);
-    os_free(head);
+    pelo::os_free(head->text);
+    pelo::os_free(head);
     head = next;
   }
 }
@@ -166,8 +166,8 @@ PELOI_PNGTRINFO* PELOI_FastImgCreatePngTrInfo(void) {
 
 void PELOI_FastImgDestroyPngTrInfo(PELOI_PNGTRINFO* info) {
   if (info == nullptr) return;
-  if (info->ownsBlock != 0) os_free(info->block);
-  os_free(info);
+  if (info->ownsBlock != 0) pelo::os_free(info->block);
+  pelo::os_free(info);
 }
 
 uint32_t __PELOI_PngReadBits(const uint8_t* bytes, uint32_t bytePosition, uint32_t bitPosition,
