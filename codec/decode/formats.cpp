@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 #include <iterator>
+#include <string_view>
 
 #include "codec/base/errors.h"
 #include "codec/formats/bmp/bmp_record.h"
@@ -32,14 +33,15 @@ constexpr Format kFormats[] = {
 // Files that people take for pictures which we read: the bytes at a place in their heads.
 struct Foreign {
   uint32_t at;
-  const char* bytes;
+  std::string_view bytes;
   const char* name;
 };
 constexpr Foreign kForeign[] = {
-    {4, "ftypheic", "HEIC"}, {4, "ftypheix", "HEIC"}, {4, "ftypmif1", "HEIC"}, {4, "ftypheim", "HEIC"},
-    {4, "ftypavif", "AVIF"}, {4, "ftypavis", "AVIF"}, {8, "WEBP", "WebP"},     {0, "II*", "TIFF"},
-    {0, "MM", "TIFF"},       {4, "ftypqt", "MOV"},    {4, "moov", "MOV"},      {4, "ftyp", "MP4"},
-    {0, "%PDF", "PDF"},      {0, "<svg", "SVG"},      {0, "<?xml", "SVG"},
+    {4, "ftypheic", "HEIC"}, {4, "ftypheix", "HEIC"},   {4, "ftypmif1", "HEIC"},
+    {4, "ftypheim", "HEIC"}, {4, "ftypavif", "AVIF"},   {4, "ftypavis", "AVIF"},
+    {8, "WEBP", "WebP"},     {0, {"II*\0", 4}, "TIFF"}, {0, {"MM\0*", 4}, "TIFF"},
+    {4, "ftypqt", "MOV"},    {4, "moov", "MOV"},        {4, "ftyp", "MP4"},
+    {0, "%PDF", "PDF"},      {0, "<svg", "SVG"},        {0, "<?xml", "SVG"},
 };
 
 // The first bytes of a source, kept while its head is parsed.
@@ -51,8 +53,9 @@ struct Start {
     std::memcpy(bytes, source.buffer + source.pos, count);
   }
   bool has(const Foreign& foreign) const {
-    const size_t length = std::strlen(foreign.bytes);
-    return count >= foreign.at + length && std::memcmp(bytes + foreign.at, foreign.bytes, length) == 0;
+    const size_t length = foreign.bytes.size();
+    return count >= foreign.at + length &&
+           std::memcmp(bytes + foreign.at, foreign.bytes.data(), length) == 0;
   }
 };
 

@@ -19,7 +19,8 @@ typedef struct TAVIRPELO_HINFO {
 
 /* Detects the format and fills `hinfo` (may be null) and the object's image size. Returns the format
  * code, 0 when unreadable or unknown: gTAVIRPELO_Error 1 (null object), 4 (memory), 5 (header
- * unreadable), or none for an unrecognised source. A code says nothing about whether the pixels decode. */
+ * unreadable), or none for an unrecognised source. A code says nothing about whether the pixels decode.
+ * Films and HEIC pictures pass for wireless bitmaps of no width: TAVIRPELO_LastError then names them. */
 TAVIRPELO_API int TAVIRPELO_Parser(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_HINFO* hinfo);
 
 /* One-call forms. Format code or 0; debug_PeloCodecError 15 for null arguments, 12 for size 0. */

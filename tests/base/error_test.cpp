@@ -60,6 +60,7 @@ TEST(Errors, FormatsThatAreNotReadHaveNames) {
     EXPECT_EQ(std::string(name) + ", which is not read", error.text);
   }
   EXPECT_EQ(TAVIRPELO_REASON_UNKNOWN_FORMAT, error_of_bytes("just text").reason);
+  EXPECT_EQ(TAVIRPELO_REASON_UNKNOWN_FORMAT, error_of_bytes("MMs are sweets").reason);
   EXPECT_EQ(TAVIRPELO_REASON_TRUNCATED, error_of_bytes("GIF89a").reason);
   EXPECT_STREQ("unknown error", TAVIRPELO_ErrorText(99));
 }
