@@ -1,11 +1,10 @@
 // Fitting into a number of bytes: never more than the target, from every kind of source, and the
 // arithmetic of gains, tables and scales.
-#include "codec/formats/jpeg/transform/transform_abi.h"
-#include "codec/formats/jpeg/transform/reencode.h"
-
 #include <cmath>
 
-#include "codec/formats/jpeg/transform/requantise.h"
+#include "codec/formats/jpeg/transform/coding_parameters.h"
+#include "codec/formats/jpeg/transform/transform.h"
+#include "codec/formats/jpeg/transform/transform_abi.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_samples.h"

@@ -2,7 +2,7 @@
 #include <cstring>
 
 #include "codec/base/os_memory.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::jpeg {

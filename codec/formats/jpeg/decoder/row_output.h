@@ -4,7 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "tavirpelo/api.h"
 
 typedef struct PELOJ_JDINFO PELOJ_JDINFO;
@@ -47,7 +47,7 @@ void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
 void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
                                const uint8_t* cr, int count);
 
-// Accumulator writers: `count` packed sums of four samples (codec/pixel/lanes.h).
+// Accumulator writers: `count` packed sums of four samples (codec/pixel/quad_sampler.h).
 void write_ycc_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
 void write_grey_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
 void write_rgb_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
