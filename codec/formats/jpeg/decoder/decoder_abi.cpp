@@ -272,3 +272,29 @@ int PELOJ_RotateImage270(void* buffer, int width, int height, int outFormat) {
 int PELOJ_DecodeUncompressThumbnail(void) {
   return 1;
 }
+
+// One member each, of one argument list.
+#define PELOJ_FORWARD_IDCT(name, ...)                                                              \
+  void name(const uint8_t*, const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, \
+            int column) {                                                                          \
+    jpeg::__VA_ARGS__(multiplier, block, rows, column);                                            \
+  }
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct8By8, idct8<8, 8>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct, idct8<8, 8>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct4By4, idct8<4, 4>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct3By3, idct8<3, 3>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2By2, idct8_corner)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2By2All, idct8<2, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2By1, idct8<2, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1By2, idct8<1, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1By1, idct8<1, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct4x4For4x4, idct4<4, 4>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct3x3For4x4, idct4<3, 3>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2x2For4x4, idct4_corner)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2x2AllFor4x4, idct4<2, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2x1For4x4, idct4<2, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1x2For4x4, idct4<1, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1x1For4x4, idct4<1, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct_2to1, idct_reduced4)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct_8to3, idct_reduced3)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct_4to1, idct_reduced2)

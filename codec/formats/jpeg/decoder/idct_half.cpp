@@ -10,6 +10,10 @@ namespace {
 // tan(pi/8), 8 fraction bits.
 constexpr int32_t kTan = 106;
 
+// In place. An output is at most 3.415 times the largest input: three of them and one by 106/256, less
+// than one for the rounding aside. Inputs are dequantised (at most 2^16), so that the first pass stays
+// below 3.42 * 2^16, its products with kTan in the second below 3.42 * 2^16 * 106 = 2^24.6, and the
+// results below 3.42^2 * 2^16 = 2^19.6.
 inline void transform4(int32_t (&x)[4]) {
   const int32_t t1 = scaled(x[1], kTan);
   const int32_t t3 = scaled(x[3], kTan);
@@ -23,8 +27,15 @@ inline void transform4(int32_t (&x)[4]) {
   x[3] = y3;
 }
 
-template <int Rows, int Columns>
-void transform_half(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+}  // namespace
+
+template <int Columns, int Rows>
+void idct4(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+  if constexpr (Columns == 1 && Rows == 1) {
+    const uint8_t sample = idct_dc(multiplier[0], block[0]);
+    for (int r = 0; r < 4; ++r) std::memset(rows[r] + column, sample, 4);
+    return;
+  }
   int32_t work[4][4] = {};  // by column, then row; unread columns stay zero
   for (int c = 0; c < Columns; ++c) {
     for (int r = 0; r < Rows; ++r) work[c][r] = dequantise(block[8 * r + c], multiplier[8 * r + c]);
@@ -37,48 +48,15 @@ void transform_half(const int32_t* multiplier, const int32_t* block, uint8_t* co
   }
 }
 
-}  // namespace
+template void idct4<4, 4>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct4<3, 3>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct4<2, 2>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct4<2, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct4<1, 2>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct4<1, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
 
-InverseDct idct_half(int lastPosition) {
-  if (lastPosition == 0) return PELOJ_DoIdct1x1For4x4;
-  if (lastPosition == 1) return PELOJ_DoIdct2x1For4x4;
-  if (lastPosition <= 3) return PELOJ_DoIdct2x2For4x4;
-  if (lastPosition <= 13) return PELOJ_DoIdct3x3For4x4;
-  return PELOJ_DoIdct4x4For4x4;
-}
+// Positions 3, 6, 9, 11 and 13 are read by a larger member only (see kFullIdct).
+constinit const IdctTable kHalfIdct = idct_table(
+    {{0, idct4<1, 1>}, {1, idct4<2, 1>}, {3, idct4_corner}, {13, idct4<3, 3>}, {63, idct4<4, 4>}});
 
 }  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-void PELOJ_DoIdct4x4For4x4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                           uint8_t* const* rows, int column) {
-  transform_half<4, 4>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct3x3For4x4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                           uint8_t* const* rows, int column) {
-  transform_half<3, 3>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct2x2AllFor4x4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                              uint8_t* const* rows, int column) {
-  transform_half<2, 2>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct2x1For4x4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                           uint8_t* const* rows, int column) {
-  transform_half<1, 2>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct1x2For4x4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                           uint8_t* const* rows, int column) {
-  transform_half<2, 1>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct2x2For4x4(const uint8_t* range, const int32_t* multiplier, const int32_t* block,
-                           uint8_t* const* rows, int column) {
-  const bool noHorizontal = block[1] == 0 && block[9] == 0;
-  (noHorizontal ? PELOJ_DoIdct1x2For4x4 : PELOJ_DoIdct2x2AllFor4x4)(range, multiplier, block, rows,
-                                                                    column);
-}
-void PELOJ_DoIdct1x1For4x4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                           uint8_t* const* rows, int column) {
-  const uint8_t sample = idct_dc(multiplier[0], block[0]);
-  for (int r = 0; r < 4; ++r) std::memset(rows[r] + column, sample, 4);
-}

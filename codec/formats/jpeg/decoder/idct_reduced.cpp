@@ -1,5 +1,10 @@
 // Reduced outputs of the 8-point transform: each keeps or averages some of the eight results. Column
 // results stay at full precision; only row results become samples.
+//
+// Why hostile coefficients do not overflow: a column's inputs are dequantised, at most D = 2^16. With
+// the constants written out, the odd part's b is 0.85 d1 - 0.24 d3, its c 0.57 d1 - 1.18 d3, and no
+// output of a column is more than the sum of its four inputs, 4 D. In a row the largest product is then
+// 473 times a difference of two such, 473 * 8 D = 2^27.9; sums of its terms stay below 64 D = 2^22.
 #include "codec/formats/jpeg/decoder/idct.h"
 #include "codec/formats/jpeg/decoder/idct_math.h"
 
@@ -74,12 +79,8 @@ inline void row_4to1(int32_t a, int32_t b, uint8_t* out) {
 }
 
 }  // namespace
-}  // namespace pelo::jpeg
 
-using namespace pelo::jpeg;
-
-void PELOJ_DoIdct_2to1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                       uint8_t* const* rows, int column) {
+void idct_reduced4(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
   int32_t work[4][4];
   for (int c = 0; c < 4; ++c) {
     int32_t d[4];
@@ -91,8 +92,7 @@ void PELOJ_DoIdct_2to1(const uint8_t*, const int32_t* multiplier, const int32_t*
   }
 }
 
-void PELOJ_DoIdct_8to3(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                       uint8_t* const* rows, int column) {
+void idct_reduced3(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
   int32_t work[3][3];
   for (int c = 0; c < 3; ++c) {
     int32_t d[4];
@@ -102,8 +102,7 @@ void PELOJ_DoIdct_8to3(const uint8_t*, const int32_t* multiplier, const int32_t*
   for (int r = 0; r < 3; ++r) row_8to3(work[0][r], work[1][r], work[2][r], rows[r] + column);
 }
 
-void PELOJ_DoIdct_4to1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                       uint8_t* const* rows, int column) {
+void idct_reduced2(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
   int32_t top[2], bottom[2];
   for (int c = 0; c < 2; ++c) {
     const int32_t d0 = dequantise(block[c], multiplier[c]);
@@ -114,3 +113,5 @@ void PELOJ_DoIdct_4to1(const uint8_t*, const int32_t* multiplier, const int32_t*
   row_4to1(top[0], top[1], rows[0] + column);
   row_4to1(bottom[0], bottom[1], rows[1] + column);
 }
+
+}  // namespace pelo::jpeg

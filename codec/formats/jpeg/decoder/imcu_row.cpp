@@ -13,19 +13,19 @@ namespace {
 // Everything that a scale changes.
 struct FullSize {
   static constexpr int kBlock = 8;
-  static InverseDct transform(int lastPosition) { return idct_full(lastPosition); }
+  static InverseDct transform(int lastPosition) { return kFullIdct[static_cast<size_t>(lastPosition)]; }
 };
 struct HalfSize {
   static constexpr int kBlock = 4;
-  static InverseDct transform(int lastPosition) { return idct_half(lastPosition); }
+  static InverseDct transform(int lastPosition) { return kHalfIdct[static_cast<size_t>(lastPosition)]; }
 };
 struct ThreeEighthsSize {
   static constexpr int kBlock = 3;
-  static InverseDct transform(int) { return PELOJ_DoIdct_8to3; }
+  static InverseDct transform(int) { return idct_reduced3; }
 };
 struct QuarterSize {
   static constexpr int kBlock = 2;
-  static InverseDct transform(int) { return PELOJ_DoIdct_4to1; }
+  static InverseDct transform(int) { return idct_reduced2; }
 };
 struct EighthSize {
   static constexpr int kBlock = 1;
@@ -37,7 +37,7 @@ void transform_block(const Component& component, const int32_t* block, int lastP
   if constexpr (Size::kBlock == 1) {
     rows[0][column] = idct_dc(component.multiplier[0], block[0]);
   } else {
-    Size::transform(lastPosition)(nullptr, component.multiplier.data(), block, rows, column);
+    Size::transform(lastPosition)(component.multiplier.data(), block, rows, column);
   }
 }
 

@@ -70,7 +70,7 @@ void transform_row(PELOJ_JDINFO& jd, const Component& component, InverseDct tran
   for (int y = 0; y < component.v && jd.progress.imcuRow * component.v + y < component.blocksHigh; ++y) {
     uint8_t* const* rows = component.samples.get() + y * size;
     for (int x = 0; x < component.blocksWide; ++x) {
-      transform(nullptr, component.multiplier.data(), stored_block(jd, component, y, x), rows, x * size);
+      transform(component.multiplier.data(), stored_block(jd, component, y, x), rows, x * size);
     }
   }
 }
@@ -100,9 +100,9 @@ int decode_progressive_row(PELOJ_JDINFO* jdInfo) {
 }
 
 int transform_stored_row(PELOJ_JDINFO* jdInfo) {
-  const InverseDct transform = jdInfo->sizes.scale == kFull   ? PELOJ_DoIdct
-                               : jdInfo->sizes.scale == kHalf ? PELOJ_DoIdct_2to1
-                                                              : PELOJ_DoIdct_4to1;
+  const InverseDct transform = jdInfo->sizes.scale == kFull   ? idct8<8, 8>
+                               : jdInfo->sizes.scale == kHalf ? idct_reduced4
+                                                              : idct_reduced2;
   for (int c = 0; c < jdInfo->frame.componentCount; ++c) {
     transform_row(*jdInfo, (*jdInfo->frame.components)[static_cast<size_t>(c)], transform);
   }
