@@ -88,8 +88,8 @@ bool decode_scan_row(PELOJ_JDINFO& jd, DecodeMcu decode) {
 // The same of every listed scan.
 template <class Size>
 bool decode_scan_rows(PELOJ_JDINFO& jd, DecodeMcu decode) {
-  for (size_t i = 0; i < jd.scanCount; ++i) {
-    ScanRecord* record = jd.scans[i].get();
+  for (size_t i = 0; i < jd.scans.count; ++i) {
+    ScanRecord* record = jd.scans.records[i].get();
     if (!load_scan(&jd, record) || !decode_scan_row<Size>(jd, decode)) return false;
     save_scan(&jd, record);
   }
@@ -99,7 +99,7 @@ bool decode_scan_rows(PELOJ_JDINFO& jd, DecodeMcu decode) {
 template <class Size>
 int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
   const bool decoded =
-      jd.scanCount > 0 ? decode_scan_rows<Size>(jd, decode) : decode_scan_row<Size>(jd, decode);
+      jd.scans.count > 0 ? decode_scan_rows<Size>(jd, decode) : decode_scan_row<Size>(jd, decode);
   if (!decoded) {
     if (jd.sizes.used.height - jd.progress.rowsDone < 16) return PELOJ_IMAGE_DONE;
     log_error(failure);

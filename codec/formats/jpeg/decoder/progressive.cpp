@@ -23,7 +23,7 @@ size_t stored_blocks_wide(const PELOJ_JDINFO& jd, const Component& component) {
 int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int column) {
   const size_t block =
       static_cast<size_t>(row) * stored_blocks_wide(jd, component) + static_cast<size_t>(column);
-  return jd.rowCoefficients[component.index].data() + 64 * block;
+  return jd.scans.coefficients[component.index].data() + 64 * block;
 }
 
 bool allocate_store(PELOJ_JDINFO& jd) {
@@ -31,7 +31,7 @@ bool allocate_store(PELOJ_JDINFO& jd) {
     const auto index = static_cast<size_t>(c);
     const Component& component = (*jd.frame.components)[index];
     const size_t blocks = stored_blocks_wide(jd, component) * component.v;
-    if (!jd.rowCoefficients[index].allocate(blocks * 64)) return false;
+    if (!jd.scans.coefficients[index].allocate(blocks * 64)) return false;
   }
   return true;
 }
@@ -78,11 +78,11 @@ void transform_row(PELOJ_JDINFO& jd, const Component& component, InverseDct tran
 }  // namespace
 
 int decode_coefficient_row(PELOJ_JDINFO& jd) {
-  for (OsBuffer<int32_t>& plane : jd.rowCoefficients) {
+  for (OsBuffer<int32_t>& plane : jd.scans.coefficients) {
     if (plane) os_memset(plane.data(), 0, plane.size() * sizeof(int32_t));
   }
-  for (size_t i = 0; i < jd.scanCount; ++i) {
-    ScanRecord* record = jd.scans[i].get();
+  for (size_t i = 0; i < jd.scans.count; ++i) {
+    ScanRecord* record = jd.scans.records[i].get();
     if (!load_scan(&jd, record)) continue;
     if (!decode_scan_row(jd)) {
       if (jd.sizes.used.height - jd.progress.rowsDone < 16) return PELOJ_IMAGE_DONE;

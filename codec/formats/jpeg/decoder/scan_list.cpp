@@ -81,17 +81,17 @@ int list_scans(PELOJ_JDINFO& jd) {
     return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
   }
   Coverage coverage;
-  while (jd.scanCount < kMaxScans) {
-    if (make_scan_record(&jd, &jd.scans[jd.scanCount]) != PELOJ_OK) {
+  while (jd.scans.count < kMaxScans) {
+    if (make_scan_record(&jd, &jd.scans.records[jd.scans.count]) != PELOJ_OK) {
       return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
     }
-    ++jd.scanCount;
+    ++jd.scans.count;
     coverage.add_scan(jd);
     if (coverage.all(jd.frame.componentCount) || !find_scan(jd, coverage)) break;
     if (prepare_scan(jd) != PELOJ_OK) return PELOJ_FAIL;
   }
   // What the state says of a sequential picture's scan stays that of the first one.
-  if (is_progressive(jd) || load_scan(&jd, jd.scans[0].get())) return PELOJ_OK;
+  if (is_progressive(jd) || load_scan(&jd, jd.scans.records[0].get())) return PELOJ_OK;
   return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitDecBeforeScan fail");
 }
 
@@ -99,14 +99,7 @@ int make_scan_record(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
   *slot = os_new<ScanRecord>();
   if (!*slot) return PELOJ_FAIL;
   ScanRecord& record = **slot;
-  record.componentCount = jdInfo->scan.componentCount;
-  record.components = jdInfo->scan.components;
-  record.lastComponent = jdInfo->scan.lastComponent;
-  record.ss = jdInfo->scan.ss;
-  record.se = jdInfo->scan.se;
-  record.ah = jdInfo->scan.ah;
-  record.al = jdInfo->scan.al;
-  record.restartInterval = jdInfo->scan.restartInterval;
+  record.header = jdInfo->scan;
   jdInfo->entropy.eobRun = 0;
   save_scan(jdInfo, &record);
   return PELOJ_OK;
@@ -122,14 +115,7 @@ void save_scan(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
 
 int load_scan(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
   if (!source_reposition(*jdInfo->source, record->sourcePosition)) return 0;
-  jdInfo->scan.componentCount = record->componentCount;
-  jdInfo->scan.components = record->components;
-  jdInfo->scan.lastComponent = record->lastComponent;
-  jdInfo->scan.ss = record->ss;
-  jdInfo->scan.se = record->se;
-  jdInfo->scan.ah = record->ah;
-  jdInfo->scan.al = record->al;
-  jdInfo->scan.restartInterval = record->restartInterval;
+  static_cast<ScanHeader&>(jdInfo->scan) = record->header;
   *jdInfo->entropy.state = record->entropy;
   jdInfo->entropy.eobRun = record->eobRun;
   jdInfo->marker->nextRestart = record->nextRestart;

@@ -29,7 +29,7 @@ inline bool stores_coefficients(const PELOJ_JDINFO& jd) {
 // True when a row takes more than the scan that the header ends with.
 inline bool needs_all_scans(const PELOJ_JDINFO& jd) {
   if (is_progressive(jd)) return stores_coefficients(jd);
-  return jd.scanCount > 0 || jd.scan.componentCount < jd.frame.componentCount;
+  return jd.scans.count > 0 || jd.scan.componentCount < jd.frame.componentCount;
 }
 
 // Lists the scans from the first one, which the decoder has just prepared, as far as the scale can show
