@@ -10,7 +10,7 @@ namespace {
 // The next source byte, reading another block when the window is used up; -1 when there is none.
 int next_byte(BitReader& reader) {
   if (reader.next == reader.end) {
-    PELOJ_SOURCE& source = *reader.jd->source;
+    PELOJ_SOURCE& source = *reader.source;
     const int count = read_io(source.io, source.buffer, static_cast<int>(kSourceBufferSize));
     if (count <= 0) return -1;
     source.consumed += static_cast<uint32_t>(count);
@@ -27,14 +27,15 @@ int next_data_byte(BitReader& reader) {
   while (code == 0xFF) code = next_byte(reader);
   if (code == 0) return 0xFF;
   if (code > 0) {
-    reader.jd->entropy.unreadMarker = static_cast<uint8_t>(code);
+    reader.entropy->unreadMarker = static_cast<uint8_t>(code);
   } else {
-    meet_end(*reader.jd);
+    meet_end(*reader.entropy);
   }
   return -1;
 }
 
-// Zeros behind the data, counted as invented.
+// Zeros behind the data, counted as invented. One less than fit in: the shift stays below the width even
+// when nothing is held.
 void pad(BitState& state) {
   const int zeros = kBitBufferSize - 1 - state.left;
   state.bits <<= zeros;
@@ -57,14 +58,14 @@ uint32_t match_code(BitReader& reader, const DerivedTable& table, int length) {
 
 }  // namespace
 
-void meet_end(PELOJ_JDINFO& jd) {
-  if (jd.entropy.endIsMarker) jd.entropy.unreadMarker = static_cast<uint8_t>(Marker::kEoi);
+void meet_end(Entropy& entropy) {
+  if (entropy.endIsMarker) entropy.unreadMarker = static_cast<uint8_t>(Marker::kEoi);
 }
 
 BitReader fill_by_bytes(BitReader reader) {
   BitState& state = reader.state;
   while (state.left <= kBitBufferSize - 8) {
-    const int byte = reader.jd->entropy.unreadMarker == 0 ? next_data_byte(reader) : -1;
+    const int byte = reader.entropy->unreadMarker == 0 ? next_data_byte(reader) : -1;
     if (byte < 0) {
       reader.plainEnd = reader.next;
       pad(state);
@@ -81,16 +82,17 @@ uint32_t decode_long_code(BitReader& reader, const DerivedTable& table) {
   return match_code(reader, table, kLookBits + 1);
 }
 
-BitReader open_bits(PELOJ_JDINFO& jd) {
-  const uint8_t* next = jd.source->buffer + jd.source->pos;
-  const uint8_t* end = next + jd.source->avail;
-  return {jd.entropy.state->bits, next, end, jd.entropy.unreadMarker == 0 ? end : next, &jd};
+BitReader open_bits(PELOJ_SOURCE& source, Entropy& entropy) {
+  const uint8_t* next = source.buffer + source.pos;
+  const uint8_t* end = next + source.avail;
+  const uint8_t* plainEnd = entropy.unreadMarker == 0 ? end : next;
+  return {entropy.state->bits, next, end, plainEnd, &source, &entropy};
 }
 
-void close_bits(PELOJ_JDINFO& jd, const BitReader& reader) {
-  jd.entropy.state->bits = reader.state;
-  jd.source->pos = static_cast<uint32_t>(reader.next - jd.source->buffer);
-  jd.source->avail = static_cast<uint32_t>(reader.end - reader.next);
+void close_bits(const BitReader& reader) {
+  reader.entropy->state->bits = reader.state;
+  reader.source->pos = static_cast<uint32_t>(reader.next - reader.source->buffer);
+  reader.source->avail = static_cast<uint32_t>(reader.end - reader.next);
 }
 
 int refill_bits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
@@ -99,7 +101,7 @@ int refill_bits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
   *reader = fill_by_bytes(*reader);
   const int real = reader->state.left - reader->state.invented;
   if (real >= needed) return 1;
-  return reader->jd->entropy.unreadMarker != 0 ? 1 : 0;
+  return reader->entropy->unreadMarker != 0 ? 1 : 0;
 }
 
 int decode_code(BitReader* reader, BitBuffer buffer, int bitsLeft, const DerivedTable* derived,

@@ -22,11 +22,12 @@ void enlarge_grey(PELOJ_JDINFO* jdInfo, int rows);
 void average_rgb(PELOJ_JDINFO* jdInfo, int rows);
 void enlarge_rgb(PELOJ_JDINFO* jdInfo, int rows);
 
-// Picks the converter of the state's colour space, sizes and decode mode; false for a colour space that
-// has none.
-[[nodiscard]] bool choose_converter(PELOJ_JDINFO& jd);
+// Picks the converter of a colour space, sizes and a decode mode; false for a colour space that has
+// none.
+[[nodiscard]] bool choose_converter(ColourSpace colourSpace, const Sizes& sizes, int decMode,
+                                    Resampling& resampling);
 
 // Makes the column table that the chosen converter needs, and room for its sums.
-[[nodiscard]] bool prepare_resampling(PELOJ_JDINFO& jd);
+[[nodiscard]] bool prepare_resampling(const Sizes& sizes, Resampling& resampling);
 
 }  // namespace pelo::jpeg

@@ -19,11 +19,11 @@ bool much_finer_than_reference(const QuantTable& table, const Component& first) 
   return false;
 }
 
-void set_multipliers(const PELOJ_JDINFO& jd, const QuantTable& table, Component& component) {
+void set_multipliers(Scale scale, const QuantTable& table, Component& component) {
   // The 4-point table belongs to scale 1/2 whatever the frame type, although progressive pictures run an
   // 8-point member there: their detail loses a tenth of its contrast, which is how they have always been
   // shown.
-  const auto& factors = jd.sizes.scale == kHalf ? kFourPointScale : kAanScale;
+  const auto& factors = scale == kHalf ? kFourPointScale : kAanScale;
   for (size_t k = 0; k < 64; ++k) component.multiplier[k] = table.value[k] * factors[k] >> 2;
 }
 
@@ -42,22 +42,22 @@ void set_requantising(QuantTable& table, Component& component) {
 
 }  // namespace
 
-QuantTable* quant_table(const PELOJ_JDINFO& jd, const Component& component) {
+QuantTable* quant_table(const Tables& tables, const Component& component) {
   if (component.table != nullptr) return component.table;
-  return component.quantTable < 4 ? jd.tables.quant[component.quantTable].get() : nullptr;
+  return component.quantTable < 4 ? tables.quant[component.quantTable].get() : nullptr;
 }
 
 bool prepare_multipliers(PELOJ_JDINFO& jd) {
   const bool sequential = !is_progressive(jd);
   for (int i = 0; sequential && i < jd.scan.componentCount; ++i) {
     Component& component = *jd.scan.components[static_cast<size_t>(i)];
-    component.table = quant_table(jd, component);
+    component.table = quant_table(jd.tables, component);
   }
   std::array<QuantTable*, kMaxComponents> tables{};
   for (size_t c = 0; c < static_cast<size_t>(jd.frame.componentCount); ++c) {
     const Component& component = (*jd.frame.components)[c];
     // Tables of sequential components may still come, in front of their scans.
-    tables[c] = sequential ? component.table : quant_table(jd, component);
+    tables[c] = sequential ? component.table : quant_table(jd.tables, component);
     if (tables[c] == nullptr && !sequential) return false;
   }
   jd.entropy.requantise = jd.decMode == 1 && tables[0] != nullptr &&
@@ -66,7 +66,7 @@ bool prepare_multipliers(PELOJ_JDINFO& jd) {
   for (size_t c = 0; c < static_cast<size_t>(jd.frame.componentCount); ++c) {
     if (tables[c] == nullptr) continue;
     Component& component = (*jd.frame.components)[c];
-    set_multipliers(jd, *tables[c], component);
+    set_multipliers(jd.sizes.scale, *tables[c], component);
     if (requantise) set_requantising(*tables[c], component);
   }
   return true;

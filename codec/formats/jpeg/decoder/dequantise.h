@@ -7,7 +7,7 @@ namespace pelo::jpeg {
 
 // The component's table: in sequential pictures that of its scan, in progressive ones the latest. Null
 // for none.
-QuantTable* quant_table(const PELOJ_JDINFO& jd, const Component& component);
+QuantTable* quant_table(const Tables& tables, const Component& component);
 
 // Sets the requantisation flag (decode mode 1 only) and the multipliers of the scans so far. False when
 // a quantisation table is missing.

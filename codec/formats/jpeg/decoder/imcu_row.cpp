@@ -44,15 +44,16 @@ void transform_block(const Component& component, const int32_t* block, int lastP
 // Transforms the MCU's blocks of one component, but for those beyond the picture's last column and row.
 // Returns the index of the next component's first block.
 template <class Size>
-int transform_component(PELOJ_JDINFO& jd, const Component& component, int block, int mcu, int blockRow) {
-  const int wide = mcu == jd.scan.mcusPerRow - 1 ? component.lastColumnWidth : component.mcuWidth;
-  const int firstRow = jd.progress.imcuRow * component.v + blockRow;
+int transform_component(const Entropy& entropy, const Component& component, int block, int mcu,
+                        bool lastColumn, int imcuRow, int blockRow) {
+  const int wide = lastColumn ? component.lastColumnWidth : component.mcuWidth;
+  const int firstRow = imcuRow * component.v + blockRow;
   for (int y = 0; y < component.mcuHeight; ++y) {
     if (firstRow + y >= component.blocksHigh) break;
     uint8_t* const* rows = component.samples.get() + (blockRow + y) * Size::kBlock;
     for (int x = 0; x < wide; ++x) {
       const auto b = static_cast<size_t>(block + y * component.mcuWidth + x);
-      transform_block<Size>(component, jd.entropy.blocks[b], jd.entropy.lastPosition[b], rows,
+      transform_block<Size>(component, entropy.blocks[b], entropy.lastPosition[b], rows,
                             (mcu * component.mcuWidth + x) * Size::kBlock);
     }
   }
@@ -60,11 +61,12 @@ int transform_component(PELOJ_JDINFO& jd, const Component& component, int block,
 }
 
 template <class Size>
-void transform_mcu(PELOJ_JDINFO& jd, int mcu, int blockRow) {
+void transform_mcu(const Scan& scan, const Entropy& entropy, int mcu, int imcuRow, int blockRow) {
   int block = 0;
-  for (int i = 0; i < jd.scan.componentCount; ++i) {
-    const Component& component = *jd.scan.components[static_cast<size_t>(i)];
-    block = transform_component<Size>(jd, component, block, mcu, blockRow);
+  const bool lastColumn = mcu == scan.mcusPerRow - 1;
+  for (int i = 0; i < scan.componentCount; ++i) {
+    const Component& component = *scan.components[static_cast<size_t>(i)];
+    block = transform_component<Size>(entropy, component, block, mcu, lastColumn, imcuRow, blockRow);
   }
 }
 
@@ -79,7 +81,7 @@ bool decode_scan_row(PELOJ_JDINFO& jd, DecodeMcu decode) {
       os_memset(jd.entropy.coefficients.data(), 0, used);
       jd.entropy.lastPosition = {};
       if (!decode(&jd, jd.entropy.blocks.data())) return false;
-      transform_mcu<Size>(jd, mcu, blockRow);
+      transform_mcu<Size>(jd.scan, jd.entropy, mcu, jd.progress.imcuRow, blockRow);
     }
   }
   return true;
@@ -106,11 +108,12 @@ int decode_imcu_row(PELOJ_JDINFO& jd, DecodeMcu decode, const char* failure) {
     return PELOJ_ROW_FAIL;
   }
   if (++jd.progress.imcuRow >= jd.progress.imcuRows) return PELOJ_IMAGE_DONE;
-  begin_imcu_row(&jd);
+  begin_imcu_row(jd.scan, jd.progress.imcuRow);
   return PELOJ_ROW_DONE;
 }
 
 }  // namespace
+
 int decode_imcu_row(PELOJ_JDINFO* jdInfo) {
   return decode_imcu_row<FullSize>(*jdInfo,
                                    jdInfo->entropy.requantise ? decode_mcu_requantised : decode_mcu_full,

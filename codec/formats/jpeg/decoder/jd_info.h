@@ -55,13 +55,14 @@ struct Component {
   int scaledWidth;                          // downsampled width at the decode scale
   int mcuWidth, mcuHeight, mcuBlocks;       // blocks of one MCU of the current scan
   int lastColumnWidth, lastRowHeight;       // blocks of the last MCU inside the picture
-  uint8_t hExpand, vExpand;                 // replication to the full grid
-  void (*upsample)(PELOJ_JDINFO*, Component*, uint8_t**, uint8_t***);
-  QuantTable* table;                   // sequential: the one that its scan found
-  std::array<int32_t, 64> multiplier;  // dequantisation, natural order
-  SampleRows samples;                  // one iMCU row
-  SampleRows colour;                   // replicated rows; empty when the samples are used as they are
-  uint8_t* colourRows[kMaxSampling];   // the current row group on the full grid
+  uint8_t hExpand, vExpand;                 // replication to the full grid; 1 and 1: none
+  QuantTable* table;                        // sequential: the one that its scan found
+  std::array<int32_t, 64> multiplier;       // dequantisation, natural order
+  SampleRows samples;                       // one iMCU row
+  SampleRows colour;                  // replicated rows; empty when the samples are used as they are
+  uint8_t* colourRows[kMaxSampling];  // the current row group on the full grid
+
+  bool on_full_grid() const { return hExpand == 1 && vExpand == 1; }
 };
 
 struct MarkerRecord {
@@ -185,7 +186,7 @@ struct Entropy {
 constexpr size_t kMaxScans = 30;
 struct ScanList {
   std::array<OsPtr<ScanRecord>, kMaxScans> records;
-  size_t count;                                                 // 0 while the header's scan alone is read
+  size_t count;                                                // 0 while the header's scan alone is read
   std::array<OsBuffer<int32_t>, kMaxComponents> coefficients;  // one iMCU row, 64 a block
 };
 

@@ -285,7 +285,7 @@ int parse_to_scan(PELOJ_JDINFO* jdInfo, int* status) {
   return code;
 }
 
-int parse_header(PELOJ_JDINFO* jdInfo, int) {
+int parse_header(PELOJ_JDINFO* jdInfo) {
   if (parse_header(*jdInfo)) return PELOJ_OK;
   refuse(Reason::kDamaged, kStage);
   clear_decoder(jdInfo);

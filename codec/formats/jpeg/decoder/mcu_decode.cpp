@@ -108,7 +108,7 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
   int result;
   if (!begin_mcu(jd, result)) return result;
   EntropyState& entropy = *jd.entropy.state;
-  BitReader reader = open_bits(jd);
+  BitReader reader = open_bits(*jd.source, jd.entropy);
   for (size_t i = 0; i < static_cast<size_t>(jd.scan.mcuBlocks); ++i) {
     const size_t scanIndex = jd.scan.blockComponent[i];
     const int32_t dc = decode_dc(reader, *entropy.blockDc[i], entropy.lastDc[scanIndex]);
@@ -116,7 +116,7 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
 
     BlockContext context{*entropy.blockAc[i], entropy.blockSkip[i], nullptr, jd.scan.se};
     if constexpr (Member::kRequantise) {
-      context.correction = quant_table(jd, *jd.scan.components[scanIndex])->correction.data();
+      context.correction = quant_table(jd.tables, *jd.scan.components[scanIndex])->correction.data();
     }
     int last = 0;
     int k = jd.scan.ss + 1;
@@ -126,7 +126,7 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
     if constexpr (!Member::kWhole) skip_rest(reader, context, k - 1);
     jd.entropy.lastPosition[i] = static_cast<uint8_t>(last < 63 ? last : 63);
   }
-  return end_mcu(jd, reader);
+  return end_mcu(reader);
 }
 
 }  // namespace

@@ -17,8 +17,9 @@ int decode_mcu_quarter(PELOJ_JDINFO* jdInfo, int32_t* const* blocks);        // 
 int decode_mcu_dc(PELOJ_JDINFO* jdInfo, int32_t* const* blocks);             // DC alone
 
 // Synchronises with the next RSTn (T.81 F.2.2.4): drops the bits held, looks for a marker unless one is
-// pending, resets the predictors. A marker with another number stays pending. 1, or 0 at the end of the
-// source.
-int process_restart(PELOJ_JDINFO* jdInfo);
+// pending, resets the predictors. A marker with another number stays pending. `interval`: MCUs up to the
+// next one. False at the end of the source.
+[[nodiscard]] bool process_restart(PELOJ_SOURCE& source, Entropy& entropy, MarkerRecord& marker,
+                                   int interval);
 
 }  // namespace pelo::jpeg

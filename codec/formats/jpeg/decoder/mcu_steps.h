@@ -23,7 +23,8 @@ inline int32_t decode_dc(BitReader& reader, const DerivedTable& table, uint32_t&
 // True when the MCU is to be decoded; otherwise `result` answers for it.
 inline bool begin_mcu(PELOJ_JDINFO& jd, int& result) {
   EntropyState& entropy = *jd.entropy.state;
-  if (jd.scan.restartInterval != 0 && entropy.restartsToGo == 0 && !process_restart(&jd)) {
+  if (jd.scan.restartInterval != 0 && entropy.restartsToGo == 0 &&
+      !process_restart(*jd.source, jd.entropy, *jd.marker, jd.scan.restartInterval)) {
     result = 0;
     return false;
   }
@@ -34,12 +35,13 @@ inline bool begin_mcu(PELOJ_JDINFO& jd, int& result) {
 }
 
 // Gives the window back and looks once at what the reader had to invent.
-inline int end_mcu(PELOJ_JDINFO& jd, const BitReader& reader) {
-  close_bits(jd, reader);
-  --jd.entropy.state->restartsToGo;
+inline int end_mcu(const BitReader& reader) {
+  close_bits(reader);
+  Entropy& entropy = *reader.entropy;
+  --entropy.state->restartsToGo;
   if (reader.state.left >= reader.state.invented) return 1;
-  if (jd.entropy.unreadMarker == 0) return 0;  // the source ended
-  jd.entropy.state->insufficient = 1;
+  if (entropy.unreadMarker == 0) return 0;  // the source ended
+  entropy.state->insufficient = 1;
   return 1;
 }
 

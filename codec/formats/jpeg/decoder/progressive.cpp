@@ -13,25 +13,24 @@ namespace {
 
 // Blocks of a component in one row of the coefficient store: whole MCUs of the frame, whatever the
 // current scan's are.
-size_t stored_blocks_wide(const PELOJ_JDINFO& jd, const Component& component) {
-  const int mcus = jd.frame.mcus_across();
-  return static_cast<size_t>(mcus) * component.h;
+size_t stored_blocks_wide(const Frame& frame, const Component& component) {
+  return static_cast<size_t>(frame.mcus_across()) * component.h;
 }
 
 }  // namespace
 
 int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int column) {
   const size_t block =
-      static_cast<size_t>(row) * stored_blocks_wide(jd, component) + static_cast<size_t>(column);
+      static_cast<size_t>(row) * stored_blocks_wide(jd.frame, component) + static_cast<size_t>(column);
   return jd.scans.coefficients[component.index].data() + 64 * block;
 }
 
-bool allocate_store(PELOJ_JDINFO& jd) {
-  for (int c = 0; c < jd.frame.componentCount; ++c) {
+bool allocate_store(const Frame& frame, ScanList& scans) {
+  for (int c = 0; c < frame.componentCount; ++c) {
     const auto index = static_cast<size_t>(c);
-    const Component& component = (*jd.frame.components)[index];
-    const size_t blocks = stored_blocks_wide(jd, component) * component.v;
-    if (!jd.scans.coefficients[index].allocate(blocks * 64)) return false;
+    const Component& component = (*frame.components)[index];
+    const size_t blocks = stored_blocks_wide(frame, component) * component.v;
+    if (!scans.coefficients[index].allocate(blocks * 64)) return false;
   }
   return true;
 }

@@ -23,7 +23,7 @@ inline bool first_scan_suffices(const PELOJ_JDINFO& jd) {
 }
 
 // Memory for one iMCU row of coefficients.
-[[nodiscard]] bool allocate_store(PELOJ_JDINFO& jd);
+[[nodiscard]] bool allocate_store(const Frame& frame, ScanList& scans);
 
 // All scans of the next iMCU row into the coefficient store, without its transform; the caller moves
 // jd.progress.imcuRow on. 100; 102 when a scan's data fail, or 101 when they do so within the picture's

@@ -6,9 +6,7 @@ namespace pelo::jpeg {
 namespace {
 
 // Reads up to the next marker, which becomes the unread one. False at the end of the source.
-bool scan_for_marker(PELOJ_JDINFO& jd) {
-  PELOJ_SOURCE& source = *jd.source;
-  MarkerRecord& marker = *jd.marker;
+bool scan_for_marker(PELOJ_SOURCE& source, Entropy& entropy, MarkerRecord& marker) {
   while (source_need(source, 1)) {
     if (*source_take(source, 1) != 0xFF) {
       marker.discardedBytes++;
@@ -20,7 +18,7 @@ bool scan_for_marker(PELOJ_JDINFO& jd) {
       code = *source_take(source, 1);
     } while (code == 0xFF);
     if (code != 0) {
-      jd.entropy.unreadMarker = code;
+      entropy.unreadMarker = code;
       return true;
     }
     marker.discardedBytes += 2;
@@ -30,24 +28,23 @@ bool scan_for_marker(PELOJ_JDINFO& jd) {
 
 }  // namespace
 
-int process_restart(PELOJ_JDINFO* jdInfo) {
-  EntropyState& entropy = *jdInfo->entropy.state;
-  MarkerRecord& marker = *jdInfo->marker;
-  const int real = entropy.bits.left - entropy.bits.invented;
+bool process_restart(PELOJ_SOURCE& source, Entropy& entropy, MarkerRecord& marker, int interval) {
+  EntropyState& state = *entropy.state;
+  const int real = state.bits.left - state.bits.invented;
   if (real > 0) marker.discardedBytes += real / 8;
-  entropy.bits = {};
+  state.bits = {};
 
-  if (jdInfo->entropy.unreadMarker == 0 && !scan_for_marker(*jdInfo)) {
-    meet_end(*jdInfo);
-    if (jdInfo->entropy.unreadMarker == 0) return 0;
+  if (entropy.unreadMarker == 0 && !scan_for_marker(source, entropy, marker)) {
+    meet_end(entropy);
+    if (entropy.unreadMarker == 0) return false;
   }
-  if (jdInfo->entropy.unreadMarker == restart_code(marker.nextRestart)) jdInfo->entropy.unreadMarker = 0;
+  if (entropy.unreadMarker == restart_code(marker.nextRestart)) entropy.unreadMarker = 0;
   marker.nextRestart = (marker.nextRestart + 1) & 7;
-  entropy.lastDc = {};
-  jdInfo->entropy.eobRun = 0;
-  entropy.restartsToGo = static_cast<uint32_t>(jdInfo->scan.restartInterval);
-  if (jdInfo->entropy.unreadMarker == 0) entropy.insufficient = 0;
-  return 1;
+  state.lastDc = {};
+  entropy.eobRun = 0;
+  state.restartsToGo = static_cast<uint32_t>(interval);
+  if (entropy.unreadMarker == 0) state.insufficient = 0;
+  return true;
 }
 
 }  // namespace pelo::jpeg

@@ -113,8 +113,7 @@ void store_planar(const RowOutput& output, const Run& in, int begin, int count) 
 
 // Delivers one row: the only place that counts and bounds output rows.
 template <class Model, class Source>
-void emit_row(PELOJ_JDINFO& jd, const Source& source, int count) {
-  RowOutput& output = jd.output;
+void emit_row(RowOutput& output, const Source& source, int count) {
   const bool writes = output.plane[0] != nullptr && (!output.planar || Model::kPlanar);
   if (output.emitted >= output.bandEnd) return;
   RunBuffer samples, colours;
@@ -194,33 +193,28 @@ void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows) {
   output.rowStep = static_cast<ptrdiff_t>(int64_t{jd.sizes.buffer.width} * size);
 }
 
-void write_ycc_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
+void write_ycc_row(RowOutput& output, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
                    int count) {
-  emit_row<YccModel>(*jdInfo, RowSource{{y, cb, cr}}, count);
+  emit_row<YccModel>(output, RowSource{{y, cb, cr}}, count);
 }
-void write_grey_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count) {
-  emit_row<GreyModel>(*jdInfo, RowSource{{y, y, y}}, count);
+void write_grey_row(RowOutput& output, const uint8_t* y, int count) {
+  emit_row<GreyModel>(output, RowSource{{y, y, y}}, count);
 }
-void write_rgb_row(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, const uint8_t* b,
-                   int count) {
-  emit_row<RgbModel>(*jdInfo, RowSource{{r, g, b}}, count);
+void write_rgb_row(RowOutput& output, const uint8_t* r, const uint8_t* g, const uint8_t* b, int count) {
+  emit_row<RgbModel>(output, RowSource{{r, g, b}}, count);
 }
-void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
-                      int count) {
-  emit_row<YccModel>(*jdInfo, ColumnSource{{y, cb, cr}, jdInfo->resampling.centres.data()}, count);
+void write_picked_row(RowOutput& output, const uint16_t* columns, const uint8_t* y, const uint8_t* cb,
+                      const uint8_t* cr, int count) {
+  emit_row<YccModel>(output, ColumnSource{{y, cb, cr}, columns}, count);
 }
-void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                               const uint8_t* cr, int count) {
-  write_picked_row(jdInfo, y, cb, cr, count);
+void write_ycc_sums(RowOutput& output, const uint32_t* sums, int count) {
+  emit_row<YccModel>(output, SumSource{sums}, count);
 }
-void write_ycc_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  emit_row<YccModel>(*jdInfo, SumSource{sums}, count);
+void write_grey_sums(RowOutput& output, const uint32_t* sums, int count) {
+  emit_row<GreyModel>(output, SumSource{sums}, count);
 }
-void write_grey_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  emit_row<GreyModel>(*jdInfo, SumSource{sums}, count);
-}
-void write_rgb_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  emit_row<RgbModel>(*jdInfo, SumSource{sums}, count);
+void write_rgb_sums(RowOutput& output, const uint32_t* sums, int count) {
+  emit_row<RgbModel>(output, SumSource{sums}, count);
 }
 
 }  // namespace pelo::jpeg

@@ -24,7 +24,7 @@ class Coverage {
   // transform reads of a component whose band reached far enough.
   void add_scan(const PELOJ_JDINFO& jd) {
     if (!is_progressive(jd)) {
-      for (int i = 0; i < jd.scan.componentCount; ++i) complete(i, jd) = true;
+      for (int i = 0; i < jd.scan.componentCount; ++i) complete(i, jd.scan) = true;
       return;
     }
     const bool enough =
@@ -35,7 +35,7 @@ class Coverage {
   bool gains(const PELOJ_JDINFO& jd) {
     if (is_progressive(jd)) return true;
     for (int i = 0; i < jd.scan.componentCount; ++i) {
-      if (!complete(i, jd)) return true;
+      if (!complete(i, jd.scan)) return true;
     }
     return false;
   }
@@ -47,8 +47,8 @@ class Coverage {
   }
 
  private:
-  bool& complete(int scanIndex, const PELOJ_JDINFO& jd) {
-    return complete_[jd.scan.components[static_cast<size_t>(scanIndex)]->index];
+  bool& complete(int scanIndex, const ScanHeader& scan) {
+    return complete_[scan.components[static_cast<size_t>(scanIndex)]->index];
   }
   std::array<bool, kMaxComponents> complete_{};
 };
@@ -65,7 +65,7 @@ bool find_scan(PELOJ_JDINFO& jd, Coverage& coverage) {
 
 // Prepares the scan whose header has just been read.
 int prepare_scan(PELOJ_JDINFO& jd) {
-  if (prepare_upsampling(&jd) != PELOJ_OK) {
+  if (prepare_upsampling(jd.frame, jd.sizes.scale, jd.progress) != PELOJ_OK) {
     return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitUpsampler fail");
   }
   if (prepare_before_scan(&jd) != PELOJ_OK) {
@@ -77,7 +77,7 @@ int prepare_scan(PELOJ_JDINFO& jd) {
 }  // namespace
 
 int list_scans(PELOJ_JDINFO& jd) {
-  if (stores_coefficients(jd) && !allocate_store(jd)) {
+  if (stores_coefficients(jd) && !allocate_store(jd.frame, jd.scans)) {
     return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
   }
   Coverage coverage;
@@ -120,8 +120,8 @@ int load_scan(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
   jdInfo->entropy.eobRun = record->eobRun;
   jdInfo->marker->nextRestart = record->nextRestart;
   jdInfo->entropy.unreadMarker = record->unreadMarker;
-  if (!set_scan_geometry(*jdInfo)) return 0;
-  begin_imcu_row(jdInfo);
+  if (!set_scan_geometry(jdInfo->frame, jdInfo->scan)) return 0;
+  begin_imcu_row(jdInfo->scan, jdInfo->progress.imcuRow);
   return 1;
 }
 

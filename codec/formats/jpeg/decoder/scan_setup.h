@@ -11,10 +11,14 @@ int set_up_scan(PELOJ_JDINFO* jdInfo);
 // set_up_scan, the multiplier tables and, before the first scan, the MCU buffer. 200 or 201.
 int prepare_before_scan(PELOJ_JDINFO* jdInfo);
 
-// The MCU layout of the current scan; false when an MCU would have more than ten blocks.
-[[nodiscard]] bool set_scan_geometry(PELOJ_JDINFO& jd);
+// Where the scan's skip tables go; null when its blocks are read whole.
+EntropyState* skip_tables(PELOJ_JDINFO& jd);
 
-// Starts the next iMCU row.
-void begin_imcu_row(PELOJ_JDINFO* jdInfo);
+// The MCU layout of a scan, in the scan and its components; false when an MCU would have more than ten
+// blocks.
+[[nodiscard]] bool set_scan_geometry(const Frame& frame, Scan& scan);
+
+// Starts an iMCU row.
+void begin_imcu_row(Scan& scan, int imcuRow);
 
 }  // namespace pelo::jpeg

@@ -22,46 +22,29 @@ using Replicate = void (*)(const uint8_t*, int, uint8_t*);
 constexpr Replicate kReplicate[kMaxSampling + 1] = {nullptr, replicate<1>, replicate<2>, replicate<3>,
                                                     replicate<4>};
 
-// Input row i becomes rows i * vExpand and the following ones of the grid.
-void expand_rows(PELOJ_JDINFO& jd, const Component& component, uint8_t** input, uint8_t** slot) {
-  uint8_t** colour = component.colour.get();
-  for (int row = 0, in = 0; row < jd.frame.vMax; ++in) {
-    kReplicate[component.hExpand](input[in], component.scaledWidth, colour[in]);
-    for (int e = 0; e < component.vExpand && row < jd.frame.vMax; ++e) slot[row++] = colour[in];
-  }
-}
-
 // Brings the next row group of every component to the full grid.
-void replicate_row_group(PELOJ_JDINFO& jd) {
-  for (int c = jd.frame.componentCount - 1; c >= 0; --c) {
-    Component& component = (*jd.frame.components)[static_cast<size_t>(c)];
-    uint8_t** slot = component.colourRows;
-    component.upsample(&jd, &component, component.samples.get() + jd.progress.rowGroup * component.v,
-                       &slot);
+void replicate_row_group(const Frame& frame, Progress& progress) {
+  for (int c = frame.componentCount - 1; c >= 0; --c) {
+    Component& component = (*frame.components)[static_cast<size_t>(c)];
+    uint8_t** input = component.samples.get() + progress.rowGroup * component.v;
+    if (component.on_full_grid()) {
+      use_rows_as_they_are(frame.vMax, input, component.colourRows);
+    } else {
+      replicate_rows(component, frame.vMax, input, component.colourRows);
+    }
   }
-  jd.progress.readPosition = 0;
+  progress.readPosition = 0;
 }
 
-void advance(PELOJ_JDINFO& jd, int rows) {
-  jd.progress.readPosition += rows;
-  if (jd.progress.readPosition >= jd.frame.vMax) ++jd.progress.rowGroup;
+void advance(Progress& progress, int vMax, int rows) {
+  progress.readPosition += rows;
+  if (progress.readPosition >= vMax) ++progress.rowGroup;
 }
 
-bool choose_method(const PELOJ_JDINFO& jd, Component& component) {
-  const int h = component.h;
-  const int v = component.v;
-  if (jd.frame.hMax % h != 0 || jd.frame.vMax % v != 0) return false;
-  component.hExpand = static_cast<uint8_t>(jd.frame.hMax / h);
-  component.vExpand = static_cast<uint8_t>(jd.frame.vMax / v);
-  if (component.hExpand == 1 && component.vExpand == 1) {
-    component.upsample = use_rows_as_they_are;
-  } else if (component.hExpand == 2 && component.vExpand == 1) {
-    component.upsample = replicate_h2v1;
-  } else if (component.hExpand == 2 && component.vExpand == 2 && component.downsampledWidth >= 2) {
-    component.upsample = replicate_h2v2;
-  } else {
-    component.upsample = replicate_integral;
-  }
+bool set_expansion(const Frame& frame, Component& component) {
+  if (frame.hMax % component.h != 0 || frame.vMax % component.v != 0) return false;
+  component.hExpand = static_cast<uint8_t>(frame.hMax / component.h);
+  component.vExpand = static_cast<uint8_t>(frame.vMax / component.v);
   return true;
 }
 
@@ -71,21 +54,23 @@ int fail(const char* text) {
 }
 
 }  // namespace
-void use_rows_as_they_are(PELOJ_JDINFO* jdInfo, Component*, uint8_t** input, uint8_t*** slot) {
-  std::copy_n(input, jdInfo->frame.vMax, *slot);
+
+void use_rows_as_they_are(int vMax, uint8_t** input, uint8_t** grid) {
+  std::copy_n(input, vMax, grid);
 }
-void replicate_h2v1(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
-  expand_rows(*jdInfo, *component, input, *slot);
-}
-void replicate_h2v2(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
-  expand_rows(*jdInfo, *component, input, *slot);
-}
-void replicate_integral(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
-  expand_rows(*jdInfo, *component, input, *slot);
+
+// Input row i becomes rows i * vExpand and the following ones of the grid.
+void replicate_rows(const Component& component, int vMax, uint8_t** input, uint8_t** grid) {
+  uint8_t** colour = component.colour.get();
+  for (int row = 0, in = 0; row < vMax; ++in) {
+    kReplicate[component.hExpand](input[in], component.scaledWidth, colour[in]);
+    for (int e = 0; e < component.vExpand && row < vMax; ++e) grid[row++] = colour[in];
+  }
 }
 
 void convert_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
-  if (jdInfo->progress.readPosition >= jdInfo->frame.vMax) replicate_row_group(*jdInfo);
+  if (jdInfo->progress.readPosition >= jdInfo->frame.vMax)
+    replicate_row_group(jdInfo->frame, jdInfo->progress);
   const int rows = std::min(jdInfo->frame.vMax - jdInfo->progress.readPosition, capacity - *rowCounter);
   jdInfo->resampling.continueFlag = 1;
   while (jdInfo->resampling.continueFlag && jdInfo->output.emitted < jdInfo->output.bandEnd) {
@@ -94,14 +79,15 @@ void convert_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
   // A band that ends inside an input row goes on with it in the next one.
   if (jdInfo->resampling.continueFlag && jdInfo->output.emitted < jdInfo->output.limit) return;
   *rowCounter += rows;
-  advance(*jdInfo, rows);
+  advance(jdInfo->progress, jdInfo->frame.vMax, rows);
 }
 
 void skip_rows_unconverted(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
-  if (jdInfo->progress.readPosition >= jdInfo->frame.vMax) replicate_row_group(*jdInfo);
+  if (jdInfo->progress.readPosition >= jdInfo->frame.vMax)
+    replicate_row_group(jdInfo->frame, jdInfo->progress);
   const int rows = std::min(jdInfo->frame.vMax - jdInfo->progress.readPosition, capacity - *rowCounter);
   *rowCounter += rows;
-  advance(*jdInfo, rows);
+  advance(jdInfo->progress, jdInfo->frame.vMax, rows);
 }
 
 uint8_t** allocate_rows(int width, int rows) {
@@ -124,12 +110,12 @@ uint8_t** allocate_rows(int width, int rows) {
   return pointers;
 }
 
-int prepare_upsampling(PELOJ_JDINFO* jdInfo) {
-  const int blockSize = jdInfo->sizes.scale.block_size();
-  const int mcus = jdInfo->frame.mcus_across();
-  for (int c = 0; c < jdInfo->frame.componentCount; ++c) {
-    Component& component = (*jdInfo->frame.components)[static_cast<size_t>(c)];
-    if (!choose_method(*jdInfo, component)) {
+int prepare_upsampling(Frame& frame, Scale scale, Progress& progress) {
+  const int blockSize = scale.block_size();
+  const int mcus = frame.mcus_across();
+  for (int c = 0; c < frame.componentCount; ++c) {
+    Component& component = (*frame.components)[static_cast<size_t>(c)];
+    if (!set_expansion(frame, component)) {
       refuse(Reason::kVariant, "JPEG decoder", "sampling factors that do not divide each other");
       return fail("PELOJ_InitUpsampler : invalid sampling");
     }
@@ -137,11 +123,11 @@ int prepare_upsampling(PELOJ_JDINFO* jdInfo) {
     // Whole MCUs wide: blocks beyond the last column are written too.
     component.samples.reset(allocate_rows(mcus * component.h * blockSize, component.v * blockSize));
     if (!component.samples) return fail("PELOJ_InitUpsampler : PELOJ_AllocSampleArry fail");
-    if (component.upsample == use_rows_as_they_are) continue;
+    if (component.on_full_grid()) continue;
     component.colour.reset(allocate_rows(component.scaledWidth * component.hExpand, component.v));
     if (!component.colour) return fail("PELOJ_InitUpsampler : PELOJ_AllocSampleArry fail");
   }
-  jdInfo->progress.readPosition = jdInfo->frame.vMax;
+  progress.readPosition = frame.vMax;
   return PELOJ_OK;
 }
 

@@ -5,24 +5,18 @@
 
 namespace pelo::jpeg {
 
-// Per-component methods: from the input rows of one row group (v rows) to *slot, the pointers of its
-// vMax full-grid rows. None interpolates; equal rows share one buffer.
-void use_rows_as_they_are(PELOJ_JDINFO* jdInfo, pelo::jpeg::Component* component, uint8_t** input,
-                          uint8_t*** slot);
-void replicate_h2v1(PELOJ_JDINFO* jdInfo, pelo::jpeg::Component* component, uint8_t** input,
-                    uint8_t*** slot);
-void replicate_h2v2(PELOJ_JDINFO* jdInfo, pelo::jpeg::Component* component, uint8_t** input,
-                    uint8_t*** slot);
-void replicate_integral(PELOJ_JDINFO* jdInfo, pelo::jpeg::Component* component, uint8_t** input,
-                        uint8_t*** slot);
+// From a component's input rows of one row group (v rows) to the pointers of its vMax full-grid rows, as
+// they are or replicated. Nothing is interpolated; equal rows share one buffer.
+void use_rows_as_they_are(int vMax, uint8_t** input, uint8_t** grid);
+void replicate_rows(const Component& component, int vMax, uint8_t** input, uint8_t** grid);
 
 // Converts up to `capacity - *rowCounter` rows of the current row group, replicating it first when the
 // last one is used up, and advances *rowCounter. The skipping form moves on without converting.
 void convert_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity);
 void skip_rows_unconverted(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity);
 
-// Chooses every component's method, and allocates sample rows and full-grid rows. 200 or 201.
-int prepare_upsampling(PELOJ_JDINFO* jdInfo);
+// Sets every component's replication, and allocates sample rows and full-grid rows. 200 or 201.
+int prepare_upsampling(Frame& frame, Scale scale, Progress& progress);
 
 // `rows` row pointers and their samples in one block, freed with TAVIRPELO_OsFree; null for zero sizes
 // or when memory is short.
