@@ -1,6 +1,5 @@
-#include "codec/formats/jpeg/decoder/convert.h"
-
 #include "codec/base/axis_stepper.h"
+#include "codec/formats/jpeg/decoder/rows.h"
 
 namespace pelo::jpeg {
 namespace {

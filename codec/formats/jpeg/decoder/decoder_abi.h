@@ -4,20 +4,16 @@
 #pragma once
 
 #include "codec/formats/jpeg/decoder/bit_reader.h"
-#include "codec/formats/jpeg/decoder/convert.h"
 #include "codec/formats/jpeg/decoder/driver.h"
+#include "codec/formats/jpeg/decoder/headers.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
 #include "codec/formats/jpeg/decoder/idct.h"
 #include "codec/formats/jpeg/decoder/imcu_row.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
-#include "codec/formats/jpeg/decoder/markers.h"
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
 #include "codec/formats/jpeg/decoder/row_output.h"
-#include "codec/formats/jpeg/decoder/row_process.h"
-#include "codec/formats/jpeg/decoder/scan_list.h"
-#include "codec/formats/jpeg/decoder/scan_setup.h"
-#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/decoder/rows.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 
 // Refills reader->state from the given buffer and count. 1: the state holds `needed` bits, or zeros in
 // place of those that a marker cut off; 0: the source ended and fewer than `needed` bits are real.

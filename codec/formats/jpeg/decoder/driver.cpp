@@ -1,14 +1,10 @@
 #include "codec/formats/jpeg/decoder/driver.h"
 
 #include "codec/base/errors.h"
-#include "codec/formats/jpeg/decoder/convert.h"
-#include "codec/formats/jpeg/decoder/decode_size.h"
-#include "codec/formats/jpeg/decoder/markers.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
-#include "codec/formats/jpeg/decoder/row_process.h"
-#include "codec/formats/jpeg/decoder/scan_list.h"
-#include "codec/formats/jpeg/decoder/scan_setup.h"
-#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/decoder/headers.h"
+#include "codec/formats/jpeg/decoder/imcu_row.h"
+#include "codec/formats/jpeg/decoder/rows.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 

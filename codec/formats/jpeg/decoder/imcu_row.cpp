@@ -3,8 +3,7 @@
 #include "codec/base/os.h"
 #include "codec/formats/jpeg/decoder/idct.h"
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
-#include "codec/formats/jpeg/decoder/scan_setup.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 #include "platform/android_log.h"
 
 namespace pelo::jpeg {

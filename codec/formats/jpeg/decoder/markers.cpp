@@ -1,10 +1,9 @@
-#include "codec/formats/jpeg/decoder/markers.h"
-
 #include <algorithm>
 #include <cstring>
 
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
+#include "codec/formats/jpeg/decoder/headers.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/jpeg/marker_codes.h"
 

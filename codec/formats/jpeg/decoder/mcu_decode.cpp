@@ -1,7 +1,6 @@
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
 
-#include "codec/formats/jpeg/decoder/dequantise.h"
-#include "codec/formats/jpeg/decoder/mcu_steps.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 
 namespace pelo::jpeg {
 namespace {

@@ -1,6 +1,5 @@
 // Huffman decoding of progressive scans (ITU-T T.81 G.1.2, G.2).
-#include "codec/formats/jpeg/decoder/mcu_steps.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
+#include "codec/formats/jpeg/decoder/mcu_decode.h"
 
 namespace pelo::jpeg {
 namespace {
