@@ -24,6 +24,8 @@ constexpr int kBitBufferSize = static_cast<int>(sizeof(BitBuffer) * 8);
 // has no extra bits; an entry of the skip table (huffman.h) takes up to 27, which 32-bit buffers are
 // asked about.
 constexpr int kFilledBits = kBitBufferSize == 64 ? 32 : 25;
+constexpr int kMaxExtraBits = 15;
+static_assert(kFilledBits >= kMaxCodeLength + (kBitBufferSize == 64 ? kMaxExtraBits : 1));
 
 // What outlives an MCU. The unread bits are the lowest `left` bits of `bits`; of these the lowest
 // `invented` are zeros that no source delivered. left < invented: the decoder has consumed some of them.

@@ -123,9 +123,8 @@ template void idct8<2, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
 template void idct8<1, 2>(const int32_t*, const int32_t*, uint8_t* const*, int);
 template void idct8<1, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
 
-// A member serves up to the last position before the next square's own begin. One coefficient a step
-// lies outside the square and is left out: position 3 (row 2, column 0), 6 (row 0, column 3) and 10 (row
-// 4, column 0).
+// One coefficient of a square member's share lies outside its square and is left out: position 3 (row 2,
+// column 0) of 2x2, 6 (row 0, column 3) of 3x3 and 10 (row 4, column 0) of 4x4.
 constinit const IdctTable kFullIdct = idct_table({{0, idct8<1, 1>},
                                                   {1, idct8<2, 1>},
                                                   {3, idct8_corner},

@@ -131,7 +131,7 @@ template void idct4<2, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
 template void idct4<1, 2>(const int32_t*, const int32_t*, uint8_t* const*, int);
 template void idct4<1, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
 
-// Positions 3, 6, 9, 11 and 13 are read by a larger member only (see kFullIdct).
+// Here 3x3 serves up to the same position as 4x4 at full size, and leaves out 6, 9, 11 and 13.
 constinit const IdctTable kHalfIdct = idct_table(
     {{0, idct4<1, 1>}, {1, idct4<2, 1>}, {3, idct4_corner}, {13, idct4<3, 3>}, {63, idct4<4, 4>}});
 

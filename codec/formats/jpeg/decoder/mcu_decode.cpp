@@ -90,7 +90,7 @@ inline void skip_rest(BitReader& reader, const BlockContext& context, int positi
       const int used = static_cast<int>(skip_used(entry));
       const bool ends = (entry & kSkipEndOfBlock) != 0;
       // Extra bits beyond a narrow buffer's content: one code at a time.
-      const bool held = kFilledBits >= kSkipBits + 15 || used <= reader.state.left;
+      const bool held = kFilledBits >= kSkipBits + kMaxExtraBits || used <= reader.state.left;
       if (used != 0 && held && next <= (ends ? 62 : 63)) [[likely]] {
         reader.drop(used);
         if (ends) return;
