@@ -1,6 +1,6 @@
 #include "bench/ours.h"
 
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 
 namespace bench {
 

@@ -9,7 +9,7 @@ extern "C" {
 
 #include <cstdlib>
 
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "tavirpelo/tavirpelo.h"
 
 namespace bench::peer {

@@ -1,12 +1,10 @@
 // Cropping straight from a JPEG file within a memory limit.
-#include "codec/decode/crop_file.h"
-
 #include <algorithm>
 
 #include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
-#include "codec/decode/one_call.h"
+#include "codec/decode/decode.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/image/crop.h"
 #include "tavirpelo/decode.h"

@@ -3,8 +3,7 @@
 #include "codec/decode/decode_abi.h"
 
 #include "codec/base/errors.h"
-#include "codec/decode/crop_file.h"
-#include "codec/decode/one_call.h"
+#include "codec/decode/decode.h"
 #include "codec/formats/bmp/head.h"
 #include "codec/formats/gif/head.h"
 #include "tavirpelo/decode.h"

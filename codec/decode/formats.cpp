@@ -1,11 +1,10 @@
-#include "codec/decode/formats.h"
-
 #include <algorithm>
 #include <cstring>
 #include <iterator>
 #include <string_view>
 
 #include "codec/base/errors.h"
+#include "codec/decode/decode.h"
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/formats/bmp/head.h"
 #include "codec/formats/gif/driver.h"

@@ -1,9 +1,8 @@
-#include "codec/decode/one_call.h"
-
 #include <memory>
 
 #include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
+#include "codec/decode/decode.h"
 #include "codec/formats/gif/driver.h"
 #include "tavirpelo/decode.h"
 

@@ -1,11 +1,10 @@
 // Pixels over pixels: blending by alpha, and copying under a mask.
-#include "codec/pixel/blend.h"
-
 #include <cstring>
 
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
 #include "codec/image/image.h"
+#include "codec/pixel/paint.h"
 
 namespace pelo {
 namespace {

@@ -5,9 +5,9 @@
 #include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "codec/image/image.h"
-#include "codec/pixel/fill.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/paint.h"
 #include "codec/pixel/pixel_layout.h"
+#include "codec/pixel/row_stores.h"
 
 static_assert(sizeof(void*) != 4 || sizeof(TAVIRPELO_RAWINFO) == 16);
 

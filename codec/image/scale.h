@@ -6,7 +6,7 @@
 
 #include "codec/base/byte_order.h"
 #include "codec/image/resample.h"
-#include "codec/pixel/lanes.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo {
 

@@ -4,8 +4,8 @@
 
 #include "codec/base/byte_order.h"
 #include "codec/image/scale.h"
-#include "codec/pixel/fill.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/paint.h"
+#include "codec/pixel/row_stores.h"
 #include "codec/zoom/view.h"
 #include "codec/zoom/zoom.h"
 

@@ -1,6 +1,6 @@
 // Questions about a zoom, and its settings.
 #include "codec/base/errors.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "codec/zoom/layout.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/view.h"

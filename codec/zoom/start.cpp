@@ -6,7 +6,7 @@
 #include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
 #include "codec/formats/jpeg/decoder/driver.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "codec/zoom/draw.h"
 #include "codec/zoom/layout.h"
 #include "codec/zoom/session.h"

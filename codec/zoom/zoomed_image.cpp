@@ -1,6 +1,6 @@
 // The whole picture rendered at the current zoom, and views copied from it.
 #include "codec/base/os.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "codec/zoom/draw.h"
 #include "codec/zoom/session.h"
 #include "codec/zoom/view.h"

@@ -1,10 +1,10 @@
 // The JPEG header scans: sizes, marker rules, and thumbnails in every kind of segment, sound and
 // hostile.
-#include "codec/formats/jpeg/jpeg_abi.h"
 #include "codec/formats/jpeg/header_scan.h"
 
 #include <gtest/gtest.h>
 
+#include "codec/formats/jpeg/jpeg_abi.h"
 #include "tests/support/exif_builder.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_segments.h"

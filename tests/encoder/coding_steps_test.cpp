@@ -3,9 +3,9 @@
 
 #include <algorithm>
 
-#include "codec/formats/jpeg/encoder/encoder_abi.h"
 #include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
+#include "codec/formats/jpeg/encoder/encoder_abi.h"
 #include "tests/support/jpeg_segments.h"
 
 namespace tests {

@@ -1,6 +1,6 @@
 // The encoder's streams: layout, sizes, growth, edges, and agreement with an independent decoder.
-#include "codec/formats/jpeg/encoder/encoder_abi.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
+#include "codec/formats/jpeg/encoder/encoder_abi.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_segments.h"

@@ -1,10 +1,10 @@
 // What the EXIF reader takes from a segment: every member, both byte orders, and which entries it
 // ignores.
-#include "codec/formats/jpeg/exif/exif_abi.h"
 #include "codec/formats/jpeg/exif/exif_reader.h"
 
 #include <memory>
 
+#include "codec/formats/jpeg/exif/exif_abi.h"
 #include "tests/support/exif_builder.h"
 #include "tests/support/failures.h"
 #include "tests/support/jpeg_segments.h"

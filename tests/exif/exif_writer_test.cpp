@@ -1,12 +1,12 @@
 // The EXIF writer: its bytes, its bounds, what the reader and an independent reader make of it, and the
 // way through the encoder.
-#include "codec/formats/jpeg/exif/exif_abi.h"
 #include "codec/formats/jpeg/exif/exif_writer.h"
 
 #include <gmock/gmock.h>
 
 #include <cstdio>
 
+#include "codec/formats/jpeg/exif/exif_abi.h"
 #include "tests/support/exif_builder.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"

@@ -6,7 +6,7 @@
 #include <memory>
 #include <string>
 
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "tavirpelo/tavirpelo.h"
 #include "tests/support/memory_stream.h"
 #include "tests/support/pixels.h"

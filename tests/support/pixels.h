@@ -4,7 +4,7 @@
 #include <array>
 #include <cstdint>
 
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "tests/support/bytes.h"
 
 namespace tests {

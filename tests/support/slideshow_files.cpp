@@ -29,10 +29,7 @@ void put_mark(Bytes& out, size_t musicSize) {
 
 // Tests run side by side: each has files of its own.
 TempFile::TempFile(const std::string& suffix)
-    : path_(testing::TempDir() + "tavir_" +
-            testing::UnitTest::GetInstance()->current_test_info()->test_suite_name() + "_" +
-            testing::UnitTest::GetInstance()->current_test_info()->name() + "_" +
-            std::to_string(getpid()) + suffix) {}
+    : path_(testing::TempDir() + "tavir_" + std::to_string(getpid()) + suffix) {}
 
 TempFile::~TempFile() {
   std::remove(path_.c_str());

@@ -1,11 +1,10 @@
 // Fitting into a number of bytes: never more than the target, from every kind of source, and the
 // arithmetic of gains, tables and scales.
-#include "codec/formats/jpeg/transform/transform_abi.h"
-#include "codec/formats/jpeg/transform/reencode.h"
-
 #include <cmath>
 
-#include "codec/formats/jpeg/transform/requantise.h"
+#include "codec/formats/jpeg/transform/coding_parameters.h"
+#include "codec/formats/jpeg/transform/transform.h"
+#include "codec/formats/jpeg/transform/transform_abi.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_samples.h"
@@ -88,26 +87,6 @@ TEST(ReEncode, WhatIsRefused) {
   uint8_t* none = nullptr;
   EXPECT_EQ(0, TAVIRPELO_ReEncodeJpegToBuffer(source.data(), 4, 1, &none, &size, 3000));
   EXPECT_EQ(TAVIRPELO_CODEC_ARGUMENT, debug_PeloCodecError);
-}
-
-TEST(ReEncode, DamageAndShortMemory) {
-  const Bytes source = encode_own(60, 50, 90);
-  every_flip(
-      source, {0x01, 0x80, 0xFF},
-      [](const Bytes& damaged, size_t at) { fit(damaged, at % 2 ? 900 : 1500); }, 2, 5);
-  every_truncation(
-      source, [](const Bytes& cut) { fit(cut, 900); }, 2, 9);
-  uint8_t* buffer = nullptr;
-  const auto run = [&] {
-    Bytes copy = source;
-    int size = 1024;
-    TAVIRPELO_OsFree(std::exchange(buffer, static_cast<uint8_t*>(TAVIRPELO_OsMalloc(1024))));
-    return elo_re_encode_to_buffer(copy.data(), static_cast<int>(copy.size()), 1, &buffer, &size, 900);
-  };
-  // The first of them is the buffer's own. A pass that had to be left out may still leave a picture.
-  const auto judge = [&](int answer) { EXPECT_EQ(answer == 1, buffer != nullptr); };
-  EXPECT_EQ(1, fail_each_allocation(run, judge, 2));
-  TAVIRPELO_OsFree(buffer);
 }
 
 TEST(ReEncode, GainsAndScales) {

@@ -9,8 +9,8 @@
 #include "codec/base/io.h"
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/formats/format.h"
-#include "codec/pixel/packers.h"
 #include "codec/pixel/quad_sampler.h"
+#include "codec/pixel/row_stores.h"
 
 namespace pelo::bmp {
 namespace {

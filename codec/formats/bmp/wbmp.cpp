@@ -13,9 +13,9 @@
 #include "codec/formats/bmp/row_reader.h"
 #include "codec/formats/format.h"
 #include "codec/pixel/packed_samples.h"
-#include "codec/pixel/packers.h"
 #include "codec/pixel/pixel_layout.h"
 #include "codec/pixel/quad_sampler.h"
+#include "codec/pixel/row_stores.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::bmp {

@@ -1,7 +1,7 @@
 #include "codec/base/errors.h"
 #include "codec/formats/gif/output.h"
-#include "codec/pixel/packers.h"
 #include "codec/pixel/quad_sampler.h"
+#include "codec/pixel/row_stores.h"
 
 namespace pelo::gif {
 namespace {

@@ -3,7 +3,7 @@
 #include "codec/base/axis_stepper.h"
 #include "codec/formats/format.h"
 #include "codec/formats/gif/output.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 
 namespace pelo::gif {
 namespace {

@@ -5,8 +5,8 @@
 
 #include "codec/base/row_progress.h"
 #include "codec/formats/gif/rows.h"
-#include "codec/pixel/lanes.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/quad_sampler.h"
+#include "codec/pixel/row_stores.h"
 
 namespace pelo::gif {
 namespace {

@@ -8,7 +8,7 @@
 #include "codec/formats/format.h"
 #include "codec/formats/gif/lzw.h"
 #include "codec/formats/gif/stream.h"
-#include "codec/pixel/rgba_store.h"
+#include "codec/pixel/row_stores.h"
 
 namespace pelo::gif {
 

@@ -7,7 +7,7 @@
 #include "codec/base/errors.h"
 #include "codec/base/io.h"
 #include "codec/formats/gif/record.h"
-#include "codec/pixel/lanes.h"
+#include "codec/pixel/quad_sampler.h"
 
 namespace pelo::gif {
 

@@ -10,9 +10,8 @@
 #include "codec/base/byte_order.h"
 #include "codec/base/row_progress.h"
 #include "codec/formats/png/png_context.h"
-#include "codec/pixel/blend.h"
-#include "codec/pixel/packers.h"
-#include "codec/pixel/pixel_runs.h"
+#include "codec/pixel/paint.h"
+#include "codec/pixel/row_stores.h"
 
 namespace pelo::png {
 namespace {

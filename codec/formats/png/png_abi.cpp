@@ -3,7 +3,7 @@
 
 #include "codec/base/errors.h"
 #include "codec/base/os_memory.h"
-#include "codec/pixel/blend.h"
+#include "codec/pixel/paint.h"
 #include "codec/pixel/quad_sampler.h"
 #include "tavirpelo/api.h"
 #include "tavirpelo/decinfo.h"

@@ -129,7 +129,7 @@ TAVIRPELO_API void __PELOI_PngResize_24bit_TR(const PELOI_PNGCONTEXT* context, c
                                               const uint8_t* lower, uint32_t sourceWidth,
                                               uint32_t outWidth, uint8_t* output);
 
-// The blending of codec/pixel/blend.h.
+// The blending of codec/pixel/paint.h.
 TAVIRPELO_API uint8_t APPLY_ALPHA_BYTE_TO_BYTE(uint32_t foreground, uint32_t alpha, uint32_t background);
 TAVIRPELO_API uint16_t APPLY_ALPHA_RGB_TO_SHORT(uint32_t red, uint32_t green, uint32_t blue,
                                                 uint32_t alpha, uint32_t background565);

@@ -9,7 +9,7 @@
 #include "codec/formats/png/expand.h"
 #include "codec/formats/png/inflate.h"
 #include "codec/formats/png/png_info.h"
-#include "codec/pixel/rgba_store.h"
+#include "codec/pixel/row_stores.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo::png {

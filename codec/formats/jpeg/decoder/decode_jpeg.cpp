@@ -7,7 +7,7 @@
 #include "codec/base/os_memory.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/header_scan.h"
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "platform/android_log.h"
 #include "tavirpelo/decode.h"
 

@@ -116,7 +116,7 @@ TAVIRPELO_API void PELOJ_FastYcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_
 TAVIRPELO_API void PELOJ_FastYcbcrUpscaleWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y,
                                                      const uint8_t* cb, const uint8_t* cr, int count);
 
-// Accumulator writers: `count` packed sums of four samples (codec/pixel/lanes.h).
+// Accumulator writers: `count` packed sums of four samples (codec/pixel/quad_sampler.h).
 TAVIRPELO_API void PELOJ_YcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
 TAVIRPELO_API void PELOJ_GrayWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
 TAVIRPELO_API void PELOJ_RGBWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);

@@ -15,7 +15,6 @@
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
 #include "codec/formats/jpeg/decoder/row_output.h"
-#include "codec/pixel/lanes.h"
 #include "codec/pixel/quad_sampler.h"
 #include "tavirpelo/decinfo.h"
 

@@ -5,7 +5,7 @@
 
 #include "codec/base/geometry.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
-#include "codec/pixel/lanes.h"
+#include "codec/pixel/quad_sampler.h"
 #include "codec/pixel/ycc.h"
 
 namespace pelo::jpeg {

@@ -4,7 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "codec/pixel/packers.h"
+#include "codec/pixel/row_stores.h"
 #include "tavirpelo/api.h"
 
 typedef struct PELOJ_JDINFO PELOJ_JDINFO;
@@ -43,7 +43,7 @@ void write_rgb_row(RowOutput& output, const uint8_t* r, const uint8_t* g, const 
 void write_picked_row(RowOutput& output, const uint16_t* columns, const uint8_t* y, const uint8_t* cb,
                       const uint8_t* cr, int count);
 
-// Accumulator writers: `count` packed sums of four samples (codec/pixel/lanes.h).
+// Accumulator writers: `count` packed sums of four samples (codec/pixel/quad_sampler.h).
 void write_ycc_sums(RowOutput& output, const uint32_t* sums, int count);
 void write_grey_sums(RowOutput& output, const uint32_t* sums, int count);
 void write_rgb_sums(RowOutput& output, const uint32_t* sums, int count);

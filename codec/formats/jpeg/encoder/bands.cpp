@@ -2,7 +2,6 @@
 #include <algorithm>
 
 #include "codec/formats/jpeg/encoder/encoder.h"
-#include "codec/formats/jpeg/encoder/input_rows.h"
 
 namespace pelo::jpeg {
 

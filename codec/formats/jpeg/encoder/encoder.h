@@ -12,9 +12,8 @@
 
 #include "codec/base/os_memory.h"
 #include "codec/formats/jpeg/encoder/bit_writer.h"
+#include "codec/formats/jpeg/encoder/coding_tables.h"
 #include "codec/formats/jpeg/encoder/destination.h"
-#include "codec/formats/jpeg/encoder/huffman_codes.h"
-#include "codec/formats/jpeg/encoder/quantise.h"
 #include "codec/formats/jpeg/tables.h"
 #include "tavirpelo/encode.h"
 
@@ -108,6 +107,13 @@ int write_headers(ELO_ENCODER* encoder);
 
 // Encodes the next MCU row of the image.
 int encode_next_row(ELO_ENCODER* encoder);
+
+// Fills the sample buffers with the next MCU row of the encoder's image. False for a format that the
+// component layout cannot take.
+[[nodiscard]] bool read_input_rows(ELO_ENCODER& encoder);
+
+// True when the components are those of planar input: one alone, or 4:2:0.
+bool takes_planes(const ELO_ENCODER& encoder);
 
 // Fills the sample rows of the next MCU row from planes that start at its first row and are packed
 // (component width samples a row); columns and rows beyond the image repeat the last ones.

@@ -2,10 +2,9 @@
 #pragma once
 
 #include "codec/formats/jpeg/encoder/bit_writer.h"
+#include "codec/formats/jpeg/encoder/coding_tables.h"
 #include "codec/formats/jpeg/encoder/destination.h"
 #include "codec/formats/jpeg/encoder/encoder.h"
-#include "codec/formats/jpeg/encoder/huffman_codes.h"
-#include "codec/formats/jpeg/encoder/quantise.h"
 
 // Writes the low `length` (0 to 16) bits of `code`; 1, or 0 when the destination cannot take them.
 TAVIRPELO_API int __elo_jpeg_enc_write_bits(ELO_ENCODER* encoder, uint32_t code, int length);

@@ -1,9 +1,8 @@
-#include "codec/formats/jpeg/encoder/input_rows.h"
-
 #include <algorithm>
 #include <cstring>
 
 #include "codec/base/byte_order.h"
+#include "codec/formats/jpeg/encoder/encoder.h"
 
 namespace pelo::jpeg {
 namespace {

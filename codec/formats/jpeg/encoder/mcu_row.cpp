@@ -1,6 +1,5 @@
 // One MCU row: samples in, blocks transformed and completed by dummies, MCUs coded.
 #include "codec/formats/jpeg/encoder/encoder.h"
-#include "codec/formats/jpeg/encoder/input_rows.h"
 
 namespace pelo::jpeg {
 namespace {

@@ -1,4 +1,5 @@
-// What the encoder takes over from the source: tables, sampling factors, restart markers.
+// What the encoder takes over from the source: tables, sampling factors, restart markers. And coding the
+// source's coefficients again with coarser tables.
 #pragma once
 
 #include "codec/formats/jpeg/encoder/encoder.h"
@@ -16,10 +17,28 @@ struct TransformParameters {
 };
 
 // Takes components, sampling factors and each distinct quantisation table of the source; ratios are 1.
-void parameters_of_source(pelo::jpeg::CoefficientSource* source,
-                          pelo::jpeg::TransformParameters* parameters);
+void parameters_of_source(CoefficientSource* source, TransformParameters* parameters);
 
 // Exchanges vertical and horizontal: sampling factors and the tables' rows and columns.
-void transpose_parameters(pelo::jpeg::TransformParameters* parameters);
+void transpose_parameters(TransformParameters* parameters);
+
+// ---- coarser tables ----
+
+enum class Coarsening { kDone, kTooCoarse, kFailed };
+
+// The finer the steps have to become, in 1024ths, when `size` bytes are to be `target`: 1024 keeps them.
+int updated_gain(int size, int target);
+
+// Makes the one or two tables those of Annex K at the source's own scale times gain / 1024, and
+// multiplies the ratios by what that changes. kTooCoarse leaves everything as it was; other numbers of
+// tables fail.
+Coarsening set_gained_table(TransformParameters* parameters, int gain);
+
+// Code a source's rows, each coefficient multiplied by its ratio: from baseline and from progressive
+// data. 1 or 0.
+int requantise_sequential(CoefficientSource* source, const TransformParameters* parameters,
+                          ELO_ENCODER* encoder);
+int requantise_progressive(CoefficientSource* source, const TransformParameters* parameters,
+                           ELO_ENCODER* encoder);
 
 }  // namespace pelo::jpeg

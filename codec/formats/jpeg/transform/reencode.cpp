@@ -1,5 +1,3 @@
-#include "codec/formats/jpeg/transform/reencode.h"
-
 #include <algorithm>
 #include <climits>
 #include <cstring>
@@ -11,7 +9,8 @@
 #include "codec/formats/format.h"
 #include "codec/formats/jpeg/exif/exif_writer.h"
 #include "codec/formats/jpeg/header_scan.h"
-#include "codec/formats/jpeg/transform/requantise.h"
+#include "codec/formats/jpeg/transform/coding_parameters.h"
+#include "codec/formats/jpeg/transform/transform.h"
 #include "tavirpelo/parse.h"
 
 namespace pelo::jpeg {

@@ -1,8 +1,7 @@
-#include "codec/formats/jpeg/transform/requantise.h"
-
 #include <algorithm>
 
 #include "codec/formats/jpeg/tables.h"
+#include "codec/formats/jpeg/transform/coding_parameters.h"
 #include "codec/formats/jpeg/transform/stream_encoder.h"
 
 namespace pelo::jpeg {

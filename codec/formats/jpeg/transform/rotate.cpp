@@ -1,7 +1,7 @@
-#include "codec/formats/jpeg/transform/rotate.h"
-
 #include <algorithm>
 #include <utility>
+
+#include "codec/formats/jpeg/transform/transform.h"
 
 namespace pelo::jpeg {
 namespace {

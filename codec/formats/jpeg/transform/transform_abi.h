@@ -3,11 +3,9 @@
 
 #include "codec/formats/jpeg/transform/block_transform.h"
 #include "codec/formats/jpeg/transform/coding_parameters.h"
-#include "codec/formats/jpeg/transform/reencode.h"
-#include "codec/formats/jpeg/transform/requantise.h"
-#include "codec/formats/jpeg/transform/rotate.h"
-#include "codec/formats/jpeg/transform/row_snapshots.h"
+#include "codec/formats/jpeg/transform/coefficient_source.h"
 #include "codec/formats/jpeg/transform/stream_encoder.h"
+#include "codec/formats/jpeg/transform/transform.h"
 
 // One block; `in` and `out` are different. ro90_f and ro270_f are the turns with mirroring.
 TAVIRPELO_API void __elo_flip_h(const pelo::jpeg::CoefficientBlock* in,

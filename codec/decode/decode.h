@@ -1,10 +1,25 @@
-// One-call parsing and decoding: a file or a byte buffer becomes a header record or a raw image.
+// Which format a source has, and one-call decoding: a file or a byte buffer becomes a header record or a
+// raw image.
 #pragma once
 
-#include "codec/decode/formats.h"
+#include "codec/formats/format.h"
 #include "tavirpelo/raw.h"
 
 namespace pelo {
+
+// ---- the formats that the library reads ----
+
+// The format with that code, or null.
+const Format* format_of(int code);
+
+// Detects the format at the source's start and reads its head: the object's image size, parts of `hinfo`
+// (may be null). The format code; 0 when it is none of ours, or its head is cut.
+int detect(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+
+// The whole of TAVIRPELO_Parser: a reader over the object's source, detection, and the record's sizes.
+int parse(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_HINFO* hinfo);
+
+// ---- in one call ----
 
 // A picture's source as create_dec_info takes it.
 struct PictureSource {
@@ -29,5 +44,12 @@ int decode_detected(const PictureSource& source, TAVIRPELO_RAWINFO& raw, uint32_
 // first; it goes with the last frame and on failure.
 int decode_frame(const PictureSource& source, const TAVIRPELO_RAWINFO& raw, uint32_t option,
                  TAVIRPELO_DECINFO** handle);
+
+// ---- a part of a JPEG file, within a memory limit ----
+
+// The whole of TAVIRPELO_CropDecoding and TAVIRPELO_CropFromImage.
+int decode_small(const char* path, void* outBuffer, int width, int height);
+int crop_file(const char* path, TAVIRPELO_CROPRECT* rect, void* dst, int dstWidth, int dstHeight,
+              uint32_t option, int memoryLimit);
 
 }  // namespace pelo

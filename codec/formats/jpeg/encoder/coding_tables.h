@@ -1,10 +1,11 @@
-// Quantisation tables for writing: from a quality, and the reciprocals by which coefficients are
-// divided.
+// What the encoder codes with: quantisation tables, with the reciprocals by which coefficients are
+// divided, and Huffman codes (ITU-T T.81 Annex C).
 #pragma once
 
 #include <array>
 #include <cstdint>
 
+#include "codec/formats/jpeg/tables.h"
 #include "tavirpelo/api.h"
 
 struct ELO_ENCODER;
@@ -26,5 +27,19 @@ void set_quality(ELO_ENCODER* encoder, int quality);
 
 // Installs the 64 values (natural order) of table `number` (0 to 3).
 void set_quant_table(ELO_ENCODER* encoder, int number, const uint8_t* values);
+
+// The code of a symbol with room below it for the symbol's extra bits: the low nibble of a DC or AC
+// symbol says how many.
+struct SymbolCode {
+  uint32_t bits;
+  int32_t length;  // code and extra bits; 0: the table has no such symbol
+};
+using HuffmanCodes = std::array<SymbolCode, 256>;
+
+// Installs the Annex K tables and derives their codes.
+void prepare_codes(ELO_ENCODER* encoder);
+
+// Derives the codes of one table.
+void derive_codes(const HuffmanSpec* spec, HuffmanCodes* codes);
 
 }  // namespace pelo::jpeg

@@ -1,4 +1,4 @@
-// Decoding by lines and by blocks, from every kind of source, and the merging of IDAT chunks.
+// IDAT chunks from every kind of source and their merging; blocks and lines.
 #include "tests/png/png_decode.h"
 
 namespace tests {
@@ -65,32 +65,6 @@ TEST(PngResume, MergedChunksStandInTheCallersBuffer) {
   EXPECT_EQ(pixels.content(), whole(file, kSide, kSide));
 }
 
-// Rows by `lines` at a time, each call into a buffer of its own.
-void expect_lines(TAVIRPELO_DECINFO* decInfo, const Bytes& expected, Size size, int lines) {
-  Bytes got;
-  for (int answer = 4, done = 0; answer == 4; done += lines) {
-    GuardedPixels band(size.width, lines, 7);
-    answer = TAVIRPELOI_DecodePNGLine(decInfo, band.data(), size.width, size.height, lines);
-    const int rows = std::min(lines, size.height - done);
-    ASSERT_EQ(done + lines >= size.height ? 1 : 4, answer) << done;
-    append(got, prefix(band.content(), bytes_of(7, size.width, rows)));
-  }
-  EXPECT_EQ(expected, got);
-  EXPECT_EQ(nullptr, decInfo->pFormatInfo);
-}
-
-TEST(PngResume, LinesEqualTheWhole) {
-  const Bytes file = in_pieces(picture(), 300, 200);
-  for (const Size size : {Size{31, 33}, Size{20, 70}, Size{50, 9}}) {  // as it is, taller, flatter
-    const Bytes expected = whole(file, size.width, size.height, TAVIRPELO_FIT_STRETCH);
-    for (int lines = 1; lines <= size.height + 1; ++lines) {
-      from_every_source(file, 7, TAVIRPELO_FIT_STRETCH, [&](TAVIRPELO_DECINFO* decInfo) {
-        expect_lines(decInfo, expected, size, lines);
-      });
-    }
-  }
-}
-
 TEST(PngResume, BlocksEqualTheWhole) {
   for (const bool interlaced : {false, true}) {
     const PngImage image = picture(interlaced);
@@ -106,26 +80,6 @@ TEST(PngResume, BlocksEqualTheWhole) {
       EXPECT_EQ(expected, pixels.content());
     }
   }
-}
-
-TEST(PngResume, AnotherRequestEndsTheDecode) {
-  const PngImage image = picture();
-  Bytes file = build_png(image);
-  const DecInfo decInfo = open_memory(file, 7);
-  GuardedPixels pixels(kSide, kSide, 7);
-  ASSERT_EQ(4, TAVIRPELOI_DecodePNGLine(decInfo.get(), pixels.data(), kSide, kSide, 5));
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNGLine(decInfo.get(), pixels.data(), kSide, kSide - 1, 5));
-  EXPECT_EQ(nullptr, decInfo->pFormatInfo);
-  ASSERT_EQ(4, TAVIRPELOI_DecodePNGLine(decInfo.get(), pixels.data(), kSide, kSide, 5));
-  // A whole decode starts over, whatever was going on.
-  GuardedPixels small(10, 10, 7);
-  EXPECT_EQ(1, TAVIRPELOI_DecodePNG(decInfo.get(), small.data(), 10, 10));
-  ASSERT_EQ(4, TAVIRPELOI_DecodePNGLine(decInfo.get(), pixels.data(), kSide, kSide, 5));
-  EXPECT_EQ(1, TAVIRPELOI_AbortPNGIter(decInfo.get()));
-  EXPECT_EQ(nullptr, decInfo->pFormatInfo);
-  EXPECT_EQ(0, TAVIRPELOI_AbortPNGIter(nullptr));
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNGLine(decInfo.get(), pixels.data(), 1, 1, -1));
-  EXPECT_EQ(0, TAVIRPELOI_DecodePNGIter(decInfo.get(), pixels.data(), 1, -5));
 }
 
 TEST(PngResume, InterlacedPicturesHaveNoLines) {
