@@ -10,7 +10,7 @@
 #include "codec/formats/gif/driver.h"
 #include "codec/formats/gif/head.h"
 #include "codec/formats/jpeg/decoder/driver.h"
-#include "codec/formats/jpeg/head.h"
+#include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/png/head.h"
 #include "codec/formats/png/png_driver.h"
 #include "tavirpelo/decode.h"

@@ -37,8 +37,10 @@ Grid reference_grid(const Plane& plane, int hMax, int vMax, bool progressive) {
     std::copy_n(plane.coefficients.data() + 64 * b, 64, block);
     uint8_t* rows[8];
     for (int r = 0; r < 8; ++r) rows[r] = small.data() + width * (b / plane.blocksWide * 8 + r);
-    const auto transform = progressive ? PELOJ_DoIdct : pelo::jpeg::idct_full(last_position(block));
-    transform(nullptr, multiplier, block, rows, b % plane.blocksWide * 8);
+    const auto transform = progressive
+                               ? pelo::jpeg::idct8<8, 8>
+                               : pelo::jpeg::kFullIdct[static_cast<size_t>(last_position(block))];
+    transform(multiplier, block, rows, b % plane.blocksWide * 8);
   }
   Grid grid;
   const int fx = hMax / plane.h;

@@ -1,12 +1,20 @@
 // Light scans that measure a JPEG without preparing a decode: size, progressive flag, embedded
 // thumbnail.
+//
+// How to read this folder: what its rooms share, and the scans that need none of them.
+//   constants  marker_codes, tables (T.81 Annex K, the transform's factors); lanes: vectors of a block
+//   markers    marker_walk finds them and their segments, for the scans here and the decoder's parser
+//   scans      header_scan walks to the first scan; header_scan_jfif, _exif and _photoshop look into
+//              the segments that can hold a thumbnail, over tiff and ifd1_thumbnail
+//   answers    header_info fills the public record and tells format detection
+// The rooms above: decoder and encoder, on these exif and strips, and on all of them transform.
 #pragma once
 
 #include <cstdint>
 
 #include "codec/base/buffered_source.h"
-#include "codec/formats/jpeg/frame_head.h"
-#include "codec/formats/jpeg/marker_codes.h"
+#include "codec/formats/jpeg/marker_walk.h"
+#include "tavirpelo/decinfo.h"
 #include "tavirpelo/parse.h"
 
 // Results of the decoder's internal stages.
@@ -57,25 +65,14 @@ int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo);
 
 constexpr int kScanMode = 8;
 
-// The parts of marker walking that the header scans and the decoding parser share.
-
-// Consumes bytes up to and including the first FF D8.
-[[nodiscard]] bool find_soi(PELOJ_SOURCE& source);
-
-// Consumes up to the next marker and its code; FF FF counts as a fill byte.
-[[nodiscard]] bool next_marker(PELOJ_SOURCE& source, uint8_t& code);
-
-// Reads a segment's 16-bit length and gives the bytes that follow it; false below 2 or at the end.
-[[nodiscard]] bool segment_length(PELOJ_SOURCE& source, uint32_t& remaining);
-
-// True for the application, comment and table markers that a length follows; frames and scans, which it
-// follows too, are each caller's own concern. Behind other codes the search for markers just goes on.
-[[nodiscard]] bool has_segment(Marker code);
-
-// Passes over a segment by its length.
-[[nodiscard]] bool skip_segment(PELOJ_SOURCE& source);
-
 // True when the thumbnail's bytes can lie inside a source of `sourceSize` bytes.
 [[nodiscard]] bool thumbnail_in_source(const PELOJ_THUMBNAIL& thumbnail, uint32_t sourceSize);
+
+// The head of a file as format detection reads it (codec/formats/format.h).
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+
+// The two at once, for rooms that take JPEG alone.
+int detect(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
 
 }  // namespace pelo::jpeg

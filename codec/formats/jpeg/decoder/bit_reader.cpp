@@ -1,7 +1,9 @@
+// The bit reader where it meets what is no data: windows, stuffing, markers, restarts, the end.
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 
 #include "codec/base/io.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
+#include "codec/formats/jpeg/decoder/mcu_decode.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
 namespace pelo::jpeg {
@@ -10,7 +12,7 @@ namespace {
 // The next source byte, reading another block when the window is used up; -1 when there is none.
 int next_byte(BitReader& reader) {
   if (reader.next == reader.end) {
-    PELOJ_SOURCE& source = *reader.jd->source;
+    PELOJ_SOURCE& source = *reader.source;
     const int count = read_io(source.io, source.buffer, static_cast<int>(kSourceBufferSize));
     if (count <= 0) return -1;
     source.consumed += static_cast<uint32_t>(count);
@@ -27,14 +29,15 @@ int next_data_byte(BitReader& reader) {
   while (code == 0xFF) code = next_byte(reader);
   if (code == 0) return 0xFF;
   if (code > 0) {
-    reader.jd->entropy.unreadMarker = static_cast<uint8_t>(code);
+    reader.entropy->unreadMarker = static_cast<uint8_t>(code);
   } else {
-    meet_end(*reader.jd);
+    meet_end(*reader.entropy);
   }
   return -1;
 }
 
-// Zeros behind the data, counted as invented.
+// Zeros behind the data, counted as invented. One less than fit in: the shift stays below the width even
+// when nothing is held.
 void pad(BitState& state) {
   const int zeros = kBitBufferSize - 1 - state.left;
   state.bits <<= zeros;
@@ -55,16 +58,37 @@ uint32_t match_code(BitReader& reader, const DerivedTable& table, int length) {
   return table.raw->symbols[static_cast<size_t>(index) & 255];
 }
 
+// Reads up to the next marker, which becomes the unread one. False at the end of the source.
+bool scan_for_marker(PELOJ_SOURCE& source, Entropy& entropy, MarkerRecord& marker) {
+  while (source_need(source, 1)) {
+    if (*source_take(source, 1) != 0xFF) {
+      marker.discardedBytes++;
+      continue;
+    }
+    uint8_t code;
+    do {
+      if (!source_need(source, 1)) return false;
+      code = *source_take(source, 1);
+    } while (code == 0xFF);
+    if (code != 0) {
+      entropy.unreadMarker = code;
+      return true;
+    }
+    marker.discardedBytes += 2;
+  }
+  return false;
+}
+
 }  // namespace
 
-void meet_end(PELOJ_JDINFO& jd) {
-  if (jd.entropy.endIsMarker) jd.entropy.unreadMarker = static_cast<uint8_t>(Marker::kEoi);
+void meet_end(Entropy& entropy) {
+  if (entropy.endIsMarker) entropy.unreadMarker = static_cast<uint8_t>(Marker::kEoi);
 }
 
 BitReader fill_by_bytes(BitReader reader) {
   BitState& state = reader.state;
   while (state.left <= kBitBufferSize - 8) {
-    const int byte = reader.jd->entropy.unreadMarker == 0 ? next_data_byte(reader) : -1;
+    const int byte = reader.entropy->unreadMarker == 0 ? next_data_byte(reader) : -1;
     if (byte < 0) {
       reader.plainEnd = reader.next;
       pad(state);
@@ -81,16 +105,17 @@ uint32_t decode_long_code(BitReader& reader, const DerivedTable& table) {
   return match_code(reader, table, kLookBits + 1);
 }
 
-BitReader open_bits(PELOJ_JDINFO& jd) {
-  const uint8_t* next = jd.source->buffer + jd.source->pos;
-  const uint8_t* end = next + jd.source->avail;
-  return {jd.entropy.state->bits, next, end, jd.entropy.unreadMarker == 0 ? end : next, &jd};
+BitReader open_bits(PELOJ_SOURCE& source, Entropy& entropy) {
+  const uint8_t* next = source.buffer + source.pos;
+  const uint8_t* end = next + source.avail;
+  const uint8_t* plainEnd = entropy.unreadMarker == 0 ? end : next;
+  return {entropy.state->bits, next, end, plainEnd, &source, &entropy};
 }
 
-void close_bits(PELOJ_JDINFO& jd, const BitReader& reader) {
-  jd.entropy.state->bits = reader.state;
-  jd.source->pos = static_cast<uint32_t>(reader.next - jd.source->buffer);
-  jd.source->avail = static_cast<uint32_t>(reader.end - reader.next);
+void close_bits(const BitReader& reader) {
+  reader.entropy->state->bits = reader.state;
+  reader.source->pos = static_cast<uint32_t>(reader.next - reader.source->buffer);
+  reader.source->avail = static_cast<uint32_t>(reader.end - reader.next);
 }
 
 int refill_bits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
@@ -99,7 +124,7 @@ int refill_bits(BitReader* reader, BitBuffer buffer, int bitsLeft, int needed) {
   *reader = fill_by_bytes(*reader);
   const int real = reader->state.left - reader->state.invented;
   if (real >= needed) return 1;
-  return reader->jd->entropy.unreadMarker != 0 ? 1 : 0;
+  return reader->entropy->unreadMarker != 0 ? 1 : 0;
 }
 
 int decode_code(BitReader* reader, BitBuffer buffer, int bitsLeft, const DerivedTable* derived,
@@ -108,6 +133,25 @@ int decode_code(BitReader* reader, BitBuffer buffer, int bitsLeft, const Derived
   reader->state.left = bitsLeft;
   if (bitsLeft <= kMaxCodeLength && !refill_bits(reader, buffer, bitsLeft, minBits)) return -1;
   return static_cast<int>(match_code(*reader, *derived, minBits < 1 ? 1 : minBits));
+}
+
+bool process_restart(PELOJ_SOURCE& source, Entropy& entropy, MarkerRecord& marker, int interval) {
+  EntropyState& state = *entropy.state;
+  const int real = state.bits.left - state.bits.invented;
+  if (real > 0) marker.discardedBytes += real / 8;
+  state.bits = {};
+
+  if (entropy.unreadMarker == 0 && !scan_for_marker(source, entropy, marker)) {
+    meet_end(entropy);
+    if (entropy.unreadMarker == 0) return false;
+  }
+  if (entropy.unreadMarker == restart_code(marker.nextRestart)) entropy.unreadMarker = 0;
+  marker.nextRestart = (marker.nextRestart + 1) & 7;
+  state.lastDc = {};
+  entropy.eobRun = 0;
+  state.restartsToGo = static_cast<uint32_t>(interval);
+  if (entropy.unreadMarker == 0) state.insufficient = 0;
+  return true;
 }
 
 }  // namespace pelo::jpeg

@@ -6,10 +6,13 @@
 #include <cstdint>
 #include <type_traits>
 
+#include "codec/base/buffered_source.h"
 #include "codec/base/byte_order.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
 
 namespace pelo::jpeg {
+
+struct Entropy;
 
 // The widest word that shifts in one instruction.
 using BitBuffer = std::conditional_t<sizeof(size_t) == 8, uint64_t, uint32_t>;
@@ -17,8 +20,12 @@ constexpr int kBitBufferSize = static_cast<int>(sizeof(BitBuffer) * 8);
 
 // Held after every fill. In 64 bits 32 are enough for a code and its extra bits (16 + 15), and fewer
 // than 32 leave room for four bytes at once. In 32 bits whole bytes fit in while at most 24 are held, so
-// that 25 are sure: a code, or its extra bits after another fill.
+// that 25 are sure: a code, or its extra bits after another fill. A code that is none takes 17 bits and
+// has no extra bits; an entry of the skip table (huffman.h) takes up to 27, which 32-bit buffers are
+// asked about.
 constexpr int kFilledBits = kBitBufferSize == 64 ? 32 : 25;
+constexpr int kMaxExtraBits = 15;
+static_assert(kFilledBits >= kMaxCodeLength + (kBitBufferSize == 64 ? kMaxExtraBits : 1));
 
 // What outlives an MCU. The unread bits are the lowest `left` bits of `bits`; of these the lowest
 // `invented` are zeros that no source delivered. left < invented: the decoder has consumed some of them.
@@ -34,9 +41,12 @@ struct BitReader {
   const uint8_t* next;
   const uint8_t* end;
   const uint8_t* plainEnd;  // end, or next once a marker was met: what may be read without looking
-  PELOJ_JDINFO* jd;
+  PELOJ_SOURCE* source;
+  Entropy* entropy;
 
   void fill();
+  // n: 1 to 17, and no more than are held. Shifts stay below the width: at most all bits are held, and
+  // one at least is asked for.
   uint32_t peek(int n) const {
     return static_cast<uint32_t>(state.bits >> (state.left - n)) & ((1u << n) - 1);
   }
@@ -55,11 +65,11 @@ inline int32_t extend(uint32_t v, int s) {
 }
 
 // The source has ended: for a picture in several scans, as if an EOI had been met.
-void meet_end(PELOJ_JDINFO& jd);
+void meet_end(Entropy& entropy);
 
-// Takes the reader's window from the decoder's source, and gives it back.
-BitReader open_bits(PELOJ_JDINFO& jd);
-void close_bits(PELOJ_JDINFO& jd, const BitReader& reader);
+// Takes the reader's window from the source, and gives it back.
+BitReader open_bits(PELOJ_SOURCE& source, Entropy& entropy);
+void close_bits(const BitReader& reader);
 
 // Fills by single bytes: stuffing, markers, the window's edge, the end. Returns the filled reader.
 BitReader fill_by_bytes(BitReader reader);

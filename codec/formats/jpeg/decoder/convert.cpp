@@ -1,6 +1,5 @@
-#include "codec/formats/jpeg/decoder/convert.h"
-
 #include "codec/base/axis_stepper.h"
+#include "codec/formats/jpeg/decoder/rows.h"
 
 namespace pelo::jpeg {
 namespace {
@@ -17,56 +16,53 @@ struct GreyLanes {
 // What the channels of a full-grid row are, and the writers they go to.
 struct YccRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
-    write_ycc_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
+    write_ycc_row(jd.output, row.plane[0], row.plane[1], row.plane[2], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    write_ycc_sums(&jd, jd.resampling.quarters.words(), jd.sizes.target.width);
+    write_ycc_sums(jd.output, jd.resampling.quarters.words(), jd.sizes.target.width);
   }
   using Lanes = ColourLanes;
 };
 struct RgbRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
-    write_rgb_row(&jd, row.plane[0], row.plane[1], row.plane[2], count);
+    write_rgb_row(jd.output, row.plane[0], row.plane[1], row.plane[2], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    write_rgb_sums(&jd, jd.resampling.quarters.words(), jd.sizes.target.width);
+    write_rgb_sums(jd.output, jd.resampling.quarters.words(), jd.sizes.target.width);
   }
   using Lanes = ColourLanes;
 };
 struct GreyRows {
   static void write(PELOJ_JDINFO& jd, const GridRow& row, int count) {
-    write_grey_row(&jd, row.plane[0], count);
+    write_grey_row(jd.output, row.plane[0], count);
   }
   static void write_sums(PELOJ_JDINFO& jd) {
-    write_grey_sums(&jd, jd.resampling.quarters.words(), jd.sizes.target.width);
+    write_grey_sums(jd.output, jd.resampling.quarters.words(), jd.sizes.target.width);
   }
   using Lanes = GreyLanes;
 };
 
 // The row at the read position, from the crop offset on.
-GridRow grid_row(const PELOJ_JDINFO& jd, int row) {
+GridRow grid_row(const Frame& frame, int row, int cropX) {
   GridRow grid{};
-  for (int c = 0; c < jd.frame.componentCount; ++c) {
-    grid.plane[c] =
-        (*jd.frame.components)[static_cast<size_t>(c)].colourRows[jd.progress.readPosition + row] +
-        jd.sizes.cropX;
+  for (int c = 0; c < frame.componentCount; ++c) {
+    grid.plane[c] = (*frame.components)[static_cast<size_t>(c)].colourRows[row] + cropX;
   }
   return grid;
 }
 
 // True when an input row holds the sample point with offset q of output row y:
 // 0 <= y * inH + q - i * outH < outH.
-bool holds_point(const PELOJ_JDINFO& jd, int inputRow, int outputRow, int q) {
+bool holds_point(const Sizes& sizes, int inputRow, int outputRow, int q) {
   const int64_t distance =
-      int64_t{outputRow} * jd.sizes.used.height + q - int64_t{inputRow} * jd.sizes.target.height;
-  return distance >= 0 && distance < jd.sizes.target.height;
+      int64_t{outputRow} * sizes.used.height + q - int64_t{inputRow} * sizes.target.height;
+  return distance >= 0 && distance < sizes.target.height;
 }
-bool holds_quarter(const PELOJ_JDINFO& jd, int outputRow) {
-  return holds_point(jd, jd.resampling.inputRow, outputRow, jd.sizes.used.height / 4);
+bool holds_quarter(const Sizes& sizes, int inputRow, int outputRow) {
+  return holds_point(sizes, inputRow, outputRow, sizes.used.height / 4);
 }
-bool holds_three_quarters(const PELOJ_JDINFO& jd, int outputRow) {
-  return holds_point(jd, jd.resampling.inputRow, outputRow,
-                     static_cast<int>(int64_t{3} * jd.sizes.used.height / 4));
+bool holds_three_quarters(const Sizes& sizes, int inputRow, int outputRow) {
+  return holds_point(sizes, inputRow, outputRow, static_cast<int>(int64_t{3} * sizes.used.height / 4));
 }
 
 // Serves the next output row from the current input row. A row is opened by its quarter point and closed
@@ -75,30 +71,31 @@ bool holds_three_quarters(const PELOJ_JDINFO& jd, int outputRow) {
 template <class Rows>
 bool serve_output_row(PELOJ_JDINFO& jd, const GridRow& row) {
   const int y = jd.output.emitted;
-  if (holds_quarter(jd, y)) jd.resampling.quarters.open<typename Rows::Lanes>(row);
-  if (!holds_three_quarters(jd, y)) return false;
+  if (holds_quarter(jd.sizes, jd.resampling.inputRow, y))
+    jd.resampling.quarters.open<typename Rows::Lanes>(row);
+  if (!holds_three_quarters(jd.sizes, jd.resampling.inputRow, y)) return false;
   jd.resampling.quarters.close<typename Rows::Lanes>(row);
   Rows::write_sums(jd);
   return true;
 }
 
 // True when the band is full and the picture goes on: the input row may have points of its next row too.
-bool pauses(const PELOJ_JDINFO& jd) {
-  return jd.output.emitted == jd.output.bandEnd && jd.output.emitted < jd.output.limit;
+bool pauses(const RowOutput& output) {
+  return output.emitted == output.bandEnd && output.emitted < output.limit;
 }
 
 // Four-point averages; every row of the call is used up.
 template <class Rows>
 void convert_averaging(PELOJ_JDINFO& jd, int rows) {
   for (int i = 0; i < rows; ++i, ++jd.resampling.inputRow) {
-    const GridRow row = grid_row(jd, i);
+    const GridRow row = grid_row(jd.frame, jd.progress.readPosition + i, jd.sizes.cropX);
     if (jd.sizes.exact) {
       Rows::write(jd, row, jd.sizes.target.width);
       continue;
     }
     while (jd.output.emitted < jd.output.bandEnd && serve_output_row<Rows>(jd, row)) {
     }
-    if (pauses(jd)) return;
+    if (pauses(jd.output)) return;
   }
   jd.resampling.continueFlag = 0;
 }
@@ -106,75 +103,78 @@ void convert_averaging(PELOJ_JDINFO& jd, int rows) {
 // The same for enlarging: one output row a call.
 template <class Rows>
 void convert_enlarging(PELOJ_JDINFO& jd, int rows) {
-  if (rows > 0 && serve_output_row<Rows>(jd, grid_row(jd, 0))) {
+  if (rows > 0 &&
+      serve_output_row<Rows>(jd, grid_row(jd.frame, jd.progress.readPosition, jd.sizes.cropX))) {
     // More points may fall into this input row.
-    if (jd.output.emitted < jd.output.limit && holds_quarter(jd, jd.output.emitted)) return;
+    if (jd.output.emitted < jd.output.limit &&
+        holds_quarter(jd.sizes, jd.resampling.inputRow, jd.output.emitted))
+      return;
   }
   jd.resampling.continueFlag = 0;
   jd.resampling.inputRow += rows;
 }
 
 // Centre points. A row may be none's centre, or that of several rows of an enlarged picture.
-template <auto WriteRow>
 void convert_picking(PELOJ_JDINFO& jd, int rows) {
   for (int i = 0; i < rows; ++i, ++jd.resampling.inputRow) {
-    const GridRow row = grid_row(jd, i);
+    const GridRow row = grid_row(jd.frame, jd.progress.readPosition + i, jd.sizes.cropX);
     if (jd.sizes.exact) {
       YccRows::write(jd, row, jd.sizes.target.width);
       continue;
     }
     while (jd.output.emitted < jd.output.bandEnd &&
-           holds_point(jd, jd.resampling.inputRow, jd.output.emitted, jd.sizes.used.height / 2)) {
-      WriteRow(&jd, row.plane[0], row.plane[1], row.plane[2], jd.sizes.target.width);
+           holds_point(jd.sizes, jd.resampling.inputRow, jd.output.emitted, jd.sizes.used.height / 2)) {
+      write_picked_row(jd.output, jd.resampling.centres.data(), row.plane[0], row.plane[1], row.plane[2],
+                       jd.sizes.target.width);
     }
-    if (pauses(jd)) return;
+    if (pauses(jd.output)) return;
   }
   jd.resampling.continueFlag = 0;
 }
 
 // Small pictures, coarse modes, and in mode 1 pictures that hardly shrink take the fast converter.
-bool wants_fast(const PELOJ_JDINFO& jd) {
-  if (jd.sizes.output.width <= 99 && jd.sizes.output.height <= 99) return true;
-  if (jd.decMode >= 2) return true;
-  return jd.decMode == 1 && int64_t{12} * jd.sizes.output.width >= int64_t{7} * jd.sizes.scaled.width &&
-         int64_t{12} * jd.sizes.output.height >= int64_t{7} * jd.sizes.scaled.height;
+bool wants_fast(const Sizes& sizes, int decMode) {
+  if (sizes.output.width <= 99 && sizes.output.height <= 99) return true;
+  if (decMode >= 2) return true;
+  return decMode == 1 && int64_t{12} * sizes.output.width >= int64_t{7} * sizes.scaled.width &&
+         int64_t{12} * sizes.output.height >= int64_t{7} * sizes.scaled.height;
 }
 
 }  // namespace
 
-bool choose_converter(PELOJ_JDINFO& jd) {
+bool choose_converter(ColourSpace colourSpace, const Sizes& sizes, int decMode, Resampling& resampling) {
   const bool larger =
-      jd.sizes.output.width > jd.sizes.scaled.width || jd.sizes.output.height > jd.sizes.scaled.height;
-  jd.resampling.sampling = Sampling::kQuarters;
-  switch (jd.frame.colourSpace) {
+      sizes.output.width > sizes.scaled.width || sizes.output.height > sizes.scaled.height;
+  resampling.sampling = Sampling::kQuarters;
+  switch (colourSpace) {
     case ColourSpace::kYcc:
-      if (larger ? jd.decMode >= 2 : wants_fast(jd)) {
-        jd.resampling.sampling = Sampling::kCentres;
-        jd.resampling.convert = larger ? pick_enlarging_ycc : pick_ycc;
+      if (larger ? decMode >= 2 : wants_fast(sizes, decMode)) {
+        resampling.sampling = Sampling::kCentres;
+        resampling.convert = larger ? pick_enlarging_ycc : pick_ycc;
       } else {
-        jd.resampling.convert = larger ? enlarge_ycc : average_ycc;
+        resampling.convert = larger ? enlarge_ycc : average_ycc;
       }
       return true;
     case ColourSpace::kGrey:
-      jd.resampling.convert = larger ? enlarge_grey : average_grey;
+      resampling.convert = larger ? enlarge_grey : average_grey;
       return true;
     case ColourSpace::kRgb:
-      jd.resampling.convert = larger ? enlarge_rgb : average_rgb;
+      resampling.convert = larger ? enlarge_rgb : average_rgb;
       return true;
     default:
       return false;
   }
 }
 
-bool prepare_resampling(PELOJ_JDINFO& jd) {
-  if (jd.sizes.exact) return true;
-  if (jd.resampling.sampling == Sampling::kQuarters)
-    return jd.resampling.quarters.prepare(jd.sizes.used.width, jd.sizes.target.width);
-  const auto width = static_cast<size_t>(jd.sizes.target.width);
-  if (!jd.resampling.centres.allocate(width)) return false;
-  AxisStepper centre(jd.sizes.used.width, jd.sizes.target.width, jd.sizes.used.width / 2);
+bool prepare_resampling(const Sizes& sizes, Resampling& resampling) {
+  if (sizes.exact) return true;
+  if (resampling.sampling == Sampling::kQuarters)
+    return resampling.quarters.prepare(sizes.used.width, sizes.target.width);
+  const auto width = static_cast<size_t>(sizes.target.width);
+  if (!resampling.centres.allocate(width)) return false;
+  AxisStepper centre(sizes.used.width, sizes.target.width, sizes.used.width / 2);
   for (size_t x = 0; x < width; ++x, centre.advance()) {
-    jd.resampling.centres[x] = static_cast<uint16_t>(centre.position());
+    resampling.centres[x] = static_cast<uint16_t>(centre.position());
   }
   return true;
 }
@@ -186,10 +186,10 @@ void enlarge_ycc(PELOJ_JDINFO* jdInfo, int rows) {
   convert_enlarging<YccRows>(*jdInfo, rows);
 }
 void pick_ycc(PELOJ_JDINFO* jdInfo, int rows) {
-  convert_picking<write_picked_row>(*jdInfo, rows);
+  convert_picking(*jdInfo, rows);
 }
 void pick_enlarging_ycc(PELOJ_JDINFO* jdInfo, int rows) {
-  convert_picking<write_picked_enlarged_row>(*jdInfo, rows);
+  convert_picking(*jdInfo, rows);
 }
 void average_grey(PELOJ_JDINFO* jdInfo, int rows) {
   convert_averaging<GreyRows>(*jdInfo, rows);

@@ -1,6 +1,6 @@
-#include "codec/formats/jpeg/decoder/decode_size.h"
-
 #include <algorithm>
+
+#include "codec/formats/jpeg/decoder/headers.h"
 
 namespace pelo::jpeg {
 namespace {

@@ -70,7 +70,8 @@ int PELOJ_ValorenDecodeFrame(TAVIRPELO_DECINFO* decInfo, PELOJ_SOURCE* source, v
 
 int PELOJ_PrepareDerivedTbl(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
                             const DerivedTable** derivedOut, EntropyState* entropy) {
-  return jpeg::derive_table(jdInfo, isDC, tableNumber, derivedOut, entropy);
+  EntropyState* skipping = jpeg::skip_tables(*jdInfo) != nullptr ? entropy : nullptr;
+  return jpeg::derive_table(jdInfo->tables, isDC != 0, tableNumber, skipping, derivedOut);
 }
 
 int PELOJ_DecodeSingleiMcu(PELOJ_JDINFO* jdInfo, uint8_t***) {
@@ -85,8 +86,8 @@ void PELOJ_DeleteDecoderInfo(PELOJ_JDINFO* jdInfo) {
   jpeg::clear_decoder(jdInfo);
 }
 
-int PELOJ_ParseHeader(PELOJ_JDINFO* jdInfo, int unused1) {
-  return jpeg::parse_header(jdInfo, unused1);
+int PELOJ_ParseHeader(PELOJ_JDINFO* jdInfo, int) {
+  return jpeg::parse_header(jdInfo);
 }
 
 int PELOJ_ParseNextMarker(PELOJ_JDINFO* jdInfo, int* status) {
@@ -118,7 +119,8 @@ int PELOJ_DecodeMcu8to1(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
 }
 
 int PELOJ_ProcessRestartMarker(PELOJ_JDINFO* jdInfo) {
-  return jpeg::process_restart(jdInfo);
+  return jpeg::process_restart(*jdInfo->source, jdInfo->entropy, *jdInfo->marker,
+                               jdInfo->scan.restartInterval);
 }
 
 int PELOJ_SetupScanInfo(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
@@ -151,38 +153,38 @@ int PELOJ_ProgIDct(PELOJ_JDINFO* jdInfo, uint8_t***) {
 
 void PELOJ_YcbcrWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
                                 const uint8_t* cr, int count) {
-  jpeg::write_ycc_row(jdInfo, y, cb, cr, count);
+  jpeg::write_ycc_row(jdInfo->output, y, cb, cr, count);
 }
 
 void PELOJ_GrayWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count) {
-  jpeg::write_grey_row(jdInfo, y, count);
+  jpeg::write_grey_row(jdInfo->output, y, count);
 }
 
 void PELOJ_RGBWriteOutput1to1(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, const uint8_t* b,
                               int count) {
-  jpeg::write_rgb_row(jdInfo, r, g, b, count);
+  jpeg::write_rgb_row(jdInfo->output, r, g, b, count);
 }
 
 void PELOJ_FastYcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
                                 const uint8_t* cr, int count) {
-  jpeg::write_picked_row(jdInfo, y, cb, cr, count);
+  jpeg::write_picked_row(jdInfo->output, jdInfo->resampling.centres.data(), y, cb, cr, count);
 }
 
 void PELOJ_FastYcbcrUpscaleWriteOutput(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
                                        const uint8_t* cr, int count) {
-  jpeg::write_picked_enlarged_row(jdInfo, y, cb, cr, count);
+  jpeg::write_picked_row(jdInfo->output, jdInfo->resampling.centres.data(), y, cb, cr, count);
 }
 
 void PELOJ_YcbcrWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  jpeg::write_ycc_sums(jdInfo, sums, count);
+  jpeg::write_ycc_sums(jdInfo->output, sums, count);
 }
 
 void PELOJ_GrayWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  jpeg::write_grey_sums(jdInfo, sums, count);
+  jpeg::write_grey_sums(jdInfo->output, sums, count);
 }
 
 void PELOJ_RGBWriteOutput(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  jpeg::write_rgb_sums(jdInfo, sums, count);
+  jpeg::write_rgb_sums(jdInfo->output, sums, count);
 }
 
 int PELOJ_ProcessData(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int rowsWanted) {
@@ -210,25 +212,24 @@ int PELOJ_InitDecBeforeScan(PELOJ_JDINFO* jdInfo) {
 }
 
 void PELOJ_SetupiMcu(PELOJ_JDINFO* jdInfo) {
-  jpeg::begin_imcu_row(jdInfo);
+  jpeg::begin_imcu_row(jdInfo->scan, jdInfo->progress.imcuRow);
 }
 
-void PELOJ_DoFullsizeUpsample(PELOJ_JDINFO* jdInfo, Component* unused1, uint8_t** input,
-                              uint8_t*** slot) {
-  jpeg::use_rows_as_they_are(jdInfo, unused1, input, slot);
+void PELOJ_DoFullsizeUpsample(PELOJ_JDINFO* jdInfo, Component*, uint8_t** input, uint8_t*** slot) {
+  jpeg::use_rows_as_they_are(jdInfo->frame.vMax, input, *slot);
 }
 
 void PELOJ_DoH2V1Upsample(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
-  jpeg::replicate_h2v1(jdInfo, component, input, slot);
+  jpeg::replicate_rows(*component, jdInfo->frame.vMax, input, *slot);
 }
 
 void PELOJ_DoH2V2Upsample(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input, uint8_t*** slot) {
-  jpeg::replicate_h2v2(jdInfo, component, input, slot);
+  jpeg::replicate_rows(*component, jdInfo->frame.vMax, input, *slot);
 }
 
 void PELOJ_DoIntegralUpsample(PELOJ_JDINFO* jdInfo, Component* component, uint8_t** input,
                               uint8_t*** slot) {
-  jpeg::replicate_integral(jdInfo, component, input, slot);
+  jpeg::replicate_rows(*component, jdInfo->frame.vMax, input, *slot);
 }
 
 void PELOJ_SetupUpsample(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int capacity) {
@@ -240,7 +241,7 @@ void PELOJ_SkipRowUpsample(PELOJ_JDINFO* jdInfo, uint8_t**, int* rowCounter, int
 }
 
 int PELOJ_InitUpsampler(PELOJ_JDINFO* jdInfo) {
-  return jpeg::prepare_upsampling(jdInfo);
+  return jpeg::prepare_upsampling(jdInfo->frame, jdInfo->sizes.scale, jdInfo->progress);
 }
 
 uint8_t** PELOJ_AllocSampleArry(int width, int rows) {
@@ -272,3 +273,29 @@ int PELOJ_RotateImage270(void* buffer, int width, int height, int outFormat) {
 int PELOJ_DecodeUncompressThumbnail(void) {
   return 1;
 }
+
+// One member each, of one argument list.
+#define PELOJ_FORWARD_IDCT(name, ...)                                                              \
+  void name(const uint8_t*, const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, \
+            int column) {                                                                          \
+    jpeg::__VA_ARGS__(multiplier, block, rows, column);                                            \
+  }
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct8By8, idct8<8, 8>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct, idct8<8, 8>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct4By4, idct8<4, 4>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct3By3, idct8<3, 3>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2By2, idct8_corner)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2By2All, idct8<2, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2By1, idct8<2, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1By2, idct8<1, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1By1, idct8<1, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct4x4For4x4, idct4<4, 4>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct3x3For4x4, idct4<3, 3>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2x2For4x4, idct4_corner)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2x2AllFor4x4, idct4<2, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct2x1For4x4, idct4<2, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1x2For4x4, idct4<1, 2>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct1x1For4x4, idct4<1, 1>)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct_2to1, idct_reduced4)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct_8to3, idct_reduced3)
+PELOJ_FORWARD_IDCT(PELOJ_DoIdct_4to1, idct_reduced2)

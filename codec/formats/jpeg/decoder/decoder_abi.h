@@ -4,19 +4,16 @@
 #pragma once
 
 #include "codec/formats/jpeg/decoder/bit_reader.h"
-#include "codec/formats/jpeg/decoder/convert.h"
 #include "codec/formats/jpeg/decoder/driver.h"
+#include "codec/formats/jpeg/decoder/headers.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
+#include "codec/formats/jpeg/decoder/idct.h"
 #include "codec/formats/jpeg/decoder/imcu_row.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
-#include "codec/formats/jpeg/decoder/markers.h"
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
 #include "codec/formats/jpeg/decoder/row_output.h"
-#include "codec/formats/jpeg/decoder/row_process.h"
-#include "codec/formats/jpeg/decoder/scan_list.h"
-#include "codec/formats/jpeg/decoder/scan_setup.h"
-#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/decoder/rows.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 
 // Refills reader->state from the given buffer and count. 1: the state holds `needed` bits, or zeros in
 // place of those that a marker cut off; 0: the source ended and fewer than `needed` bits are real.
@@ -180,3 +177,34 @@ TAVIRPELO_API int PELOJ_InitUpsampler(PELOJ_JDINFO* jdInfo);
 // `rows` row pointers and their samples in one block, freed with TAVIRPELO_OsFree; null for zero sizes
 // or when memory is short.
 TAVIRPELO_API uint8_t** PELOJ_AllocSampleArry(int width, int rows);
+
+// The inverse transforms. range: unused (clamping is arithmetic: hostile coefficients leave any table).
+#define PELOJ_IDCT(name)                                                                         \
+  TAVIRPELO_API void name(const uint8_t* range, const int32_t* multiplier, const int32_t* block, \
+                          uint8_t* const* rows, int column)
+
+// 8x8 samples; NByM reads the first M rows and N columns of coefficients, 2By2 chooses between 1By2 and
+// 2By2All. PELOJ_DoIdct reads all, for blocks of unknown extent.
+PELOJ_IDCT(PELOJ_DoIdct8By8);
+PELOJ_IDCT(PELOJ_DoIdct);
+PELOJ_IDCT(PELOJ_DoIdct4By4);
+PELOJ_IDCT(PELOJ_DoIdct3By3);
+PELOJ_IDCT(PELOJ_DoIdct2By2);
+PELOJ_IDCT(PELOJ_DoIdct2By2All);
+PELOJ_IDCT(PELOJ_DoIdct2By1);
+PELOJ_IDCT(PELOJ_DoIdct1By2);
+PELOJ_IDCT(PELOJ_DoIdct1By1);
+
+// 4x4 samples from the 4-point transform (scale 1/2).
+PELOJ_IDCT(PELOJ_DoIdct4x4For4x4);
+PELOJ_IDCT(PELOJ_DoIdct3x3For4x4);
+PELOJ_IDCT(PELOJ_DoIdct2x2For4x4);
+PELOJ_IDCT(PELOJ_DoIdct2x2AllFor4x4);
+PELOJ_IDCT(PELOJ_DoIdct2x1For4x4);
+PELOJ_IDCT(PELOJ_DoIdct1x2For4x4);
+PELOJ_IDCT(PELOJ_DoIdct1x1For4x4);
+
+// 4x4, 3x3 and 2x2 samples: means or picks of the 8-point transform's outputs.
+PELOJ_IDCT(PELOJ_DoIdct_2to1);
+PELOJ_IDCT(PELOJ_DoIdct_8to3);
+PELOJ_IDCT(PELOJ_DoIdct_4to1);

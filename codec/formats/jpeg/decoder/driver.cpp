@@ -1,14 +1,10 @@
 #include "codec/formats/jpeg/decoder/driver.h"
 
 #include "codec/base/errors.h"
-#include "codec/formats/jpeg/decoder/convert.h"
-#include "codec/formats/jpeg/decoder/decode_size.h"
-#include "codec/formats/jpeg/decoder/markers.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
-#include "codec/formats/jpeg/decoder/row_process.h"
-#include "codec/formats/jpeg/decoder/scan_list.h"
-#include "codec/formats/jpeg/decoder/scan_setup.h"
-#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/decoder/headers.h"
+#include "codec/formats/jpeg/decoder/imcu_row.h"
+#include "codec/formats/jpeg/decoder/rows.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
@@ -49,7 +45,7 @@ void take_wishes(PELOJ_JDINFO& jd, TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE* sou
 
 // Headers to output position; false with a line in the log.
 bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
-  const int parsed = parse_header(&jd, 0);
+  const int parsed = parse_header(&jd);
   request.imageWidth = jd.frame.width;
   request.imageHeight = jd.frame.height;
   request.componentCount = jd.frame.componentCount;
@@ -66,7 +62,7 @@ bool initialize(PELOJ_JDINFO& jd, PELOJ_REQUEST& request) {
   jd.decInfo->outWidth = jd.sizes.output.width;
   jd.decInfo->outHeight = jd.sizes.output.height;
   set_output(jd, request.outBuffer, jd.decInfo->option);
-  if (!prepare_resampling(jd)) {
+  if (!prepare_resampling(jd.sizes, jd.resampling)) {
     refuse(Reason::kNoMemory, kStage);
     return log_error("PELOJ_Initialize : malloc fail"), false;
   }
@@ -130,6 +126,7 @@ int decode_rows(PELOJ_JDINFO& jd) {
 }
 
 }  // namespace
+
 void clear_decoder(PELOJ_JDINFO* jdInfo) {
   if (jdInfo == nullptr) return;
   const int width = jdInfo->frame.width;
@@ -144,14 +141,14 @@ void clear_decoder(PELOJ_JDINFO* jdInfo) {
 }
 
 int start_decompression(PELOJ_JDINFO* jdInfo) {
-  if (!choose_converter(*jdInfo)) {
+  if (!choose_converter(jdInfo->frame.colourSpace, jdInfo->sizes, jdInfo->decMode, jdInfo->resampling)) {
     return fail("PELOJ_StartDecompression : unsupported color space");
   }
   for (int c = 0; c < jdInfo->frame.componentCount; ++c) {
     lay_out(jdInfo->frame, jdInfo->sizes.scale, (*jdInfo->frame.components)[static_cast<size_t>(c)]);
   }
   jdInfo->progress.imcuRows = jdInfo->frame.mcus_down();
-  if (prepare_upsampling(jdInfo) != PELOJ_OK) {
+  if (prepare_upsampling(jdInfo->frame, jdInfo->sizes.scale, jdInfo->progress) != PELOJ_OK) {
     return fail("PELOJ_StartDecompression : PELOJ_InitUpsampler fail");
   }
   if (prepare_before_scan(jdInfo) != PELOJ_OK) {

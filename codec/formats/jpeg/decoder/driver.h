@@ -2,10 +2,13 @@
 //
 // How to read this room: decode_jpeg.cpp chooses between picture and thumbnail, driver.cpp sets a decode
 // up and runs it, over the records of jd_info.h.
-//   headers  markers, then decode_size, convert and upsample (which choose their methods), scan_setup
-//   a row    row_process asks imcu_row for one iMCU row: mcu_decode over bit_reader and huffman, then an
-//            idct_*; of several scans progressive does, over scan_list and progressive_mcu
-//   shown    upsample brings it to the full grid, convert to the target size, row_output to pixels
+//   headers.h   markers parses them, decode_size chooses sizes and scale
+//   scans.h     scan_setup lays a scan out and makes its tables (huffman), scan_list holds several
+//   imcu_row.h  imcu_row decodes one iMCU row of samples: mcu_decode over bit_reader, then a transform
+//   of
+//               idct.h; of progressive pictures progressive does, over progressive_mcu
+//   rows.h      rows shows that row by row: replicated to the full grid, then by convert at the target
+//               size; row_output makes pixels of it
 #pragma once
 
 #include "codec/base/os_memory.h"

@@ -88,19 +88,19 @@ int no_memory() {
 
 }  // namespace
 
-int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedTable** derivedOut,
-                 EntropyState* entropy) {
+int derive_table(Tables& tables, bool isDc, int tableNumber, EntropyState* skipping,
+                 const DerivedTable** derivedOut) {
   if (tableNumber < 0 || tableNumber > 3) return PELOJ_FAIL;
   const auto number = static_cast<size_t>(tableNumber);
-  const HuffmanSpec* raw = isDC ? jdInfo->tables.dcRaw[number] : jdInfo->tables.acRaw[number];
-  if (raw == nullptr || jdInfo->tables.derivedCount >= kTablePoolSize) return PELOJ_FAIL;
+  const HuffmanSpec* raw = isDc ? tables.dcRaw[number] : tables.acRaw[number];
+  if (raw == nullptr || tables.derivedCount >= kTablePoolSize) return PELOJ_FAIL;
   auto table = os_new<DerivedTable>();
   if (!table) return no_memory();
 
   table->raw = raw;
   if (!derive_codes(*raw, *table)) return 0;
   fill_lookup(*raw, *table);
-  if (isDC) {
+  if (isDc) {
     int symbols = 0;
     for (const uint8_t count : raw->counts) symbols += count;
     for (int i = 0; i < symbols; ++i) {
@@ -108,13 +108,13 @@ int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber, const DerivedT
     }
   } else {
     fill_coefficients(*table);
-    if (jdInfo->marker->frameType == FrameType::kBaseline && jdInfo->sizes.scale != kFull) {
+    if (skipping != nullptr) {
       if (!build_skip_table(*table)) return no_memory();
-      entropy->skip[number] = table->skip.get();
+      skipping->skip[number] = table->skip.get();
     }
   }
   *derivedOut = table.get();
-  jdInfo->tables.derivedPool[jdInfo->tables.derivedCount++] = std::move(table);
+  tables.derivedPool[tables.derivedCount++] = std::move(table);
   return PELOJ_OK;
 }
 

@@ -8,8 +8,6 @@
 #include "codec/base/os_memory.h"
 #include "codec/formats/jpeg/tables.h"
 
-typedef struct PELOJ_JDINFO PELOJ_JDINFO;
-
 namespace pelo::jpeg {
 
 // Bits looked at in one step. Most codes of a photograph are shorter; a table stays within 2 KiB, so
@@ -19,9 +17,11 @@ constexpr uint32_t kLookSize = 1u << kLookBits;
 constexpr int kMaxCodeLength = 16;
 
 // By the next kSkipBits bits: how far the complete AC codes in them move the position. Wider than a look
-// at single codes: the wait for one entry passes several of them.
-//   bits 0-15   bits used, with the extra bits of the last code (may exceed kSkipBits)
-//   bits 16-22  coefficient positions passed
+// at single codes: the wait for one entry passes several of them. Four bytes for each of 2^12 values are
+// half of a first-level cache, which the sample rows of reduced scales leave free; a bit more would take
+// all of it.
+//   bits 0-15   bits used, with the extra bits of the last code: up to kSkipBits + 15
+//   bits 16-22  coefficient positions passed: below 64 before the last code, which passes up to 16
 //   bit 23      an end-of-block code was reached
 // 0: not even the first code fits.
 constexpr int kSkipBits = 12;
@@ -49,11 +49,13 @@ struct DerivedTable {
 };
 
 struct EntropyState;
+struct Tables;
 
-// Makes the table of a class and number ready for a scan. It lives in the state's pool and goes to
-// *derivedOut, its skip table, where it has one, to `entropy`. 200; 201 when there is nothing to derive
-// from or memory is short; 0 when no encoder can have meant the table (T.81 C.2, F.1.2.1.1).
-int derive_table(PELOJ_JDINFO* jdInfo, int isDC, int tableNumber,
-                 const pelo::jpeg::DerivedTable** derivedOut, pelo::jpeg::EntropyState* entropy);
+// Makes the table of a class and number ready for a scan. It lives in the pool of `tables` and goes to
+// *derivedOut; an AC table gets a skip table, which goes to `skipping`, unless that is null. 200; 201
+// when there is nothing to derive from or memory is short; 0 when no encoder can have meant the table
+// (T.81 C.2, F.1.2.1.1).
+int derive_table(Tables& tables, bool isDc, int tableNumber, EntropyState* skipping,
+                 const DerivedTable** derivedOut);
 
 }  // namespace pelo::jpeg

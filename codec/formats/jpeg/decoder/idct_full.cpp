@@ -77,10 +77,6 @@ void transform_square(const int32_t* multiplier, const int32_t* block, uint8_t* 
   store_samples(x, rows, column);
 }
 
-inline void fill_rows(uint8_t sample, uint8_t* const* rows, int column) {
-  for (int r = 0; r < 8; ++r) std::memset(rows[r] + column, sample, 8);
-}
-
 // Rows that are flat each: there is no horizontal detail.
 void transform_column(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows,
                       int column) {
@@ -104,53 +100,36 @@ uint8_t idct_dc(int32_t multiplier, int32_t dc) {
   return to_sample(dequantise(dc, multiplier));
 }
 
-InverseDct idct_full(int lastPosition) {
-  if (lastPosition == 0) return PELOJ_DoIdct1By1;
-  if (lastPosition == 1) return PELOJ_DoIdct2By1;
-  if (lastPosition <= 3) return PELOJ_DoIdct2By2;
-  if (lastPosition <= 8) return PELOJ_DoIdct3By3;
-  if (lastPosition <= 13) return PELOJ_DoIdct4By4;
-  return PELOJ_DoIdct8By8;
+template <int Columns, int Rows>
+void idct8(const int32_t* multiplier, const int32_t* block, uint8_t* const* rows, int column) {
+  if constexpr (Columns > 1 && Rows > 1) {
+    static_assert(Columns == Rows);
+    transform_square<Rows>(multiplier, block, rows, column);
+  } else if constexpr (Rows > 1) {
+    transform_column(multiplier, block, rows, column);
+  } else if constexpr (Columns > 1) {
+    transform_row(multiplier, block, rows, column);
+  } else {
+    const uint8_t sample = idct_dc(multiplier[0], block[0]);
+    for (int r = 0; r < 8; ++r) std::memset(rows[r] + column, sample, 8);
+  }
 }
+
+template void idct8<8, 8>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct8<4, 4>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct8<3, 3>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct8<2, 2>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct8<2, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct8<1, 2>(const int32_t*, const int32_t*, uint8_t* const*, int);
+template void idct8<1, 1>(const int32_t*, const int32_t*, uint8_t* const*, int);
+
+// One coefficient of a square member's share lies outside its square and is left out: position 3 (row 2,
+// column 0) of 2x2, 6 (row 0, column 3) of 3x3 and 10 (row 4, column 0) of 4x4.
+constinit const IdctTable kFullIdct = idct_table({{0, idct8<1, 1>},
+                                                  {1, idct8<2, 1>},
+                                                  {3, idct8_corner},
+                                                  {8, idct8<3, 3>},
+                                                  {13, idct8<4, 4>},
+                                                  {63, idct8<8, 8>}});
 
 }  // namespace pelo::jpeg
-
-using namespace pelo::jpeg;
-
-void PELOJ_DoIdct8By8(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                      uint8_t* const* rows, int column) {
-  transform_square<8>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct(const uint8_t*, const int32_t* multiplier, const int32_t* block, uint8_t* const* rows,
-                  int column) {
-  transform_square<8>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct4By4(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                      uint8_t* const* rows, int column) {
-  transform_square<4>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct3By3(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                      uint8_t* const* rows, int column) {
-  transform_square<3>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct2By2All(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                         uint8_t* const* rows, int column) {
-  transform_square<2>(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct1By2(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                      uint8_t* const* rows, int column) {
-  transform_column(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct2By2(const uint8_t* range, const int32_t* multiplier, const int32_t* block,
-                      uint8_t* const* rows, int column) {
-  const bool noHorizontal = block[1] == 0 && block[9] == 0;
-  (noHorizontal ? PELOJ_DoIdct1By2 : PELOJ_DoIdct2By2All)(range, multiplier, block, rows, column);
-}
-void PELOJ_DoIdct2By1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                      uint8_t* const* rows, int column) {
-  transform_row(multiplier, block, rows, column);
-}
-void PELOJ_DoIdct1By1(const uint8_t*, const int32_t* multiplier, const int32_t* block,
-                      uint8_t* const* rows, int column) {
-  fill_rows(idct_dc(multiplier[0], block[0]), rows, column);
-}

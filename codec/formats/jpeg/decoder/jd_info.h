@@ -54,13 +54,14 @@ struct Component {
   int scaledWidth;                          // downsampled width at the decode scale
   int mcuWidth, mcuHeight, mcuBlocks;       // blocks of one MCU of the current scan
   int lastColumnWidth, lastRowHeight;       // blocks of the last MCU inside the picture
-  uint8_t hExpand, vExpand;                 // replication to the full grid
-  void (*upsample)(PELOJ_JDINFO*, Component*, uint8_t**, uint8_t***);
-  QuantTable* table;                   // sequential: the one that its scan found
-  std::array<int32_t, 64> multiplier;  // dequantisation, natural order
-  SampleRows samples;                  // one iMCU row
-  SampleRows colour;                   // replicated rows; empty when the samples are used as they are
-  uint8_t* colourRows[kMaxSampling];   // the current row group on the full grid
+  uint8_t hExpand, vExpand;                 // replication to the full grid; 1 and 1: none
+  QuantTable* table;                        // sequential: the one that its scan found
+  std::array<int32_t, 64> multiplier;       // dequantisation, natural order
+  SampleRows samples;                       // one iMCU row
+  SampleRows colour;                  // replicated rows; empty when the samples are used as they are
+  uint8_t* colourRows[kMaxSampling];  // the current row group on the full grid
+
+  bool on_full_grid() const { return hExpand == 1 && vExpand == 1; }
 };
 
 struct MarkerRecord {
@@ -94,14 +95,18 @@ struct Scale {
 };
 constexpr Scale kFull{1, 0}, kHalf{1, 1}, kThreeEighths{3, 3}, kQuarter{1, 2}, kEighth{1, 3};
 
-// A scan between visits: its header, and where its decoding stands.
-constexpr size_t kMaxScans = 30;
-struct ScanRecord {
+// A scan's header (T.81 B.2.3).
+struct ScanHeader {
   int componentCount;
   std::array<Component*, kMaxComponents> components;
-  int lastComponent;
+  int lastComponent;  // frame index
   int ss, se, ah, al;
-  int restartInterval;
+  int restartInterval;  // MCUs; 0: none
+};
+
+// A scan between visits: its header, and where its decoding stands.
+struct ScanRecord {
+  ScanHeader header;
   EntropyState entropy;
   uint32_t sourcePosition;  // next unread byte
   uint32_t eobRun;
@@ -157,12 +162,7 @@ struct Tables {
 };
 
 // The current scan: its header, and the layout of its MCUs.
-struct Scan {
-  int componentCount;
-  std::array<Component*, kMaxComponents> components;
-  int lastComponent;  // frame index
-  int ss, se, ah, al;
-  int restartInterval;  // MCUs; 0: none
+struct Scan : ScanHeader {
   int mcuBlocks;
   std::array<uint8_t, kMaxMcuBlocks> blockComponent;  // scan position
   int mcusPerRow;
@@ -179,6 +179,14 @@ struct Entropy {
   std::array<uint8_t, kMaxMcuBlocks> lastPosition;  // zig-zag, last non-zero coefficient
   OsBuffer<int32_t> coefficients;                   // one MCU
   std::array<int32_t*, kMaxMcuBlocks> blocks;
+};
+
+// Pictures in several scans: where each stands, and what they have in common of a progressive one.
+constexpr size_t kMaxScans = 30;
+struct ScanList {
+  std::array<OsPtr<ScanRecord>, kMaxScans> records;
+  size_t count;                                                // 0 while the header's scan alone is read
+  std::array<OsBuffer<int32_t>, kMaxComponents> coefficients;  // one iMCU row, 64 a block
 };
 
 // Sizes in pixels, in the order in which a picture passes through them. The inverse transform makes of
@@ -235,11 +243,7 @@ struct PELOJ_JDINFO {
   pelo::jpeg::Scan scan;
   pelo::jpeg::Entropy entropy;
 
-  // Pictures in several scans.
-  std::array<pelo::OsPtr<pelo::jpeg::ScanRecord>, pelo::jpeg::kMaxScans> scans;
-  size_t scanCount;  // 0 while the header's scan alone is read
-  std::array<pelo::OsBuffer<int32_t>, pelo::jpeg::kMaxComponents> rowCoefficients;  // one iMCU row
-
+  pelo::jpeg::ScanList scans;
   pelo::jpeg::Sizes sizes;
   pelo::jpeg::Progress progress;
   pelo::jpeg::Resampling resampling;

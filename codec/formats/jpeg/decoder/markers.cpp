@@ -1,10 +1,9 @@
-#include "codec/formats/jpeg/decoder/markers.h"
-
 #include <algorithm>
 #include <cstring>
 
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
+#include "codec/formats/jpeg/decoder/headers.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
@@ -17,58 +16,57 @@ constexpr const char* kStage = "JPEG headers";
 
 // Notes why headers are refused. Behind the first scan the picture has begun, and what cannot be read is
 // left out of it. Always false.
-bool refuse_header(const PELOJ_JDINFO& jd, Reason reason, const char* detail = nullptr) {
-  if (!jd.marker->sawSos) refuse(reason, kStage, detail);
+bool refuse_header(const MarkerRecord& seen, Reason reason) {
+  if (!seen.sawSos) refuse(reason, kStage);
   return false;
 }
-bool cut(const PELOJ_JDINFO& jd) {
-  return refuse_header(jd, Reason::kTruncated);
-}
-bool no_memory(const PELOJ_JDINFO& jd) {
-  return refuse_header(jd, Reason::kNoMemory);
-}
 
-// Consumes n bytes into `bytes`; false when the source ends first.
-bool read(PELOJ_JDINFO& jd, void* bytes, uint32_t n) {
-  if (!source_need(*jd.source, n)) return cut(jd);
-  std::memcpy(bytes, source_take(*jd.source, n), n);
-  return true;
-}
+// The bytes of the segments, and what the ones so far said.
+struct Input {
+  PELOJ_SOURCE& source;
+  MarkerRecord& seen;
 
-bool skip(PELOJ_JDINFO& jd, uint32_t n) {
-  return source_skip(*jd.source, n) || cut(jd);
-}
+  bool cut() const { return refuse_header(seen, Reason::kTruncated); }
 
-// The bytes of a segment behind its length.
-bool open_segment(PELOJ_JDINFO& jd, uint32_t& left) {
-  return (source_need(*jd.source, 2) || cut(jd)) && segment_length(*jd.source, left);
-}
+  // Consumes n bytes into `bytes`; false when the source ends first.
+  bool read(void* bytes, uint32_t n) const {
+    if (!source_need(source, n)) return cut();
+    std::memcpy(bytes, source_take(source, n), n);
+    return true;
+  }
+  bool skip(uint32_t n) const { return source_skip(source, n) || cut(); }
+
+  // The bytes of a segment behind its length.
+  bool open_segment(uint32_t& left) const {
+    return (source_need(source, 2) || cut()) && segment_length(source, left);
+  }
+};
 
 constexpr const char* kComponents = "neither one nor three components";
 
 // SOF0, SOF2 (T.81 B.2.2).
-bool read_frame(PELOJ_JDINFO& jd, Marker code) {
-  MarkerRecord& marker = *jd.marker;
+bool read_frame(const Input& in, Frame& frame, Marker code) {
+  MarkerRecord& marker = in.seen;
   uint8_t head[8];
-  if (marker.frameType != FrameType::kNone || !read(jd, head, 8)) return false;
-  const FrameHead frame = load_frame_head(head + 2);
-  jd.frame.height = frame.height;
-  jd.frame.width = frame.width;
+  if (marker.frameType != FrameType::kNone || !in.read(head, 8)) return false;
+  const FrameHead start = load_frame_head(head + 2);
+  frame.height = start.height;
+  frame.width = start.width;
   const int count = head[7];
-  if (frame.precision != 8 || frame.height > kMaxSide || frame.width > kMaxSide) {
-    return refuse_frame(frame, kStage);
+  if (start.precision != 8 || start.height > kMaxSide || start.width > kMaxSide) {
+    return refuse_frame(start, kStage);
   }
   if (count == 4) return refuse(Reason::kCmyk, kStage);
   if (count != 1 && count != 3) refuse(Reason::kVariant, kStage, kComponents);
   if (count > kMaxComponents || load_be16(head) != 8 + 3 * count) return false;
 
-  jd.frame.components = os_new<std::array<Component, kMaxComponents>>();
-  if (!jd.frame.components) return no_memory(jd);
-  jd.frame.componentCount = count;
+  frame.components = os_new<std::array<Component, kMaxComponents>>();
+  if (!frame.components) return refuse_header(in.seen, Reason::kNoMemory);
+  frame.componentCount = count;
   for (int i = 0; i < count; ++i) {
     uint8_t bytes[3];
-    if (!read(jd, bytes, 3)) return false;
-    Component& component = (*jd.frame.components)[static_cast<size_t>(i)];
+    if (!in.read(bytes, 3)) return false;
+    Component& component = (*frame.components)[static_cast<size_t>(i)];
     component.index = static_cast<uint8_t>(i);
     component.id = bytes[0];
     component.h = bytes[1] >> 4;
@@ -78,155 +76,156 @@ bool read_frame(PELOJ_JDINFO& jd, Marker code) {
       return false;
     }
     marker.componentIds[static_cast<size_t>(i)] = component.id;
-    jd.frame.hMax = std::max<int>(jd.frame.hMax, component.h);
-    jd.frame.vMax = std::max<int>(jd.frame.vMax, component.v);
+    frame.hMax = std::max<int>(frame.hMax, component.h);
+    frame.vMax = std::max<int>(frame.vMax, component.v);
   }
   marker.frameType = code == kSof0 ? FrameType::kBaseline : FrameType::kProgressive;
   return true;
 }
 
 // DHT (T.81 B.2.4.2): every definition takes a slot of its own.
-bool read_huffman_tables(PELOJ_JDINFO& jd) {
+bool read_huffman_tables(const Input& in, Tables& tables) {
   uint32_t left;
-  jd.marker->sawDht = 1;
-  if (!open_segment(jd, left)) return false;
+  in.seen.sawDht = 1;
+  if (!in.open_segment(left)) return false;
   while (left > 0) {
     uint8_t head[17];
-    if (left < 17 || jd.tables.rawCount >= kTablePoolSize || !read(jd, head, 17)) return false;
+    if (left < 17 || tables.rawCount >= kTablePoolSize || !in.read(head, 17)) return false;
     const bool isAc = (head[0] & 0x10) != 0;
     const uint8_t number = isAc ? head[0] - 0x10 : head[0];
     if (number > 3) return false;
 
     auto table = os_new<HuffmanSpec>();
-    if (!table) return no_memory(jd);
+    if (!table) return refuse_header(in.seen, Reason::kNoMemory);
     uint32_t total = 0;
     for (size_t i = 1; i <= 16; ++i) total += table->counts[i] = head[i];
     left -= 17;
-    if (total > 256 || total > left || !read(jd, table->symbols.data(), total)) return false;
+    if (total > 256 || total > left || !in.read(table->symbols.data(), total)) return false;
     left -= total;
-    (isAc ? jd.tables.acRaw : jd.tables.dcRaw)[number] = table.get();
-    jd.tables.rawPool[jd.tables.rawCount++] = std::move(table);
+    (isAc ? tables.acRaw : tables.dcRaw)[number] = table.get();
+    tables.rawPool[tables.rawCount++] = std::move(table);
   }
   return true;
 }
 
 // Puts a table in its place. The one before it stays while a component that is still to be shown has it.
-void replace_quant_table(PELOJ_JDINFO& jd, OsPtr<QuantTable> table, size_t number) {
-  OsPtr<QuantTable>& place = jd.tables.quant[number];
-  for (int c = 0; c < jd.frame.componentCount; ++c) {
-    if (place && (*jd.frame.components)[static_cast<size_t>(c)].table == place.get())
-      jd.tables.replacedQuant[jd.tables.replacedCount++] = std::move(place);
+void replace_quant_table(const Frame& frame, Tables& tables, OsPtr<QuantTable> table, size_t number) {
+  OsPtr<QuantTable>& place = tables.quant[number];
+  for (int c = 0; c < frame.componentCount; ++c) {
+    if (place && (*frame.components)[static_cast<size_t>(c)].table == place.get())
+      tables.replacedQuant[tables.replacedCount++] = std::move(place);
   }
   place = std::move(table);
 }
 
 // DQT (T.81 B.2.4.1), 8-bit tables.
-bool read_quant_tables(PELOJ_JDINFO& jd) {
+bool read_quant_tables(const Input& in, const Frame& frame, Tables& tables) {
   uint32_t left;
-  if (!open_segment(jd, left)) return false;
+  if (!in.open_segment(left)) return false;
   while (left > 0) {
     uint8_t bytes[65];
-    if (left < 65 || !read(jd, bytes, 65) || bytes[0] > 3) return false;
+    if (left < 65 || !in.read(bytes, 65) || bytes[0] > 3) return false;
     auto table = os_new<QuantTable>();
-    if (!table) return no_memory(jd);
+    if (!table) return refuse_header(in.seen, Reason::kNoMemory);
     for (size_t i = 0; i < 64; ++i) table->value[PELOJ_NATURAL_ORDER[i]] = bytes[1 + i];
-    replace_quant_table(jd, std::move(table), bytes[0]);
+    replace_quant_table(frame, tables, std::move(table), bytes[0]);
     left -= 65;
   }
-  jd.marker->sawDqt = 1;
+  in.seen.sawDqt = 1;
   return true;
 }
 
-bool read_restart_interval(PELOJ_JDINFO& jd) {
+bool read_restart_interval(const Input& in, ScanHeader& scan) {
   uint8_t bytes[4];
-  if (!read(jd, bytes, 4) || load_be16(bytes) != 4) return false;
-  jd.scan.restartInterval = load_be16(bytes + 2);
+  if (!in.read(bytes, 4) || load_be16(bytes) != 4) return false;
+  scan.restartInterval = load_be16(bytes + 2);
   return true;
 }
 
 // APPn, COM, DNL: skipped, but for what an APP14 ends with.
-bool read_application(PELOJ_JDINFO& jd, Marker code) {
+bool read_application(const Input& in, Marker code) {
   uint32_t left;
-  if (!open_segment(jd, left)) return false;
-  if (code == kApp0) jd.marker->sawApp0 = 1;
-  if (code != kApp14) return skip(jd, left);
-  jd.marker->sawApp14 = 1;
+  if (!in.open_segment(left)) return false;
+  if (code == kApp0) in.seen.sawApp0 = 1;
+  if (code != kApp14) return in.skip(left);
+  in.seen.sawApp14 = 1;
   if (left == 0) return true;
-  return skip(jd, left - 1) && read(jd, &jd.marker->transform, 1);
+  return in.skip(left - 1) && in.read(&in.seen.transform, 1);
 }
 
-Component* find_component(PELOJ_JDINFO& jd, uint8_t id) {
-  for (int i = 0; i < jd.frame.componentCount; ++i) {
-    Component& component = (*jd.frame.components)[static_cast<size_t>(i)];
+Component* find_component(const Frame& frame, uint8_t id) {
+  for (int i = 0; i < frame.componentCount; ++i) {
+    Component& component = (*frame.components)[static_cast<size_t>(i)];
     if (component.id == id) return &component;
   }
   return nullptr;
 }
 
 // A progressive scan's band must stay inside a block (T.81 G.1.1.1.1).
-bool valid_band(const PELOJ_JDINFO& jd) {
-  if (jd.scan.ss > jd.scan.se || jd.scan.se > 63 || jd.scan.ah > 13 || jd.scan.al > 13) return false;
-  return jd.scan.ss == 0 ? jd.scan.se == 0 : jd.scan.componentCount == 1;
+bool valid_band(const ScanHeader& scan) {
+  if (scan.ss > scan.se || scan.se > 63 || scan.ah > 13 || scan.al > 13) return false;
+  return scan.ss == 0 ? scan.se == 0 : scan.componentCount == 1;
 }
 
 // SOS (T.81 B.2.3).
-bool read_scan(PELOJ_JDINFO& jd) {
+bool read_scan(const Input& in, const Frame& frame, ScanHeader& scan) {
   uint8_t head[3];
-  if (jd.marker->frameType == FrameType::kNone) {
-    const bool foreign = jd.marker->foreign != Reason::kNone;
-    return foreign && refuse(jd.marker->foreign, kStage);
+  if (in.seen.frameType == FrameType::kNone) {
+    const bool foreign = in.seen.foreign != Reason::kNone;
+    return foreign && refuse(in.seen.foreign, kStage);
   }
-  if (!read(jd, head, 3)) return false;
+  if (!in.read(head, 3)) return false;
   const int count = head[2];
   if (count < 1 || count > kMaxComponents || load_be16(head) != 6 + 2 * count) return false;
-  jd.scan.componentCount = count;
+  scan.componentCount = count;
   for (int i = 0; i < count; ++i) {
     uint8_t bytes[2];
-    if (!read(jd, bytes, 2)) return false;
-    Component* component = find_component(jd, bytes[0]);
-    const auto begin = jd.scan.components.begin();
+    if (!in.read(bytes, 2)) return false;
+    Component* component = find_component(frame, bytes[0]);
+    const auto begin = scan.components.begin();
     // A component twice in a scan would be decoded twice and leave another undecoded.
     if (component == nullptr || std::find(begin, begin + i, component) != begin + i) return false;
     component->dcTable = bytes[1] >> 4;
     component->acTable = bytes[1] & 15;
-    jd.scan.components[static_cast<size_t>(i)] = component;
-    jd.scan.lastComponent = component->index;
+    scan.components[static_cast<size_t>(i)] = component;
+    scan.lastComponent = component->index;
   }
   uint8_t band[3];
-  if (!read(jd, band, 3)) return false;
-  jd.scan.ss = band[0];
-  jd.scan.se = band[1];
-  jd.scan.ah = band[2] >> 4;
-  jd.scan.al = band[2] & 15;
-  if (jd.marker->frameType == FrameType::kBaseline) {
-    jd.scan.ss = jd.scan.ah = jd.scan.al = 0;
-    jd.scan.se = 63;
-  } else if (!valid_band(jd)) {
+  if (!in.read(band, 3)) return false;
+  scan.ss = band[0];
+  scan.se = band[1];
+  scan.ah = band[2] >> 4;
+  scan.al = band[2] & 15;
+  if (in.seen.frameType == FrameType::kBaseline) {
+    scan.ss = scan.ah = scan.al = 0;
+    scan.se = 63;
+  } else if (!valid_band(scan)) {
     return false;
   }
-  jd.marker->sawSos = 1;
+  in.seen.sawSos = 1;
   return true;
 }
 
 // One segment by its code; codes that are not listed are passed over, scanning goes on behind them.
 bool read_segment(PELOJ_JDINFO& jd, Marker code) {
+  const Input in{*jd.source, *jd.marker};
   switch (code) {
     case kSof0:
     case kSof2:
-      return read_frame(jd, code);
+      return read_frame(in, jd.frame, code);
     case kDht:
-      return read_huffman_tables(jd);
+      return read_huffman_tables(in, jd.tables);
     case kDqt:
-      return read_quant_tables(jd);
+      return read_quant_tables(in, jd.frame, jd.tables);
     case kDri:
-      return read_restart_interval(jd);
+      return read_restart_interval(in, jd.scan);
     case kSos:
-      return read_scan(jd);
+      return read_scan(in, jd.frame, jd.scan);
     case kDnl:
     case kCom:
-      return read_application(jd, code);
+      return read_application(in, code);
     default:
-      if (code >= kApp0 && code <= kApp15) return read_application(jd, code);
+      if (code >= kApp0 && code <= kApp15) return read_application(in, code);
       if (jd.marker->foreign == Reason::kNone) {
         jd.marker->foreign = foreign_process(*jd.source, static_cast<uint8_t>(code));
       }
@@ -235,10 +234,9 @@ bool read_segment(PELOJ_JDINFO& jd, Marker code) {
 }
 
 // From the component count, the application segments and the identifiers (JFIF; T.872 for APP14).
-ColourSpace colour_space(const PELOJ_JDINFO& jd) {
-  const MarkerRecord& marker = *jd.marker;
-  if (jd.frame.componentCount == 1) return ColourSpace::kGrey;
-  if (jd.frame.componentCount != 3) return ColourSpace::kNone;
+ColourSpace colour_space(const MarkerRecord& marker, int componentCount) {
+  if (componentCount == 1) return ColourSpace::kGrey;
+  if (componentCount != 3) return ColourSpace::kNone;
   if (marker.sawApp0) return ColourSpace::kYcc;
   if (marker.sawApp14) {
     if (marker.transform > 1) return ColourSpace::kNone;
@@ -259,7 +257,7 @@ bool parse_header(PELOJ_JDINFO& jd) {
   if (parse_to_scan(&jd, &status) == static_cast<int>(kEoi) || status != PELOJ_OK) {
     return false;
   }
-  jd.frame.colourSpace = colour_space(jd);
+  jd.frame.colourSpace = colour_space(*jd.marker, jd.frame.componentCount);
   if (jd.frame.colourSpace == ColourSpace::kNone)
     return refuse(Reason::kVariant, kStage, "its colour space");
   const MarkerRecord& marker = *jd.marker;
@@ -281,11 +279,11 @@ int parse_to_scan(PELOJ_JDINFO* jdInfo, int* status) {
       return code;
     }
   }
-  cut(*jdInfo);
+  refuse_header(*jdInfo->marker, Reason::kTruncated);
   return code;
 }
 
-int parse_header(PELOJ_JDINFO* jdInfo, int) {
+int parse_header(PELOJ_JDINFO* jdInfo) {
   if (parse_header(*jdInfo)) return PELOJ_OK;
   refuse(Reason::kDamaged, kStage);
   clear_decoder(jdInfo);

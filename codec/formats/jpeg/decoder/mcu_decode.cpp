@@ -1,7 +1,6 @@
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
 
-#include "codec/formats/jpeg/decoder/dequantise.h"
-#include "codec/formats/jpeg/decoder/mcu_steps.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 
 namespace pelo::jpeg {
 namespace {
@@ -91,7 +90,7 @@ inline void skip_rest(BitReader& reader, const BlockContext& context, int positi
       const int used = static_cast<int>(skip_used(entry));
       const bool ends = (entry & kSkipEndOfBlock) != 0;
       // Extra bits beyond a narrow buffer's content: one code at a time.
-      const bool held = kFilledBits >= kSkipBits + 15 || used <= reader.state.left;
+      const bool held = kFilledBits >= kSkipBits + kMaxExtraBits || used <= reader.state.left;
       if (used != 0 && held && next <= (ends ? 62 : 63)) [[likely]] {
         reader.drop(used);
         if (ends) return;
@@ -108,7 +107,7 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
   int result;
   if (!begin_mcu(jd, result)) return result;
   EntropyState& entropy = *jd.entropy.state;
-  BitReader reader = open_bits(jd);
+  BitReader reader = open_bits(*jd.source, jd.entropy);
   for (size_t i = 0; i < static_cast<size_t>(jd.scan.mcuBlocks); ++i) {
     const size_t scanIndex = jd.scan.blockComponent[i];
     const int32_t dc = decode_dc(reader, *entropy.blockDc[i], entropy.lastDc[scanIndex]);
@@ -116,7 +115,7 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
 
     BlockContext context{*entropy.blockAc[i], entropy.blockSkip[i], nullptr, jd.scan.se};
     if constexpr (Member::kRequantise) {
-      context.correction = quant_table(jd, *jd.scan.components[scanIndex])->correction.data();
+      context.correction = quant_table(jd.tables, *jd.scan.components[scanIndex])->correction.data();
     }
     int last = 0;
     int k = jd.scan.ss + 1;
@@ -126,7 +125,7 @@ int decode_mcu(PELOJ_JDINFO& jd, int32_t* const* blocks) {
     if constexpr (!Member::kWhole) skip_rest(reader, context, k - 1);
     jd.entropy.lastPosition[i] = static_cast<uint8_t>(last < 63 ? last : 63);
   }
-  return end_mcu(jd, reader);
+  return end_mcu(reader);
 }
 
 }  // namespace

@@ -1,10 +1,10 @@
-#include "codec/formats/jpeg/decoder/progressive.h"
-
 #include "codec/base/os.h"
+#include "codec/formats/jpeg/decoder/headers.h"
 #include "codec/formats/jpeg/decoder/idct.h"
-#include "codec/formats/jpeg/decoder/markers.h"
-#include "codec/formats/jpeg/decoder/scan_setup.h"
-#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/decoder/imcu_row.h"
+#include "codec/formats/jpeg/decoder/mcu_decode.h"
+#include "codec/formats/jpeg/decoder/rows.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
@@ -13,25 +13,24 @@ namespace {
 
 // Blocks of a component in one row of the coefficient store: whole MCUs of the frame, whatever the
 // current scan's are.
-size_t stored_blocks_wide(const PELOJ_JDINFO& jd, const Component& component) {
-  const int mcus = jd.frame.mcus_across();
-  return static_cast<size_t>(mcus) * component.h;
+size_t stored_blocks_wide(const Frame& frame, const Component& component) {
+  return static_cast<size_t>(frame.mcus_across()) * component.h;
 }
 
 }  // namespace
 
 int32_t* stored_block(PELOJ_JDINFO& jd, const Component& component, int row, int column) {
   const size_t block =
-      static_cast<size_t>(row) * stored_blocks_wide(jd, component) + static_cast<size_t>(column);
-  return jd.rowCoefficients[component.index].data() + 64 * block;
+      static_cast<size_t>(row) * stored_blocks_wide(jd.frame, component) + static_cast<size_t>(column);
+  return jd.scans.coefficients[component.index].data() + 64 * block;
 }
 
-bool allocate_store(PELOJ_JDINFO& jd) {
-  for (int c = 0; c < jd.frame.componentCount; ++c) {
+bool allocate_store(const Frame& frame, ScanList& scans) {
+  for (int c = 0; c < frame.componentCount; ++c) {
     const auto index = static_cast<size_t>(c);
-    const Component& component = (*jd.frame.components)[index];
-    const size_t blocks = stored_blocks_wide(jd, component) * component.v;
-    if (!jd.rowCoefficients[index].allocate(blocks * 64)) return false;
+    const Component& component = (*frame.components)[index];
+    const size_t blocks = stored_blocks_wide(frame, component) * component.v;
+    if (!scans.coefficients[index].allocate(blocks * 64)) return false;
   }
   return true;
 }
@@ -70,7 +69,7 @@ void transform_row(PELOJ_JDINFO& jd, const Component& component, InverseDct tran
   for (int y = 0; y < component.v && jd.progress.imcuRow * component.v + y < component.blocksHigh; ++y) {
     uint8_t* const* rows = component.samples.get() + y * size;
     for (int x = 0; x < component.blocksWide; ++x) {
-      transform(nullptr, component.multiplier.data(), stored_block(jd, component, y, x), rows, x * size);
+      transform(component.multiplier.data(), stored_block(jd, component, y, x), rows, x * size);
     }
   }
 }
@@ -78,11 +77,11 @@ void transform_row(PELOJ_JDINFO& jd, const Component& component, InverseDct tran
 }  // namespace
 
 int decode_coefficient_row(PELOJ_JDINFO& jd) {
-  for (OsBuffer<int32_t>& plane : jd.rowCoefficients) {
+  for (OsBuffer<int32_t>& plane : jd.scans.coefficients) {
     if (plane) os_memset(plane.data(), 0, plane.size() * sizeof(int32_t));
   }
-  for (size_t i = 0; i < jd.scanCount; ++i) {
-    ScanRecord* record = jd.scans[i].get();
+  for (size_t i = 0; i < jd.scans.count; ++i) {
+    ScanRecord* record = jd.scans.records[i].get();
     if (!load_scan(&jd, record)) continue;
     if (!decode_scan_row(jd)) {
       if (jd.sizes.used.height - jd.progress.rowsDone < 16) return PELOJ_IMAGE_DONE;
@@ -100,9 +99,9 @@ int decode_progressive_row(PELOJ_JDINFO* jdInfo) {
 }
 
 int transform_stored_row(PELOJ_JDINFO* jdInfo) {
-  const InverseDct transform = jdInfo->sizes.scale == kFull   ? PELOJ_DoIdct
-                               : jdInfo->sizes.scale == kHalf ? PELOJ_DoIdct_2to1
-                                                              : PELOJ_DoIdct_4to1;
+  const InverseDct transform = jdInfo->sizes.scale == kFull   ? idct8<8, 8>
+                               : jdInfo->sizes.scale == kHalf ? idct_reduced4
+                                                              : idct_reduced2;
   for (int c = 0; c < jdInfo->frame.componentCount; ++c) {
     transform_row(*jdInfo, (*jdInfo->frame.components)[static_cast<size_t>(c)], transform);
   }

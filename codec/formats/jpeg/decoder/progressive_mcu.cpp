@@ -1,6 +1,5 @@
 // Huffman decoding of progressive scans (ITU-T T.81 G.1.2, G.2).
-#include "codec/formats/jpeg/decoder/mcu_steps.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
+#include "codec/formats/jpeg/decoder/mcu_decode.h"
 
 namespace pelo::jpeg {
 namespace {
@@ -15,27 +14,26 @@ uint32_t eob_run(BitReader& reader, int r) {
   return r == 0 ? run : run + take_extra(reader, r);
 }
 
-void decode_dc_first(PELOJ_JDINFO& jd, BitReader& reader, int32_t* const* blocks) {
-  EntropyState& entropy = *jd.entropy.state;
-  for (size_t i = 0; i < static_cast<size_t>(jd.scan.mcuBlocks); ++i) {
-    const int32_t dc = decode_dc(reader, *entropy.blockDc[i], entropy.lastDc[jd.scan.blockComponent[i]]);
-    blocks[i][0] = shifted(dc, jd.scan.al);
+void decode_dc_first(const Scan& scan, EntropyState& state, BitReader& reader, int32_t* const* blocks) {
+  for (size_t i = 0; i < static_cast<size_t>(scan.mcuBlocks); ++i) {
+    const int32_t dc = decode_dc(reader, *state.blockDc[i], state.lastDc[scan.blockComponent[i]]);
+    blocks[i][0] = shifted(dc, scan.al);
   }
 }
 
-void decode_ac_first(PELOJ_JDINFO& jd, BitReader& reader, int32_t* block) {
-  if (jd.entropy.eobRun > 0) {
-    --jd.entropy.eobRun;
+void decode_ac_first(const Scan& scan, Entropy& entropy, BitReader& reader, int32_t* block) {
+  if (entropy.eobRun > 0) {
+    --entropy.eobRun;
     return;
   }
-  const DerivedTable& table = *jd.entropy.state->blockAc[0];
-  for (int k = jd.scan.ss; k <= jd.scan.se;) {
+  const DerivedTable& table = *entropy.state->blockAc[0];
+  for (int k = scan.ss; k <= scan.se;) {
     reader.fill();
     const int32_t direct = table.coefficient[reader.peek(kLookBits)];
     if (direct != 0) [[likely]] {
       reader.drop(direct & 0xFF);
       k += direct >> 8 & 0xFF;
-      block[PELOJ_NATURAL_ORDER[k++]] = shifted(direct >> 16, jd.scan.al);
+      block[PELOJ_NATURAL_ORDER[k++]] = shifted(direct >> 16, scan.al);
       continue;
     }
     const uint32_t symbol = decode_symbol(reader, table);
@@ -43,11 +41,11 @@ void decode_ac_first(PELOJ_JDINFO& jd, BitReader& reader, int32_t* block) {
     const int run = static_cast<int>(symbol >> 4);
     if (size != 0) {
       k += run;
-      block[PELOJ_NATURAL_ORDER[k++]] = shifted(extend(take_extra(reader, size), size), jd.scan.al);
+      block[PELOJ_NATURAL_ORDER[k++]] = shifted(extend(take_extra(reader, size), size), scan.al);
     } else if (run == 15) {
       k += 16;
     } else {
-      jd.entropy.eobRun = eob_run(reader, run) - 1;
+      entropy.eobRun = eob_run(reader, run) - 1;
       return;
     }
   }
@@ -62,11 +60,11 @@ void refine(BitReader& reader, int32_t& coefficient, int32_t bit) {
 
 // Passes `zeros` coefficients without history and corrects those with; the position of the next one
 // without, or one past the band.
-int refine_run(const PELOJ_JDINFO& jd, BitReader& reader, int32_t* block, int k, int zeros) {
-  for (; k <= jd.scan.se; ++k) {
+int refine_run(const Scan& scan, BitReader& reader, int32_t* block, int k, int zeros) {
+  for (; k <= scan.se; ++k) {
     int32_t& coefficient = block[PELOJ_NATURAL_ORDER[k]];
     if (coefficient != 0) {
-      refine(reader, coefficient, 1 << jd.scan.al);
+      refine(reader, coefficient, 1 << scan.al);
     } else if (--zeros < 0) {
       break;
     }
@@ -74,58 +72,59 @@ int refine_run(const PELOJ_JDINFO& jd, BitReader& reader, int32_t* block, int k,
   return k;
 }
 
-void decode_ac_refine(PELOJ_JDINFO& jd, BitReader& reader, int32_t* block) {
-  const DerivedTable& table = *jd.entropy.state->blockAc[0];
-  int k = jd.scan.ss;
-  for (; jd.entropy.eobRun == 0 && k <= jd.scan.se; ++k) {
+void decode_ac_refine(const Scan& scan, Entropy& entropy, BitReader& reader, int32_t* block) {
+  const DerivedTable& table = *entropy.state->blockAc[0];
+  int k = scan.ss;
+  for (; entropy.eobRun == 0 && k <= scan.se; ++k) {
     reader.fill();
     const uint32_t symbol = decode_symbol(reader, table);
     const int run = static_cast<int>(symbol >> 4);
     int32_t value = 0;
     if ((symbol & 15) != 0) {  // a new coefficient; its size can only be 1
-      value = take_extra(reader, 1) != 0 ? 1 << jd.scan.al : -(1 << jd.scan.al);
+      value = take_extra(reader, 1) != 0 ? 1 << scan.al : -(1 << scan.al);
     } else if (run != 15) {
-      jd.entropy.eobRun = eob_run(reader, run);
+      entropy.eobRun = eob_run(reader, run);
       break;
     }
-    k = refine_run(jd, reader, block, k, run);
-    if (value != 0 && k <= jd.scan.se) block[PELOJ_NATURAL_ORDER[k]] = value;
+    k = refine_run(scan, reader, block, k, run);
+    if (value != 0 && k <= scan.se) block[PELOJ_NATURAL_ORDER[k]] = value;
   }
-  if (jd.entropy.eobRun == 0) return;
-  refine_run(jd, reader, block, k, 64);
-  --jd.entropy.eobRun;
+  if (entropy.eobRun == 0) return;
+  refine_run(scan, reader, block, k, 64);
+  --entropy.eobRun;
 }
 
-void decode_dc_refine(PELOJ_JDINFO& jd, BitReader& reader, int32_t* const* blocks) {
-  for (size_t i = 0; i < static_cast<size_t>(jd.scan.mcuBlocks); ++i) {
+void decode_dc_refine(const Scan& scan, BitReader& reader, int32_t* const* blocks) {
+  for (size_t i = 0; i < static_cast<size_t>(scan.mcuBlocks); ++i) {
     reader.fill();
-    if (reader.take(1) != 0) blocks[i][0] |= 1 << jd.scan.al;
+    if (reader.take(1) != 0) blocks[i][0] |= 1 << scan.al;
   }
 }
 
 }  // namespace
+
 int decode_mcu_first(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   int result;
   if (!begin_mcu(*jdInfo, result)) return result;
-  BitReader reader = open_bits(*jdInfo);
+  BitReader reader = open_bits(*jdInfo->source, jdInfo->entropy);
   if (jdInfo->scan.ss == 0) {
-    decode_dc_first(*jdInfo, reader, blocks);
+    decode_dc_first(jdInfo->scan, *jdInfo->entropy.state, reader, blocks);
   } else {
-    decode_ac_first(*jdInfo, reader, blocks[0]);
+    decode_ac_first(jdInfo->scan, jdInfo->entropy, reader, blocks[0]);
   }
-  return end_mcu(*jdInfo, reader);
+  return end_mcu(reader);
 }
 
 int decode_mcu_refine(PELOJ_JDINFO* jdInfo, int32_t* const* blocks) {
   int result;
   if (!begin_mcu(*jdInfo, result)) return result;
-  BitReader reader = open_bits(*jdInfo);
+  BitReader reader = open_bits(*jdInfo->source, jdInfo->entropy);
   if (jdInfo->scan.ss == 0) {
-    decode_dc_refine(*jdInfo, reader, blocks);
+    decode_dc_refine(jdInfo->scan, reader, blocks);
   } else {
-    decode_ac_refine(*jdInfo, reader, blocks[0]);
+    decode_ac_refine(jdInfo->scan, jdInfo->entropy, reader, blocks[0]);
   }
-  return end_mcu(*jdInfo, reader);
+  return end_mcu(reader);
 }
 
 }  // namespace pelo::jpeg

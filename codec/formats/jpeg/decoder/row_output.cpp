@@ -113,8 +113,7 @@ void store_planar(const RowOutput& output, const Run& in, int begin, int count) 
 
 // Delivers one row: the only place that counts and bounds output rows.
 template <class Model, class Source>
-void emit_row(PELOJ_JDINFO& jd, const Source& source, int count) {
-  RowOutput& output = jd.output;
+void emit_row(RowOutput& output, const Source& source, int count) {
   const bool writes = output.plane[0] != nullptr && (!output.planar || Model::kPlanar);
   if (output.emitted >= output.bandEnd) return;
   RunBuffer samples, colours;
@@ -134,24 +133,23 @@ void emit_row(PELOJ_JDINFO& jd, const Source& source, int count) {
 }
 
 // Planes of a 4:2:0 buffer. Rotation does not apply to it.
-void set_planes(PELOJ_JDINFO& jd, uint8_t* buffer, const Placement& p, int64_t height) {
+void set_planes(RowOutput& output, uint8_t* buffer, const Placement& p, int64_t height) {
   const int64_t chromaPitch = (p.pitch() + 1) >> 1;
   const int64_t chroma = chromaPitch * (p.top >> 1) + (p.left >> 1);
-  jd.output.planar = 1;
-  jd.output.rowStep = static_cast<ptrdiff_t>(p.pitch());
-  jd.output.plane[0] = buffer + p.first();
-  jd.output.plane[1] = buffer + p.pitch() * height + chroma;
-  jd.output.plane[2] = buffer + p.pitch() * height + chromaPitch * ((height + 1) >> 1) + chroma;
+  output.planar = 1;
+  output.rowStep = static_cast<ptrdiff_t>(p.pitch());
+  output.plane[0] = buffer + p.first();
+  output.plane[1] = buffer + p.pitch() * height + chroma;
+  output.plane[2] = buffer + p.pitch() * height + chromaPitch * ((height + 1) >> 1) + chroma;
 }
 
-// Chooses the packer of the state's format; its bytes a pixel, 0 for an unknown code: rows are then
-// counted only.
-int choose_packer(PELOJ_JDINFO& jd) {
-  jd.output.dither =
-      jd.outFormat == TAVIRPELO_RGB565_DITHER && jd.frame.colourSpace == ColourSpace::kYcc ? 1 : 0;
-  const int format = jd.outFormat == TAVIRPELO_RGB565_DITHER ? TAVIRPELO_RGB565 : jd.outFormat;
-  jd.output.pack = jd.output.dither ? dithered_packer() : opaque_packer(format);
-  return jd.output.pack == nullptr ? 0 : bytes_per_pixel(format);
+// Chooses the packer of a pixel format; its bytes a pixel, 0 for an unknown code: rows are then counted
+// only.
+int choose_packer(RowOutput& output, int outFormat, ColourSpace colourSpace) {
+  output.dither = outFormat == TAVIRPELO_RGB565_DITHER && colourSpace == ColourSpace::kYcc ? 1 : 0;
+  const int format = outFormat == TAVIRPELO_RGB565_DITHER ? TAVIRPELO_RGB565 : outFormat;
+  output.pack = output.dither ? dithered_packer() : opaque_packer(format);
+  return output.pack == nullptr ? 0 : bytes_per_pixel(format);
 }
 
 }  // namespace
@@ -167,10 +165,10 @@ void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option) {
   jd.output.limit = jd.output.bandEnd = jd.sizes.target.height;
   if (buffer == nullptr) return;
   if (jd.outFormat == TAVIRPELO_YUV420) {
-    set_planes(jd, bytes, p, tight ? target.height : jd.sizes.buffer.height);
+    set_planes(jd.output, bytes, p, tight ? target.height : jd.sizes.buffer.height);
     return;
   }
-  const int size = choose_packer(jd);
+  const int size = choose_packer(jd.output, jd.outFormat, jd.frame.colourSpace);
   if (size == 0) return;
   jd.output.plane[0] = bytes + p.first() * size;
   jd.output.pixelStep = static_cast<ptrdiff_t>(p.pixel_step() * size);
@@ -182,7 +180,7 @@ void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows) {
   output.firstRow = output.emitted;
   output.bandEnd = output.emitted + std::min(rows, output.limit - output.emitted);
   output.planar = jd.outFormat == TAVIRPELO_YUV420;
-  const int size = output.planar ? 1 : choose_packer(jd);
+  const int size = output.planar ? 1 : choose_packer(jd.output, jd.outFormat, jd.frame.colourSpace);
   const int used = output.planar ? 3 : 1;
   bool complete = planes != nullptr && size != 0;
   for (int c = 0; complete && c < used; ++c) {
@@ -194,33 +192,28 @@ void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows) {
   output.rowStep = static_cast<ptrdiff_t>(int64_t{jd.sizes.buffer.width} * size);
 }
 
-void write_ycc_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
+void write_ycc_row(RowOutput& output, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
                    int count) {
-  emit_row<YccModel>(*jdInfo, RowSource{{y, cb, cr}}, count);
+  emit_row<YccModel>(output, RowSource{{y, cb, cr}}, count);
 }
-void write_grey_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count) {
-  emit_row<GreyModel>(*jdInfo, RowSource{{y, y, y}}, count);
+void write_grey_row(RowOutput& output, const uint8_t* y, int count) {
+  emit_row<GreyModel>(output, RowSource{{y, y, y}}, count);
 }
-void write_rgb_row(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, const uint8_t* b,
-                   int count) {
-  emit_row<RgbModel>(*jdInfo, RowSource{{r, g, b}}, count);
+void write_rgb_row(RowOutput& output, const uint8_t* r, const uint8_t* g, const uint8_t* b, int count) {
+  emit_row<RgbModel>(output, RowSource{{r, g, b}}, count);
 }
-void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
-                      int count) {
-  emit_row<YccModel>(*jdInfo, ColumnSource{{y, cb, cr}, jdInfo->resampling.centres.data()}, count);
+void write_picked_row(RowOutput& output, const uint16_t* columns, const uint8_t* y, const uint8_t* cb,
+                      const uint8_t* cr, int count) {
+  emit_row<YccModel>(output, ColumnSource{{y, cb, cr}, columns}, count);
 }
-void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                               const uint8_t* cr, int count) {
-  write_picked_row(jdInfo, y, cb, cr, count);
+void write_ycc_sums(RowOutput& output, const uint32_t* sums, int count) {
+  emit_row<YccModel>(output, SumSource{sums}, count);
 }
-void write_ycc_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  emit_row<YccModel>(*jdInfo, SumSource{sums}, count);
+void write_grey_sums(RowOutput& output, const uint32_t* sums, int count) {
+  emit_row<GreyModel>(output, SumSource{sums}, count);
 }
-void write_grey_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  emit_row<GreyModel>(*jdInfo, SumSource{sums}, count);
-}
-void write_rgb_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count) {
-  emit_row<RgbModel>(*jdInfo, SumSource{sums}, count);
+void write_rgb_sums(RowOutput& output, const uint32_t* sums, int count) {
+  emit_row<RgbModel>(output, SumSource{sums}, count);
 }
 
 }  // namespace pelo::jpeg

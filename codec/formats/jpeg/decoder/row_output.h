@@ -35,21 +35,17 @@ void set_output(PELOJ_JDINFO& jd, void* buffer, uint32_t option);
 void set_band(PELOJ_JDINFO& jd, uint8_t* const* planes, int rows);
 
 // One-row writers: `count` samples a row of each channel, one pixel each.
-void write_ycc_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
-                   int count);
-void write_grey_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, int count);
-void write_rgb_row(PELOJ_JDINFO* jdInfo, const uint8_t* r, const uint8_t* g, const uint8_t* b,
-                   int count);
+void write_ycc_row(RowOutput& output, const uint8_t* y, const uint8_t* cb, const uint8_t* cr, int count);
+void write_grey_row(RowOutput& output, const uint8_t* y, int count);
+void write_rgb_row(RowOutput& output, const uint8_t* r, const uint8_t* g, const uint8_t* b, int count);
 
-// The sample nearest to each output column's centre; `count` is the number of output columns.
-void write_picked_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb, const uint8_t* cr,
-                      int count);
-void write_picked_enlarged_row(PELOJ_JDINFO* jdInfo, const uint8_t* y, const uint8_t* cb,
-                               const uint8_t* cr, int count);
+// Of each output column the sample that `columns` names; `count` is the number of output columns.
+void write_picked_row(RowOutput& output, const uint16_t* columns, const uint8_t* y, const uint8_t* cb,
+                      const uint8_t* cr, int count);
 
 // Accumulator writers: `count` packed sums of four samples (codec/pixel/quad_sampler.h).
-void write_ycc_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
-void write_grey_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
-void write_rgb_sums(PELOJ_JDINFO* jdInfo, const uint32_t* sums, int count);
+void write_ycc_sums(RowOutput& output, const uint32_t* sums, int count);
+void write_grey_sums(RowOutput& output, const uint32_t* sums, int count);
+void write_rgb_sums(RowOutput& output, const uint32_t* sums, int count);
 
 }  // namespace pelo::jpeg

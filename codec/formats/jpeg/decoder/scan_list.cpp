@@ -1,10 +1,8 @@
-#include "codec/formats/jpeg/decoder/scan_list.h"
-
 #include "codec/base/errors.h"
-#include "codec/formats/jpeg/decoder/markers.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
-#include "codec/formats/jpeg/decoder/scan_setup.h"
-#include "codec/formats/jpeg/decoder/upsample.h"
+#include "codec/formats/jpeg/decoder/headers.h"
+#include "codec/formats/jpeg/decoder/imcu_row.h"
+#include "codec/formats/jpeg/decoder/rows.h"
+#include "codec/formats/jpeg/decoder/scans.h"
 #include "codec/formats/jpeg/header_scan.h"
 #include "platform/android_log.h"
 
@@ -24,7 +22,7 @@ class Coverage {
   // transform reads of a component whose band reached far enough.
   void add_scan(const PELOJ_JDINFO& jd) {
     if (!is_progressive(jd)) {
-      for (int i = 0; i < jd.scan.componentCount; ++i) complete(i, jd) = true;
+      for (int i = 0; i < jd.scan.componentCount; ++i) complete(i, jd.scan) = true;
       return;
     }
     const bool enough =
@@ -35,7 +33,7 @@ class Coverage {
   bool gains(const PELOJ_JDINFO& jd) {
     if (is_progressive(jd)) return true;
     for (int i = 0; i < jd.scan.componentCount; ++i) {
-      if (!complete(i, jd)) return true;
+      if (!complete(i, jd.scan)) return true;
     }
     return false;
   }
@@ -47,8 +45,8 @@ class Coverage {
   }
 
  private:
-  bool& complete(int scanIndex, const PELOJ_JDINFO& jd) {
-    return complete_[jd.scan.components[static_cast<size_t>(scanIndex)]->index];
+  bool& complete(int scanIndex, const ScanHeader& scan) {
+    return complete_[scan.components[static_cast<size_t>(scanIndex)]->index];
   }
   std::array<bool, kMaxComponents> complete_{};
 };
@@ -65,7 +63,7 @@ bool find_scan(PELOJ_JDINFO& jd, Coverage& coverage) {
 
 // Prepares the scan whose header has just been read.
 int prepare_scan(PELOJ_JDINFO& jd) {
-  if (prepare_upsampling(&jd) != PELOJ_OK) {
+  if (prepare_upsampling(jd.frame, jd.sizes.scale, jd.progress) != PELOJ_OK) {
     return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitUpsampler fail");
   }
   if (prepare_before_scan(&jd) != PELOJ_OK) {
@@ -77,21 +75,21 @@ int prepare_scan(PELOJ_JDINFO& jd) {
 }  // namespace
 
 int list_scans(PELOJ_JDINFO& jd) {
-  if (stores_coefficients(jd) && !allocate_store(jd)) {
+  if (stores_coefficients(jd) && !allocate_store(jd.frame, jd.scans)) {
     return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
   }
   Coverage coverage;
-  while (jd.scanCount < kMaxScans) {
-    if (make_scan_record(&jd, &jd.scans[jd.scanCount]) != PELOJ_OK) {
+  while (jd.scans.count < kMaxScans) {
+    if (make_scan_record(&jd, &jd.scans.records[jd.scans.count]) != PELOJ_OK) {
       return fail(TAVIRPELO_ERROR_MEMORY, "PELOJ_DecodeImage : malloc fail");
     }
-    ++jd.scanCount;
+    ++jd.scans.count;
     coverage.add_scan(jd);
     if (coverage.all(jd.frame.componentCount) || !find_scan(jd, coverage)) break;
     if (prepare_scan(jd) != PELOJ_OK) return PELOJ_FAIL;
   }
   // What the state says of a sequential picture's scan stays that of the first one.
-  if (is_progressive(jd) || load_scan(&jd, jd.scans[0].get())) return PELOJ_OK;
+  if (is_progressive(jd) || load_scan(&jd, jd.scans.records[0].get())) return PELOJ_OK;
   return fail(TAVIRPELO_ERROR_DECODE, "PELOJ_DecodeImage : PELOJ_InitDecBeforeScan fail");
 }
 
@@ -99,14 +97,7 @@ int make_scan_record(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
   *slot = os_new<ScanRecord>();
   if (!*slot) return PELOJ_FAIL;
   ScanRecord& record = **slot;
-  record.componentCount = jdInfo->scan.componentCount;
-  record.components = jdInfo->scan.components;
-  record.lastComponent = jdInfo->scan.lastComponent;
-  record.ss = jdInfo->scan.ss;
-  record.se = jdInfo->scan.se;
-  record.ah = jdInfo->scan.ah;
-  record.al = jdInfo->scan.al;
-  record.restartInterval = jdInfo->scan.restartInterval;
+  record.header = jdInfo->scan;
   jdInfo->entropy.eobRun = 0;
   save_scan(jdInfo, &record);
   return PELOJ_OK;
@@ -122,20 +113,13 @@ void save_scan(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
 
 int load_scan(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
   if (!source_reposition(*jdInfo->source, record->sourcePosition)) return 0;
-  jdInfo->scan.componentCount = record->componentCount;
-  jdInfo->scan.components = record->components;
-  jdInfo->scan.lastComponent = record->lastComponent;
-  jdInfo->scan.ss = record->ss;
-  jdInfo->scan.se = record->se;
-  jdInfo->scan.ah = record->ah;
-  jdInfo->scan.al = record->al;
-  jdInfo->scan.restartInterval = record->restartInterval;
+  static_cast<ScanHeader&>(jdInfo->scan) = record->header;
   *jdInfo->entropy.state = record->entropy;
   jdInfo->entropy.eobRun = record->eobRun;
   jdInfo->marker->nextRestart = record->nextRestart;
   jdInfo->entropy.unreadMarker = record->unreadMarker;
-  if (!set_scan_geometry(*jdInfo)) return 0;
-  begin_imcu_row(jdInfo);
+  if (!set_scan_geometry(jdInfo->frame, jdInfo->scan)) return 0;
+  begin_imcu_row(jdInfo->scan, jdInfo->progress.imcuRow);
   return 1;
 }
 

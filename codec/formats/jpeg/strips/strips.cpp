@@ -8,8 +8,8 @@
 #include "codec/base/io.h"
 #include "codec/base/os.h"
 #include "codec/formats/jpeg/decoder/driver.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
-#include "codec/formats/jpeg/decoder/row_process.h"
+#include "codec/formats/jpeg/decoder/imcu_row.h"
+#include "codec/formats/jpeg/decoder/rows.h"
 #include "codec/formats/jpeg/header_scan.h"
 
 namespace pelo::jpeg {

@@ -5,7 +5,7 @@
 
 #include "codec/base/dec_info.h"
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
-#include "codec/formats/jpeg/decoder/progressive.h"
+#include "codec/formats/jpeg/decoder/imcu_row.h"
 
 namespace pelo::jpeg {
 namespace {
