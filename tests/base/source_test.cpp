@@ -1,7 +1,8 @@
 // Input sources, the buffered reader, format detection, raw images and the small services of the ground.
+#include "codec/base/source.h"
+
 #include <cstdio>
 
-#include "codec/base/buffered_source.h"
 #include "codec/base/geometry.h"
 #include "tests/support/failures.h"
 #include "tests/support/gif_builder.h"

@@ -14,12 +14,12 @@ enum class Multibyte { kRead, kTooLong, kCut };
 
 // A multi-byte integer of at most `room` bytes: seven bits each, most significant first, bit 7 set on
 // all but the last. Bits above the 32nd are lost.
-Multibyte read_multibyte(PELOJ_SOURCE& source, uint32_t& room, uint32_t& value) {
+Multibyte read_multibyte(Source& source, uint32_t& room, uint32_t& value) {
   value = 0;
   for (uint8_t byte = 0x80; byte & 0x80;) {
     if (room-- == 0) return Multibyte::kTooLong;
-    if (!source_need(source, 1)) return Multibyte::kCut;
-    byte = *source_take(source, 1);
+    if (!source.need(1)) return Multibyte::kCut;
+    byte = *source.take(1);
     value = value << 7 | (byte & 0x7F);
   }
   return Multibyte::kRead;
@@ -31,9 +31,9 @@ bool sniff(const uint8_t* head) {
   return head[0] == 'B' && head[1] == 'M';
 }
 
-int parse_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo) {
-  if (!source_need(source, 26)) return cut_head("BMP header");
-  const uint8_t* head = source.buffer + source.pos;
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
+  if (!source.need(26)) return cut_head("BMP header");
+  const uint8_t* head = source.next();
   return found(decInfo, hinfo, TAVIRPELO_FORMAT_BMP, load_le32(head + 18), load_le32(head + 22));
 }
 
@@ -41,15 +41,15 @@ bool sniff_wbmp(const uint8_t* head) {
   return head[0] == 0 && head[1] < 0x80;
 }
 
-int parse_wbmp_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo) {
+int parse_wbmp_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
   if (hinfo != nullptr) hinfo->frameCount = 1;
   return parse_wbmp_sizes(decInfo, source);
 }
 
-int parse_wbmp_sizes(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source) {
+int parse_wbmp_sizes(TAVIRPELO_DECINFO& decInfo, Source& source) {
   if (source.size <= 3) return TAVIRPELO_FORMAT_UNKNOWN;
-  if (!source_need(source, 2)) return cut_head("WBMP header");
-  source_take(source, 2);
+  if (!source.need(2)) return cut_head("WBMP header");
+  source.take(2);
   uint32_t room = kWbmpSizeBytes;
   uint32_t size[2];
   for (uint32_t& side : size) {

@@ -55,6 +55,7 @@ Record* new_record(void) {
   auto record = os_new<Record>();
   if (record == nullptr) return refuse(Reason::kNoMemory, "GIF decoder"), nullptr;
   record->kind = Record::kKind;
+  record->reader.buffer = record->window;
   record->control.transparentIndex = -1;
   return record.release();
 }

@@ -78,7 +78,8 @@ struct Record : FormatState {
   const uint32_t* colours;  // the current image's table
   Rgba palette[256];        // the same with transparency
   TranslationTable table;
-  Reader reader;
+  Source reader;
+  uint8_t window[kSourceBufferSize];  // the reader's
 
   TAVIRPELO_DECINFO* decInfo;  // of the current call; null: nobody to ask
   Mode mode;

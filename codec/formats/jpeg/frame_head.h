@@ -1,8 +1,8 @@
 // What the header of every frame begins with (T.81 B.2.2), and why a frame is refused.
 #pragma once
 
-#include "codec/base/buffered_source.h"
 #include "codec/base/errors.h"
+#include "codec/base/source.h"
 
 namespace pelo::jpeg {
 

@@ -4,7 +4,7 @@
 
 #include <cstdint>
 
-#include "codec/base/buffered_source.h"
+#include "codec/base/source.h"
 #include "codec/formats/jpeg/frame_head.h"
 #include "codec/formats/jpeg/marker_codes.h"
 #include "tavirpelo/parse.h"

@@ -11,10 +11,10 @@ bool sniff(const uint8_t* head) {
   return std::memcmp(head, kSignature, sizeof kSignature) == 0;
 }
 
-int parse_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo) {
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
   // The last byte of the height may lie behind the source's end: the buffer holds a zero there.
-  if (!source_need(source, 23)) return cut_head("PNG header");
-  const uint8_t* head = source.buffer + source.pos;
+  if (!source.need(23)) return cut_head("PNG header");
+  const uint8_t* head = source.next();
   return found(decInfo, hinfo, TAVIRPELO_FORMAT_PNG, load_be32(head + 16), load_be32(head + 20));
 }
 

@@ -6,6 +6,6 @@
 namespace pelo::png {
 
 bool sniff(const uint8_t* head);
-int parse_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
 }  // namespace pelo::png

@@ -60,7 +60,7 @@ typedef struct PELOI_PNGCONTEXT : pelo::FormatState {
   PELOI_PNGINFO info;
   pelo::DecodeRequest request;
   uint32_t iterFlag;
-  PELOI_PNGREADBUFFER reader;
+  pelo::BufferedSource reader;
   bool inputReady;     // memory: chunks merged
   uint32_t idatEntry;  // other sources: the entry being read
   pelo::png::Inflater inflater;
@@ -90,7 +90,7 @@ uint32_t set_pass_size(PELOI_PNGCONTEXT* context, uint32_t fullWidth, uint32_t f
 
 // Reads the next piece of the image data, at most 4096 bytes and never beyond the chunk of `entryIndex`
 // or, when that is used up, the next. 1, or 0 when there is none.
-int refill_from_chunks(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer, uint32_t entryIndex);
+int refill_from_chunks(PELOI_PNGCONTEXT* context, Source* reader, uint32_t entryIndex);
 
 // Decompress and write until the image ends or the mode says stop: a Result. `total` receives the number
 // of bytes decompressed so far.

@@ -4,8 +4,10 @@
 #include <array>
 #include <cstdint>
 
-#include "codec/formats/png/read_buffer.h"
+#include "codec/base/source.h"
 #include "tavirpelo/decinfo.h"
+
+typedef pelo::Source PELOI_PNGREADBUFFER;
 
 namespace pelo::png {
 
@@ -61,13 +63,18 @@ namespace pelo::png {
 
 // Reads the chunks from the source's start to the first empty chunk; their data are checked, not
 // decompressed. A Result: 1, 6 (a checksum differs), 7, 8.
-int parse_chunks(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer);
+int parse_chunks(PELOI_PNGINFO* info, Source* source);
 
 // Reads the `length` bytes of a tRNS chunk at the cursor into the palette's alpha or the colour key. 1;
 // 3 before any IHDR; 6 for a colour type or length that allows none; 8 when the read fails or there are
 // more values than palette entries. The chunk type is not looked at.
-int parse_transparency(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer, uint32_t length,
-                       uint32_t chunkType, std::array<uint16_t, 3>* colourKey);
+int parse_transparency(PELOI_PNGINFO* info, Source* source, uint32_t length, uint32_t chunkType,
+                       std::array<uint16_t, 3>* colourKey);
+
+// Given steps: one refill of an empty window, and one behind the unread bytes. 1, or 11 when `need`
+// (more) bytes exceed 4096, the source is memory or has no more.
+int refill_empty(Source* source, uint32_t need);
+int refill_behind(Source* source, uint32_t need);
 
 // A big-endian 32-bit value.
 uint32_t load_uint32(const uint8_t* bytes);
