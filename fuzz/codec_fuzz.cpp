@@ -5,10 +5,10 @@
 #include <cstring>
 #include <vector>
 
-#include "codec/formats/png/png_abi.h"
 #include "codec/base/byte_order.h"
+#include "codec/formats/png/png_abi.h"
+#include "codec/formats/png/png_info.h"
 #include "codec/pixel/packers.h"
-#include "codec/formats/png/crc32.h"
 #include "platform/android_log.h"
 #include "tavirpelo/tavirpelo.h"
 

@@ -5,8 +5,8 @@
 #include "codec/base/errors.h"
 #include "codec/decode/crop_file.h"
 #include "codec/decode/one_call.h"
-#include "codec/formats/bmp/head.h"
-#include "codec/formats/gif/head.h"
+#include "codec/formats/bmp/bmp_record.h"
+#include "codec/formats/gif/driver.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo {

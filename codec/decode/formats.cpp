@@ -7,12 +7,9 @@
 
 #include "codec/base/errors.h"
 #include "codec/formats/bmp/bmp_record.h"
-#include "codec/formats/bmp/head.h"
 #include "codec/formats/gif/driver.h"
-#include "codec/formats/gif/head.h"
 #include "codec/formats/jpeg/decoder/driver.h"
-#include "codec/formats/jpeg/head.h"
-#include "codec/formats/png/head.h"
+#include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/png/png_driver.h"
 #include "tavirpelo/decode.h"
 

@@ -5,6 +5,7 @@
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
 #include "codec/base/io.h"
+#include "codec/formats/format.h"
 #include "codec/formats/gif/record.h"
 #include "codec/pixel/lanes.h"
 
@@ -65,13 +66,18 @@ const uint8_t* take_whole(Source& reader, int n) {
   return bytes;
 }
 
-// The colour table that a descriptor's flags announce. Entries it does not have are black.
+// Bytes of the colour table that a descriptor's flags announce; 0 without one.
+int colour_table(uint8_t flags) {
+  return flags & 0x80 ? 3 << ((flags & 7) + 1) : 0;
+}
+
+// Reads a colour table that is there. Entries it does not have are black.
 bool read_table(Source& reader, uint8_t flags, uint32_t* table) {
-  const int count = 2 << (flags & 7);
-  const uint8_t* bytes = take_whole(reader, 3 * count);
+  const int size = colour_table(flags);
+  const uint8_t* bytes = take_whole(reader, size);
   if (bytes == nullptr) return false;
   std::fill_n(table, 256, 0u);
-  pack_table(bytes, count, table);
+  pack_table(bytes, size / 3, table);
   return true;
 }
 
@@ -158,6 +164,71 @@ int seek_image(TAVIRPELO_IO* source, Record* record) {
         break;
     }
   }
+}
+
+// ---- format detection ----
+
+namespace {
+
+bool skip_image(Source& source) {
+  if (!source.need(9)) return false;
+  const uint8_t flags = source.take(9)[8];
+  if (!source.skip(colour_table(flags) + int64_t{1})) return false;  // and the minimum code size
+  uint8_t size;
+  do {
+    if (!source.need(1)) return false;
+    size = *source.next();
+    if (!source.skip(size + 1)) return false;
+  } while (size != 0);
+  return true;
+}
+
+// Known extensions are passed whole; of others the label alone, and their bodies are scanned.
+bool skip_extension(Source& source) {
+  if (!source.need(2)) return false;
+  const uint8_t label = *source.take(1);
+  const bool known =
+      label == kGraphicControl || label == kComment || label == kApplication || label == kPlainText;
+  return !known || skip_sub_blocks(source);
+}
+
+// Images up to the trailer; negative when the source ends before it.
+int count_images(Source& source) {
+  for (int images = 0;;) {
+    if (!source.need(1)) return -1;
+    switch (*source.take(1)) {
+      case kImageSeparator:
+        if (!skip_image(source)) return -1;
+        ++images;
+        break;
+      case kExtensionIntroducer:
+        if (!skip_extension(source)) return -1;
+        break;
+      case kTrailerByte:
+        return images;
+      default:
+        break;
+    }
+  }
+}
+
+}  // namespace
+
+bool sniff(const uint8_t* head) {
+  return head[0] == 'G' && head[1] == 'I' && head[2] == 'F';
+}
+
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
+  if (!source.need(13)) {
+    return refuse(Reason::kTruncated, "GIF screen"), TAVIRPELO_FORMAT_UNKNOWN;
+  }
+  const uint8_t* screen = source.take(13);
+  found(decInfo, nullptr, TAVIRPELO_FORMAT_GIF, load_le16(screen + 6), load_le16(screen + 8));
+  const int images = source.skip(colour_table(screen[10])) ? count_images(source) : -1;
+  if (images < 0) return refuse(Reason::kTruncated, "GIF blocks", "a GIF without its end"), 0;
+  if (hinfo != nullptr) hinfo->frameCount = images;
+  if (images == 0) return refuse(Reason::kDamaged, "GIF blocks", "a GIF without an image"), 0;
+  return images == 1 ? TAVIRPELO_FORMAT_GIF : TAVIRPELO_FORMAT_ANIMATED_GIF;
 }
 
 }  // namespace pelo::gif

@@ -1,10 +1,10 @@
-// The GIF stream outside the image data: by a Source, screen, colour tables, extensions
-// and image descriptors.
+// The GIF stream outside the image data: screen, colour tables, extensions and image descriptors.
 #pragma once
 
 #include <cstdint>
 
 #include "codec/base/source.h"
+#include "tavirpelo/parse.h"
 
 namespace pelo::gif {
 
@@ -38,5 +38,10 @@ int parse_header(TAVIRPELO_IO* source, Record* record);
 // Goes on to the next image's data: 1 with its descriptor, tables and minimum code size read, 3 at the
 // trailer, 0 for a malformed graphic control extension or the source's end.
 int seek_image(TAVIRPELO_IO* source, Record* record);
+
+// ---- format detection: the screen's size, and how many images follow ----
+
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
 }  // namespace pelo::gif

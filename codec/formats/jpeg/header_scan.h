@@ -78,4 +78,12 @@ constexpr int kScanMode = 8;
 // True when the thumbnail's bytes can lie inside a source of `sourceSize` bytes.
 [[nodiscard]] bool thumbnail_in_source(const PELOJ_THUMBNAIL& thumbnail, uint32_t sourceSize);
 
+// ---- format detection ----
+
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
+
+// The two at once, for rooms that take JPEG alone.
+int detect(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
+
 }  // namespace pelo::jpeg

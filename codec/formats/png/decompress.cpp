@@ -6,7 +6,6 @@
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
 #include "codec/base/io.h"
-#include "codec/formats/png/crc32.h"
 #include "codec/formats/png/png_context.h"
 
 namespace pelo::png {

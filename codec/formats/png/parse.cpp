@@ -5,7 +5,7 @@
 
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
-#include "codec/formats/png/crc32.h"
+#include "codec/formats/format.h"
 #include "codec/formats/png/png_info.h"
 
 namespace pelo::png {
@@ -208,6 +208,7 @@ uint16_t grey_key(uint32_t value, uint8_t depth) {
 }
 
 }  // namespace
+
 uint32_t load_uint32(const uint8_t* bytes) {
   return pelo::load_be32(bytes);
 }
@@ -263,6 +264,19 @@ int parse_chunks(PELOI_PNGINFO* info, Source* source) {
     if (const int result = parse_chunk(*info, *source, chunk); result != kDone) return result;
   } while (chunk.length != 0);
   return kDone;
+}
+
+// ---- format detection ----
+
+bool sniff(const uint8_t* head) {
+  return std::memcmp(head, kSignature, sizeof kSignature) == 0;
+}
+
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
+  // The last byte of the height may lie behind the source's end: the buffer holds a zero there.
+  if (!source.need(23)) return cut_head("PNG header");
+  const uint8_t* head = source.next();
+  return found(decInfo, hinfo, TAVIRPELO_FORMAT_PNG, load_be32(head + 16), load_be32(head + 20));
 }
 
 }  // namespace pelo::png

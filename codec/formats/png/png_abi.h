@@ -1,7 +1,6 @@
 // Given names of this room that no public header has; each is what the room's own function says.
 #pragma once
 
-#include "codec/formats/png/crc32.h"
 #include "codec/formats/png/huffman_table.h"
 #include "codec/formats/png/png_context.h"
 #include "codec/formats/png/png_driver.h"

@@ -1,11 +1,12 @@
-// What the chunks before the pixels say: header, palette, transparency, and where the image data lie.
+// What the chunks before the pixels say (ISO/IEC 15948): header, palette, transparency, and where the
+// image data lie.
 #pragma once
 
 #include <array>
 #include <cstdint>
 
 #include "codec/base/source.h"
-#include "tavirpelo/decinfo.h"
+#include "tavirpelo/parse.h"
 
 typedef pelo::Source PELOI_PNGREADBUFFER;
 
@@ -78,5 +79,20 @@ int refill_behind(Source* source, uint32_t need);
 
 // A big-endian 32-bit value.
 uint32_t load_uint32(const uint8_t* bytes);
+
+// ---- the checksum of chunks: ISO 3309, reflected polynomial 0xEDB88320 ----
+
+constexpr uint32_t kCrcPreset = 0xFFFFFFFF;
+
+// The register after `size` more bytes. The checksum is the complement of the last register.
+uint32_t crc32_update(uint32_t crc, const uint8_t* data, size_t size);
+
+// The checksum of a byte array.
+uint32_t crc32(const uint8_t* data, uint32_t length);
+
+// ---- format detection (5.2 and 11.2.2) ----
+
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
 }  // namespace pelo::png

@@ -5,7 +5,6 @@
 
 #include "codec/base/row_progress.h"
 #include "codec/formats/png/png_context.h"
-#include "codec/formats/png/row_filter.h"
 
 namespace pelo::png {
 namespace {

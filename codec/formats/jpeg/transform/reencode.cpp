@@ -8,8 +8,9 @@
 #include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
 #include "codec/base/os.h"
+#include "codec/formats/format.h"
 #include "codec/formats/jpeg/exif/exif_writer.h"
-#include "codec/formats/jpeg/head.h"
+#include "codec/formats/jpeg/header_scan.h"
 #include "codec/formats/jpeg/transform/requantise.h"
 #include "tavirpelo/parse.h"
 
