@@ -1,7 +1,7 @@
 // Decodes in several calls: the same pixels as in one, whatever the split, and no mixing of requests.
 #include <functional>
 
-#include "codec/base/format_state.h"
+#include "codec/formats/format.h"
 #include "codec/formats/gif/record.h"
 #include "tests/gif/gif_decode.h"
 

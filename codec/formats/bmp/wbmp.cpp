@@ -5,10 +5,10 @@
 #include <cstring>
 #include <utility>
 
+#include "codec/base/dec_info.h"
 #include "codec/base/geometry.h"
 #include "codec/base/io.h"
 #include "codec/base/output_grid.h"
-#include "codec/base/row_progress.h"
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/formats/format.h"
 #include "codec/pixel/packed_samples.h"

@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
+#include "codec/base/dec_info.h"
 #include "codec/base/errors.h"
-#include "codec/base/row_progress.h"
 #include "codec/formats/gif/rows.h"
 #include "codec/pixel/lanes.h"
 #include "codec/pixel/packers.h"

@@ -3,7 +3,7 @@
 #include <cstring>
 #include <utility>
 
-#include "codec/base/row_progress.h"
+#include "codec/base/dec_info.h"
 #include "codec/formats/png/png_context.h"
 
 namespace pelo::png {
