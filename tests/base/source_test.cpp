@@ -87,6 +87,8 @@ TEST(Source, FindsEveryByte) {
     }
     EXPECT_FALSE(s.skip(-1));
     EXPECT_FALSE(s.skip(30000));
+    EXPECT_TRUE(s.move_to(19990));
+    EXPECT_FALSE(s.need(20));  // and a memory's bytes stay where they are
     EXPECT_TRUE(s.move_to(20000));
     EXPECT_FALSE(s.need(1));
     EXPECT_FALSE(s.need(5000));
