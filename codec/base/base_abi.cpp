@@ -2,8 +2,8 @@
 #include "codec/base/base_abi.h"
 
 #include "codec/base/dec_info.h"
-#include "codec/base/dec_ratio.h"
 #include "codec/base/errors.h"
+#include "codec/base/geometry.h"
 #include "codec/base/io.h"
 #include "codec/base/os.h"
 #include "tavirpelo/io.h"

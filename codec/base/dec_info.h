@@ -1,7 +1,8 @@
 // The decoder information object, behind the given names of tavirpelo/decinfo.h, and what it leaves to
-// the rooms above it.
+// the rooms above it; the caller's say between the rows of a decode.
 #pragma once
 
+#include "codec/base/errors.h"
 #include "tavirpelo/decinfo.h"
 
 namespace pelo {
@@ -24,5 +25,13 @@ int set_mode(TAVIRPELO_DECINFO* decInfo, int mode);
 int set_callback(TAVIRPELO_DECINFO* decInfo, TAVIRPELO_PROGRESSFN function, intptr_t argument);
 int object_error();
 int decoder_version();
+
+// Asks the object's CheckFn before more output rows are written; `finished` of them stand. False ends
+// the decode. Nobody to ask is no objection.
+inline bool caller_agrees(TAVIRPELO_DECINFO* decInfo, int finished) {
+  if (decInfo == nullptr || decInfo->CheckFn == nullptr) return true;
+  return decInfo->CheckFn(decInfo, finished, finished) != 0 ||
+         refuse(Reason::kCancelled, "writing rows");
+}
 
 }  // namespace pelo

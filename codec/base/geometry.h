@@ -1,4 +1,5 @@
-// Where a decoded picture lies in the caller's buffer: offset, rotation, and the steps of a row writer.
+// How large a decoded picture comes out, and where it lies in the caller's buffer: offset, rotation, and
+// the steps of a row writer.
 #pragma once
 
 #include <cstddef>
@@ -54,5 +55,11 @@ Size fit_by_ratio(int64_t width, int64_t height, Size box);
 
 // BMP and GIF: the box's width, when the height that belongs to it fits; else the box's height.
 Size fit_by_width(int64_t width, int64_t height, Size box);
+
+// ---- reducing to a memory budget ----
+
+// Square root of needed / available, 1024 = 1.0 at the most; 0 when either makes no sense. `needed` is
+// within 53 bits.
+int max_dec_ratio(int64_t needed, int64_t available);
 
 }  // namespace pelo

@@ -4,8 +4,8 @@
 
 #include "codec/base/errors.h"
 #include "codec/decode/decode.h"
-#include "codec/formats/bmp/head.h"
-#include "codec/formats/gif/head.h"
+#include "codec/formats/bmp/bmp_record.h"
+#include "codec/formats/gif/driver.h"
 #include "tavirpelo/decode.h"
 
 namespace pelo {

@@ -1,7 +1,7 @@
 // Given names of the decode room that no public header has.
 #pragma once
 
-#include "codec/base/buffered_source.h"
+#include "codec/base/source.h"
 #include "tavirpelo/parse.h"
 
 // Detects the format at the source's start; fills the object's image size and parts of `hinfo` (may be

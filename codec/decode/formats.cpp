@@ -6,12 +6,9 @@
 #include "codec/base/errors.h"
 #include "codec/decode/decode.h"
 #include "codec/formats/bmp/bmp_record.h"
-#include "codec/formats/bmp/head.h"
 #include "codec/formats/gif/driver.h"
-#include "codec/formats/gif/head.h"
 #include "codec/formats/jpeg/decoder/driver.h"
 #include "codec/formats/jpeg/header_scan.h"
-#include "codec/formats/png/head.h"
 #include "codec/formats/png/png_driver.h"
 #include "tavirpelo/decode.h"
 
@@ -48,8 +45,8 @@ struct Start {
   uint8_t bytes[16];
   uint32_t count;
 
-  explicit Start(const PELOJ_SOURCE& source) : count(std::min<uint32_t>(source.avail, sizeof bytes)) {
-    std::memcpy(bytes, source.buffer + source.pos, count);
+  explicit Start(const Source& source) : count(std::min<uint32_t>(source.avail, sizeof bytes)) {
+    std::memcpy(bytes, source.next(), count);
   }
   bool has(const Foreign& foreign) const {
     const size_t length = foreign.bytes.size();
@@ -79,11 +76,11 @@ const Format* format_of(int code) {
   return nullptr;
 }
 
-int detect(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo) {
+int detect(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
   // Shorter sources reach their format's own checks; the buffer is zero behind them.
-  if (!source_need(source, kSniffBytes) && source.avail == 0) return cut_head(kStage);
+  if (!source.need(kSniffBytes) && source.avail == 0) return cut_head(kStage);
   const Start start(source);
-  const uint8_t* head = source.buffer + source.pos;
+  const uint8_t* head = source.next();
   for (const Format& format : kFormats) {
     if (!format.sniff(head)) continue;
     const int code = format.parse(decInfo, source, hinfo);

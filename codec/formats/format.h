@@ -5,11 +5,11 @@
 
 #include <cstdint>
 
-#include "codec/base/buffered_source.h"
 #include "codec/base/checked.h"
 #include "codec/base/errors.h"
-#include "codec/base/format_state.h"
 #include "codec/base/geometry.h"
+#include "codec/base/os_memory.h"
+#include "codec/base/source.h"
 #include "tavirpelo/parse.h"
 
 namespace pelo {
@@ -22,7 +22,7 @@ struct Format {
 
   // Reads the head behind sniff(), from a source at its start: the object's image size and what `hinfo`
   // (may be null) has of this format. The format's code, or 0 when the source is none after all.
-  int (*parse)(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+  int (*parse)(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
   // Decodes the whole picture, of an animation its first image; 1 or 0.
   int (*decode)(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
@@ -32,10 +32,35 @@ struct Format {
 
 // Reads a head from the start of the object's source by `detect`, as TAVIRPELO_Parser does of any
 // format's: sets imageFormat and the record's sizes.
-using Detect = int (*)(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+using Detect = int (*)(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 int parse_source(TAVIRPELO_DECINFO& decInfo, TAVIRPELO_HINFO* hinfo, Detect detect);
 
 // ---- what the decoders share ----
+
+// The state that a row-wise or frame-wise decode leaves in an object's pFormatInfo. Every such record
+// begins with its kind, so that no decoder takes another's for its own.
+enum class FormatKind : uint32_t { kPng = 0x504E4721, kGif = 0x47494621, kBmp = 0x424D5021 };
+
+struct FormatState {
+  FormatKind kind;
+};
+
+// The object's state when it is a T (a FormatState with a T::kKind), else null.
+template <class T>
+T* held_state(const TAVIRPELO_DECINFO& decInfo) {
+  auto* state = static_cast<FormatState*>(decInfo.pFormatInfo);
+  return state != nullptr && state->kind == T::kKind ? static_cast<T*>(state) : nullptr;
+}
+
+// Destroys the object's state when it is a T; false, with nothing touched, otherwise.
+template <class T>
+bool release_state(TAVIRPELO_DECINFO& decInfo) {
+  T* state = held_state<T>(decInfo);
+  if (state == nullptr) return false;
+  OsDelete{}(state);
+  decInfo.pFormatInfo = nullptr;
+  return true;
+}
 
 // What a decode was started with; its later calls must ask for the same.
 struct DecodeRequest {

@@ -4,7 +4,7 @@
 #include <climits>
 #include <cstdlib>
 
-#include "codec/base/dec_ratio.h"
+#include "codec/base/geometry.h"
 #include "codec/zoom/zoom.h"
 
 namespace pelo::zoom {

@@ -1,7 +1,8 @@
 // Input sources, the buffered reader, format detection, raw images and the small services of the ground.
+#include "codec/base/source.h"
+
 #include <cstdio>
 
-#include "codec/base/buffered_source.h"
 #include "codec/base/geometry.h"
 #include "tests/support/failures.h"
 #include "tests/support/gif_builder.h"
@@ -59,31 +60,40 @@ TEST(Sources, FilesAreMeasuredAndDirectoriesRefused) {
   EXPECT_EQ(TAVIRPELO_INVALID_FILE, TAVIRPELO_OpenFile("no such file"));
 }
 
-// A window over more than its size: peeks, skips and jumps land on the right bytes.
-TEST(BufferedReader, FindsEveryByte) {
+// A window over more than its size, and a memory's own bytes: peeks, skips and jumps land on the right
+// bytes.
+TEST(Source, FindsEveryByte) {
   Bytes bytes = random_bytes(20000, 3);
   const DecInfo info = open_memory(bytes, 0);
-  pelo::BufferedSource source;
-  ASSERT_TRUE(source.open(info->pIO));
-  PELOJ_SOURCE& s = *source.get();
-  std::mt19937 random(5);
-  int64_t at = 0;
-  for (int i = 0; i < 3000; ++i) {
-    const int64_t step = random() & (i % 7 == 0 ? 4095 : 63);
-    if (random() % 2 == 0) {
-      at = (at + step * 17) % 19000;
-      ASSERT_TRUE(pelo::source_reposition(s, at));
-    } else if (at + step < 19900) {
-      ASSERT_TRUE(pelo::source_skip(s, step));
-      at += step;
+  pelo::BufferedSource window, memory;
+  ASSERT_TRUE(window.open(info->pIO));
+  memory.open(bytes.data(), 20000);
+  for (pelo::BufferedSource* source : {&window, &memory}) {
+    pelo::Source& s = *source->get();
+    std::mt19937 random(5);
+    int64_t at = 0;
+    for (int i = 0; i < 3000; ++i) {
+      const int64_t step = random() & (i % 7 == 0 ? 4095 : 63);
+      if (random() % 2 == 0) {
+        at = (at + step * 17) % 19000;
+        ASSERT_TRUE(s.move_to(at));
+      } else if (at + step < 19900) {
+        ASSERT_TRUE(s.skip(step));
+        at += step;
+      }
+      ASSERT_EQ(at, s.tell());
+      ASSERT_TRUE(s.need(20));
+      ASSERT_EQ(bytes[static_cast<size_t>(at++)], *s.take(1));
     }
-    ASSERT_EQ(at, pelo::source_offset(s));
-    ASSERT_TRUE(pelo::source_need(s, 20));
-    ASSERT_EQ(bytes[static_cast<size_t>(at++)], *pelo::source_take(s, 1));
+    EXPECT_FALSE(s.skip(-1));
+    EXPECT_FALSE(s.skip(30000));
+    EXPECT_TRUE(s.move_to(19990));
+    EXPECT_FALSE(s.need(20));  // and a memory's bytes stay where they are
+    EXPECT_TRUE(s.move_to(20000));
+    EXPECT_FALSE(s.need(1));
+    EXPECT_FALSE(s.need(5000));
   }
-  EXPECT_FALSE(pelo::source_skip(s, -1));
-  EXPECT_FALSE(pelo::source_skip(s, 30000));
-  EXPECT_FALSE(pelo::source_need(s, 5000));
+  EXPECT_TRUE(random_bytes(20000, 3) == bytes);
 }
 
 int parse(Bytes bytes, TAVIRPELO_HINFO* header = nullptr) {

@@ -1,6 +1,6 @@
 // Callback streams as sources, and short memory in every step of opening and parsing one.
 #include "codec/base/base_abi.h"
-#include "codec/base/buffered_source.h"
+#include "codec/base/source.h"
 #include "tests/support/failures.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/jpeg_samples.h"

@@ -1,6 +1,5 @@
 // Wireless bitmaps: sizes in groups of seven bits, placement, averages, and sources that are too short.
-#include "codec/formats/bmp/wbmp.h"
-
+#include "codec/formats/bmp/bmp_record.h"
 #include "tests/support/guarded_decode.h"
 
 namespace tests {

@@ -2,7 +2,7 @@
 // split, and another request ends what is under way.
 #include <functional>
 
-#include "codec/base/format_state.h"
+#include "codec/formats/format.h"
 #include "tests/support/gif_builder.h"
 #include "tests/support/guarded_decode.h"
 #include "tests/support/samples.h"

@@ -2,7 +2,6 @@
 #pragma once
 
 #include "codec/formats/bmp/bmp_record.h"
-#include "codec/formats/bmp/wbmp.h"
 
 // Reads and checks headers and palette, and places the picture. The object's source is at its start.
 // Null on failure.

@@ -216,4 +216,16 @@ int release(TAVIRPELO_DECINFO* decInfo) {
   return 1;
 }
 
+// ---- format detection ----
+
+bool sniff(const uint8_t* head) {
+  return head[0] == 'B' && head[1] == 'M';
+}
+
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
+  if (!source.need(26)) return cut_head("BMP header");
+  const uint8_t* head = source.next();
+  return found(decInfo, hinfo, TAVIRPELO_FORMAT_BMP, load_le32(head + 18), load_le32(head + 22));
+}
+
 }  // namespace pelo::bmp

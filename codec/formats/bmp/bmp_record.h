@@ -2,8 +2,7 @@
 //
 // How to read this room: bmp_driver.cpp is where each call of a decode begins and ends, bmp_header.cpp
 // sets a decode up, bmp_rows.cpp decodes rows that row_reader.h finds. wbmp.cpp is the decoder of
-// wireless bitmaps, which have a reader of rows in common with these. head.h is all that format
-// detection needs. bmp_abi.h has the given names.
+// wireless bitmaps, which have a reader of rows in common with these. bmp_abi.h has the given names.
 #pragma once
 
 #include <array>
@@ -107,5 +106,29 @@ int decode_lines(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height
 int decode_step(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
 int abort(TAVIRPELO_DECINFO* decInfo);
 int decode_wbmp(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height);
+
+// ---- format detection ----
+
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
+
+bool sniff_wbmp(const uint8_t* head);
+int parse_wbmp_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
+
+// The part of parse_wbmp_head that does not look at `hinfo`.
+int parse_wbmp_sizes(TAVIRPELO_DECINFO& decInfo, Source& source);
+
+// ---- integers of wireless bitmaps, which come in groups of seven bits ----
+
+// Packs the groups of the integer at *position, one after another from the highest bit of packed[0], so
+// that n groups fill n bytes and end in n zero bits; moves *position behind them and stores n. Stops at
+// `size` and after 20 groups, which is what packed must hold.
+void collect_groups(const uint8_t* data, int size, int* position, int* groupCount, uint8_t* packed);
+
+// The big-endian value of byteCount bytes, divided by 2 to the power of shift.
+uint32_t number_of_groups(const uint8_t* packed, int byteCount, int shift);
+
+// base to a power; 1 for exponents below 1.
+uint64_t power(uint64_t base, int exponent);
 
 }  // namespace pelo::bmp

@@ -7,7 +7,7 @@
 #include <iterator>
 
 #include "codec/base/byte_order.h"
-#include "codec/base/row_progress.h"
+#include "codec/base/dec_info.h"
 #include "codec/formats/bmp/bmp_record.h"
 #include "codec/pixel/packed_samples.h"
 #include "codec/pixel/pixel_layout.h"

@@ -53,7 +53,7 @@ int start_frame(Record& record, void* output) {
   record.rowsWritten = 0;
   if (!write_canvas_rows(record, output, 0, record.frame.top)) return kFailure;
   record.inImage = true;
-  return decode_image_step(record.reader.source, &record, output, 1);
+  return decode_image_step(record.reader.io, &record, output, 1);
 }
 
 // The frame's last step: the rows below the image, and what comes next.
@@ -61,12 +61,12 @@ int finish_frame(Record& record, void* output) {
   const int below = record.frame.top + record.frame.height;
   if (!write_canvas_rows(record, output, below, record.screen.height)) return kFailure;
   record.inImage = false;
-  return seek_image(record.reader.source, &record);
+  return seek_image(record.reader.io, &record);
 }
 
 int step(Record& record, void* output) {
   if (!record.inImage) return start_frame(record, output);
-  const int result = decode_image_step(record.reader.source, &record, output, 0);
+  const int result = decode_image_step(record.reader.io, &record, output, 0);
   return result == kDone ? finish_frame(record, output) : result;
 }
 

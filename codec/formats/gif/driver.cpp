@@ -51,18 +51,6 @@ OsPtr<Record> start(TAVIRPELO_DECINFO& decInfo, int width, int height, Mode mode
 
 }  // namespace
 
-Record* new_record(void) {
-  auto record = os_new<Record>();
-  if (record == nullptr) return refuse(Reason::kNoMemory, "GIF decoder"), nullptr;
-  record->kind = Record::kKind;
-  record->control.transparentIndex = -1;
-  return record.release();
-}
-
-void delete_record(Record* record) {
-  OsDelete{}(record);
-}
-
 Record* continue_or_start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, Mode mode) {
   if (!usable(decInfo, output, width, height, kStage)) return nullptr;
   const auto same = [&](const Record& held) {

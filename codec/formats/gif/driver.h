@@ -1,9 +1,10 @@
 // Setting up a GIF decode, and the record that its calls share.
 //
 // How to read this room: driver.cpp is where a decode starts and where each call of it ends;
-// animation.cpp does that for frames. stream.h finds the next image, rows.h loops over its rows, for
-// which lzw.h decompresses as much as is asked, and output.h writes them. record.h has what all of these
-// keep between calls; head.h is all that format detection needs. gif_abi.h has the given names.
+// animation.cpp does that for frames. stream.h finds the next image (and reads the head for format
+// detection), rows.h loops over its rows, for which lzw.h decompresses as much as is asked, and output.h
+// writes them. record.h has what all of these keep between calls, and how large a picture comes out.
+// gif_abi.h has the given names.
 #pragma once
 
 #include "codec/formats/gif/record.h"

@@ -27,17 +27,17 @@ struct Block {
 
 // Enters the next sub-block. The empty one ends the image even without an end code. (By value: the
 // state of the caller's loop then lives in registers.)
-Block next_block(Reader& reader) {
-  const uint8_t* size = take(reader, 1);
+Block next_block(Source& reader) {
+  const uint8_t* size = take_block(reader, 1);
   if (size == nullptr) return {Supply::kCut, nullptr, nullptr};
   if (*size == 0) return {Supply::kTerminated, nullptr, nullptr};
   const int count = *size;
-  const uint8_t* bytes = take(reader, count);
+  const uint8_t* bytes = take_block(reader, count);
   if (bytes == nullptr) return {Supply::kCut, nullptr, nullptr};
   return {Supply::kReady, bytes, bytes + count};
 }
 
-inline Supply need_bits(Reader& reader, LzwState& s) {
+inline Supply need_bits(Source& reader, LzwState& s) {
   while (s.bits.count() < s.codeSize) {
     if (s.next == s.end) {
       const Block block = next_block(reader);

@@ -22,7 +22,7 @@ int end_of_data(Record& record, Supply supply) {
     case Supply::kTerminated:
       return kDone;
     case Supply::kCut:  // a file that simply ends is decoded as far as it goes
-      return tell_io(record.reader.source) == record.reader.source->size ? kDone : kFailure;
+      return tell_io(record.reader.io) == record.reader.io->size ? kDone : kFailure;
     default:
       return kFailure;
   }
@@ -89,18 +89,18 @@ bool begin_image(Record& record) {
 }
 
 int decode_image(TAVIRPELO_IO* source, Record* record, void* output) {
-  record->reader.source = source;
+  record->reader.io = source;
   return begin_image(*record) ? decode_rows(*record, output, INT_MAX) : kFailure;
 }
 
 int decode_image_step(TAVIRPELO_IO* source, Record* record, void* output, int start) {
-  record->reader.source = source;
+  record->reader.io = source;
   if (start == 1) return begin_image(*record) ? kMore : kFailure;
   return decode_rows(*record, output, kRowsOfBatch);
 }
 
 int decode_image_lines(TAVIRPELO_IO* source, Record* record, void* output, int lines, int start) {
-  record->reader.source = source;
+  record->reader.io = source;
   if (start == 1 && !start_lines(*record, output)) return kFailure;
   record->lines = lines;
   record->linesHere = 0;

@@ -1,46 +1,41 @@
 #include "codec/formats/gif/stream.h"
 
 #include <algorithm>
-#include <cstring>
 
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
 #include "codec/base/io.h"
+#include "codec/formats/format.h"
 #include "codec/formats/gif/record.h"
 #include "codec/pixel/quad_sampler.h"
 
 namespace pelo::gif {
 
-int fill_buffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining, uint8_t** cursor) {
+int fill_buffer(int need, TAVIRPELO_IO* io, uint8_t* buffer, int* remaining, uint8_t** cursor) {
   if (*remaining >= need) return 1;
-  if (need > kReaderBytes) return 0;
-  if (*remaining > 0) std::memmove(buffer, *cursor, static_cast<size_t>(*remaining));
-  *cursor = buffer;
-  while (*remaining < need) {
-    const int count = read_io(source, buffer + *remaining, kReaderBytes - *remaining);
-    if (count < 1) return 0;
-    *remaining += count;
-  }
-  return 1;
+  if (need > static_cast<int>(kSourceBufferSize)) return 0;
+  const auto avail = static_cast<uint32_t>(*remaining);
+  const auto pos = avail == 0 ? 0 : static_cast<uint32_t>(*cursor - buffer);
+  Source source{io, 0, 0, pos, avail, buffer};
+  const bool filled = source.need(static_cast<uint32_t>(need));
+  *remaining = static_cast<int>(source.avail);
+  *cursor = buffer + source.pos;
+  return filled ? 1 : 0;
 }
 
-const uint8_t* take(Reader& reader, int n) {
-  if (!fill_buffer(n, reader.source, reader.buffer, &reader.remaining, &reader.cursor)) {
-    reader.remaining = 0;  // the rest of what was cut is no block
-    return nullptr;
-  }
-  const uint8_t* bytes = reader.cursor;
-  reader.cursor += n;
-  reader.remaining -= n;
-  return bytes;
+const uint8_t* take_block(Source& reader, int n) {
+  const auto count = static_cast<uint32_t>(n);
+  const bool whole = reader.need(count);
+  const uint8_t* bytes = reader.take(whole ? count : reader.avail);
+  return whole ? bytes : nullptr;
 }
 
-bool skip_sub_blocks(Reader& reader) {
+bool skip_sub_blocks(Source& reader) {
   for (;;) {
-    const uint8_t* size = take(reader, 1);
+    const uint8_t* size = take_block(reader, 1);
     if (size == nullptr) return false;
     if (*size == 0) return true;
-    if (take(reader, *size) == nullptr) return false;
+    if (take_block(reader, *size) == nullptr) return false;
   }
 }
 
@@ -65,23 +60,28 @@ bool is_signature(const uint8_t* b) {
 }
 
 // Bytes that a block must have.
-const uint8_t* take_whole(Reader& reader, int n) {
-  const uint8_t* bytes = take(reader, n);
+const uint8_t* take_whole(Source& reader, int n) {
+  const uint8_t* bytes = take_block(reader, n);
   if (bytes == nullptr) refuse(Reason::kTruncated, "GIF blocks");
   return bytes;
 }
 
-// The colour table that a descriptor's flags announce. Entries it does not have are black.
-bool read_table(Reader& reader, uint8_t flags, uint32_t* table) {
-  const int count = 2 << (flags & 7);
-  const uint8_t* bytes = take_whole(reader, 3 * count);
+// Bytes of the colour table that a descriptor's flags announce; 0 without one.
+int colour_table(uint8_t flags) {
+  return flags & 0x80 ? 3 << ((flags & 7) + 1) : 0;
+}
+
+// Reads a colour table that is there. Entries it does not have are black.
+bool read_table(Source& reader, uint8_t flags, uint32_t* table) {
+  const int size = colour_table(flags);
+  const uint8_t* bytes = take_whole(reader, size);
   if (bytes == nullptr) return false;
   std::fill_n(table, 256, 0u);
-  pack_table(bytes, count, table);
+  pack_table(bytes, size / 3, table);
   return true;
 }
 
-bool read_graphic_control(Reader& reader, GraphicControl& control) {
+bool read_graphic_control(Source& reader, GraphicControl& control) {
   const uint8_t* b = take_whole(reader, 6);  // size, flags, delay, transparent index, terminator
   if (b == nullptr) return false;
   if (b[0] != 4 || b[5] != 0) return refuse(Reason::kDamaged, "GIF blocks", "graphic control");
@@ -135,10 +135,9 @@ void pack_table(const uint8_t* rgbBytes, int count, uint32_t* table) {
 }
 
 int parse_header(TAVIRPELO_IO* source, Record* record) {
-  Reader& reader = record->reader;
-  reader.source = source;
-  reader.remaining = 0;
+  Source& reader = record->reader;
   if (seek_io(source, 0, SEEK_SET) < 0) return refuse(Reason::kSource, "GIF screen");
+  reader.attach(source);
   const uint8_t* b = take_whole(reader, 13);
   if (b == nullptr) return 0;
   if (!is_signature(b)) return refuse(Reason::kUnknownFormat, "GIF screen");
@@ -149,7 +148,7 @@ int parse_header(TAVIRPELO_IO* source, Record* record) {
 }
 
 int seek_image(TAVIRPELO_IO* source, Record* record) {
-  record->reader.source = source;
+  record->reader.io = source;
   for (;;) {
     const uint8_t* introducer = take_whole(record->reader, 1);
     if (introducer == nullptr) return kFailed;
@@ -165,6 +164,71 @@ int seek_image(TAVIRPELO_IO* source, Record* record) {
         break;
     }
   }
+}
+
+// ---- format detection ----
+
+namespace {
+
+bool skip_image(Source& source) {
+  if (!source.need(9)) return false;
+  const uint8_t flags = source.take(9)[8];
+  if (!source.skip(colour_table(flags) + int64_t{1})) return false;  // and the minimum code size
+  uint8_t size;
+  do {
+    if (!source.need(1)) return false;
+    size = *source.next();
+    if (!source.skip(size + 1)) return false;
+  } while (size != 0);
+  return true;
+}
+
+// Known extensions are passed whole; of others the label alone, and their bodies are scanned.
+bool skip_extension(Source& source) {
+  if (!source.need(2)) return false;
+  const uint8_t label = *source.take(1);
+  const bool known =
+      label == kGraphicControl || label == kComment || label == kApplication || label == kPlainText;
+  return !known || skip_sub_blocks(source);
+}
+
+// Images up to the trailer; negative when the source ends before it.
+int count_images(Source& source) {
+  for (int images = 0;;) {
+    if (!source.need(1)) return -1;
+    switch (*source.take(1)) {
+      case kImageSeparator:
+        if (!skip_image(source)) return -1;
+        ++images;
+        break;
+      case kExtensionIntroducer:
+        if (!skip_extension(source)) return -1;
+        break;
+      case kTrailerByte:
+        return images;
+      default:
+        break;
+    }
+  }
+}
+
+}  // namespace
+
+bool sniff(const uint8_t* head) {
+  return head[0] == 'G' && head[1] == 'I' && head[2] == 'F';
+}
+
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo) {
+  if (!source.need(13)) {
+    return refuse(Reason::kTruncated, "GIF screen"), TAVIRPELO_FORMAT_UNKNOWN;
+  }
+  const uint8_t* screen = source.take(13);
+  found(decInfo, nullptr, TAVIRPELO_FORMAT_GIF, load_le16(screen + 6), load_le16(screen + 8));
+  const int images = source.skip(colour_table(screen[10])) ? count_images(source) : -1;
+  if (images < 0) return refuse(Reason::kTruncated, "GIF blocks", "a GIF without its end"), 0;
+  if (hinfo != nullptr) hinfo->frameCount = images;
+  if (images == 0) return refuse(Reason::kDamaged, "GIF blocks", "a GIF without an image"), 0;
+  return images == 1 ? TAVIRPELO_FORMAT_GIF : TAVIRPELO_FORMAT_ANIMATED_GIF;
 }
 
 }  // namespace pelo::gif

@@ -1,35 +1,25 @@
-// The GIF stream outside the image data: a buffered reader, and by it screen, colour tables, extensions
-// and image descriptors.
+// The GIF stream outside the image data: screen, colour tables, extensions and image descriptors.
 #pragma once
 
 #include <cstdint>
 
-#include "tavirpelo/api.h"
-#include "tavirpelo/io.h"
+#include "codec/base/source.h"
+#include "tavirpelo/parse.h"
 
 namespace pelo::gif {
 
 struct Record;
 
-constexpr int kReaderBytes = 4096;
-
-struct Reader {
-  int remaining;    // unread bytes
-  uint8_t* cursor;  // the next one
-  TAVIRPELO_IO* source;
-  uint8_t buffer[kReaderBytes];
-};
-
-// Consumes n bytes (up to kReaderBytes), which stay valid until the next call; null when the source has
-// fewer, which are passed over.
-const uint8_t* take(Reader& reader, int n);
+// Consumes n bytes (up to kSourceBufferSize), which stay valid until the next call; null when the source
+// has fewer, which are passed over: the rest of what was cut is no block.
+const uint8_t* take_block(Source& reader, int n);
 
 // Consumes data sub-blocks up to and with the empty one; false when the source ends before.
-[[nodiscard]] bool skip_sub_blocks(Reader& reader);
+[[nodiscard]] bool skip_sub_blocks(Source& reader);
 
-// Makes `need` bytes stand at *cursor, moving unread ones to the buffer's start and reading behind them.
-// 1, or 0 when the source ends before.
-int fill_buffer(int need, TAVIRPELO_IO* source, uint8_t* buffer, int* remaining, uint8_t** cursor);
+// A given step: makes `need` bytes stand at *cursor, moving unread ones to the buffer's start and
+// reading behind them. 1, or 0 when the source ends before.
+int fill_buffer(int need, TAVIRPELO_IO* io, uint8_t* buffer, int* remaining, uint8_t** cursor);
 
 // ---- blocks ----
 
@@ -48,5 +38,10 @@ int parse_header(TAVIRPELO_IO* source, Record* record);
 // Goes on to the next image's data: 1 with its descriptor, tables and minimum code size read, 3 at the
 // trailer, 0 for a malformed graphic control extension or the source's end.
 int seek_image(TAVIRPELO_IO* source, Record* record);
+
+// ---- format detection: the screen's size, and how many images follow ----
+
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
 }  // namespace pelo::gif

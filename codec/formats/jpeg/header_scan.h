@@ -12,7 +12,7 @@
 
 #include <cstdint>
 
-#include "codec/base/buffered_source.h"
+#include "codec/base/source.h"
 #include "codec/formats/jpeg/marker_walk.h"
 #include "tavirpelo/decinfo.h"
 #include "tavirpelo/parse.h"
@@ -70,9 +70,9 @@ constexpr int kScanMode = 8;
 
 // The head of a file as format detection reads it (codec/formats/format.h).
 bool sniff(const uint8_t* head);
-int parse_head(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
 // The two at once, for rooms that take JPEG alone.
-int detect(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, TAVIRPELO_HINFO* hinfo);
+int detect(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
 }  // namespace pelo::jpeg

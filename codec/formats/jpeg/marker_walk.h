@@ -2,8 +2,8 @@
 // segment lengths, what the header of every frame begins with (T.81 B.2.2), and why a frame is refused.
 #pragma once
 
-#include "codec/base/buffered_source.h"
 #include "codec/base/errors.h"
+#include "codec/base/source.h"
 #include "codec/formats/jpeg/marker_codes.h"
 
 namespace pelo::jpeg {

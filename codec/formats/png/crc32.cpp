@@ -1,8 +1,8 @@
-#include "codec/formats/png/crc32.h"
-
+// The checksum of PNG chunks.
 #include <array>
 
 #include "codec/base/byte_order.h"
+#include "codec/formats/png/png_info.h"
 
 namespace pelo::png {
 namespace {

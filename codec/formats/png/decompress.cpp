@@ -6,7 +6,6 @@
 #include "codec/base/byte_order.h"
 #include "codec/base/errors.h"
 #include "codec/base/io.h"
-#include "codec/formats/png/crc32.h"
 #include "codec/formats/png/png_context.h"
 
 namespace pelo::png {
@@ -20,9 +19,9 @@ constexpr uint8_t kEmptyIend[12] = {0, 0, 0, 0, 'I', 'E', 'N', 'D', 0xAE, 0x42, 
 // its data.
 bool merge_chunks(PELOI_PNGCONTEXT& context) {
   PELOI_PNGINFO& info = context.info;
-  uint8_t* const base = context.reader.base;
+  uint8_t* const base = context.reader->buffer;
   uint8_t* const data = base + info.idat[0].offset;
-  const uint8_t* const end = base + context.reader.limit;
+  const uint8_t* const end = base + context.reader->size;
   if (info.idatLength + 4 + sizeof kEmptyIend > static_cast<uint64_t>(end - data)) return false;
   uint8_t* out = data + info.idat[0].length;
   for (size_t i = 1; i < info.idatCount; ++i) {
@@ -43,7 +42,7 @@ Result open_memory_input(PELOI_PNGCONTEXT& context) {
   if (context.info.idatCount > 1 && !merge_chunks(context))
     return refuse(Reason::kDamaged, kStage), kFailed;
   InflateInput& input = context.inflater.input();
-  input.next = context.reader.base + context.info.idat[0].offset;
+  input.next = context.reader->buffer + context.info.idat[0].offset;
   input.end = input.next + context.info.idat[0].length;
   context.inputReady = true;
   return kDone;
@@ -51,17 +50,17 @@ Result open_memory_input(PELOI_PNGCONTEXT& context) {
 
 bool refill(void* opaque) {
   auto* context = static_cast<PELOI_PNGCONTEXT*>(opaque);
-  PELOI_PNGREADBUFFER& reader = context->reader;
+  Source& reader = *context->reader.get();
   if (refill_from_chunks(context, &reader, context->idatEntry) != 1) return false;
   InflateInput& input = context->inflater.input();
-  input.next = reader.base + reader.cursor;
-  input.end = input.next + reader.remaining;
+  input.next = reader.next();
+  input.end = input.next + reader.avail;
   return true;
 }
 
 // The source may have been moved between calls; bytes already read stay in the reader's window.
 Result open_stream_input(PELOI_PNGCONTEXT& context) {
-  context.reader.consumed = -1;
+  context.reader->consumed = UINT32_MAX;  // no chunk begins there
   context.inflater.input().refill = refill;
   context.inflater.input().context = &context;
   return kDone;
@@ -122,26 +121,21 @@ int inflate_interlaced(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput ope
 }
 
 }  // namespace
-int refill_from_chunks(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer, uint32_t entryIndex) {
+int refill_from_chunks(PELOI_PNGCONTEXT* context, Source* reader, uint32_t entryIndex) {
   PELOI_PNGINFO& info = context->info;
   while (entryIndex < info.idatCount && info.idat[entryIndex].length == 0) ++entryIndex;
   context->idatEntry = entryIndex;
   if (entryIndex >= info.idatCount) return 0;
   IdatEntry& entry = info.idat[entryIndex];
-  if (buffer->consumed != entry.offset) {
+  if (reader->consumed != entry.offset) {
     const auto offset = pelo::checked_int(entry.offset);
-    if (!offset || seek_io(buffer->source, *offset, SEEK_SET) != *offset) return 0;
+    if (!offset || seek_io(reader->io, *offset, SEEK_SET) != *offset) return 0;
+    reader->consumed = entry.offset;
   }
-  const uint32_t wanted = std::min(entry.length, kReadWindow);
-  const int count = read_io(buffer->source, buffer->base, static_cast<int>(wanted));
-  if (count <= 0 || static_cast<uint32_t>(count) > wanted) return 0;
-  const auto read = static_cast<uint32_t>(count);
-  buffer->bufferPosition = entry.offset;
-  entry.offset += read;
-  entry.length -= read;
-  buffer->consumed = entry.offset;
-  buffer->cursor = 0;
-  buffer->remaining = read;
+  reader->pos = reader->avail = 0;
+  if (!reader->refill(std::min(entry.length, kSourceBufferSize))) return 0;
+  entry.offset += reader->avail;
+  entry.length -= reader->avail;
   return 1;
 }
 

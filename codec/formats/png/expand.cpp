@@ -1,7 +1,7 @@
-#include "codec/formats/png/expand.h"
-
+// Scanlines of every colour type and depth into R, G, B, A bytes.
 #include <cstring>
 
+#include "codec/formats/png/png_context.h"
 #include "codec/pixel/packed_samples.h"
 
 namespace pelo::png {

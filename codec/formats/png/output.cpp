@@ -8,7 +8,7 @@
 #include <cstring>
 
 #include "codec/base/byte_order.h"
-#include "codec/base/row_progress.h"
+#include "codec/base/dec_info.h"
 #include "codec/formats/png/png_context.h"
 #include "codec/pixel/paint.h"
 #include "codec/pixel/row_stores.h"

@@ -1,12 +1,10 @@
 // Given names of this room that no public header has; each is what the room's own function says.
 #pragma once
 
-#include "codec/formats/png/crc32.h"
 #include "codec/formats/png/huffman_table.h"
 #include "codec/formats/png/png_context.h"
 #include "codec/formats/png/png_driver.h"
 #include "codec/formats/png/png_info.h"
-#include "codec/formats/png/read_buffer.h"
 
 // The checksum of a byte array.
 TAVIRPELO_API uint32_t __PELOI_PngCrc32(const uint8_t* data, uint32_t length);

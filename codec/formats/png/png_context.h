@@ -1,12 +1,12 @@
 // The state of one PNG decode, held by the decoder information object between calls.
 #pragma once
 
+#include <array>
 #include <cstdint>
 
 #include "codec/base/axis_stepper.h"
 #include "codec/base/output_grid.h"
 #include "codec/formats/format.h"
-#include "codec/formats/png/expand.h"
 #include "codec/formats/png/inflate.h"
 #include "codec/formats/png/png_info.h"
 #include "codec/pixel/row_stores.h"
@@ -32,6 +32,21 @@ struct ScanlineState {
   size_t filled;            // bytes of the current row received
   uint32_t row;             // rows of the pass finished
   const uint8_t* finished;  // the restored row's bytes while output rows of it are pending
+};
+
+// What an image's samples mean.
+struct SampleMeaning {
+  std::array<std::array<uint8_t, 4>, 256> colours;  // of palette indices and grey samples
+  std::array<uint16_t, 3> key;                      // truecolour: the transparent colour, or none
+};
+
+// Expands `count` pixels of a row: pixel begin + i, or with a column map pixel columns[begin + i].
+using ExpandRow = void (*)(const SampleMeaning& meaning, const uint8_t* row, const uint32_t* columns,
+                           uint32_t begin, int count, uint8_t* rgba);
+
+struct Expander {
+  ExpandRow consecutive;
+  ExpandRow mapped;
 };
 
 struct OutputState {
@@ -60,7 +75,7 @@ typedef struct PELOI_PNGCONTEXT : pelo::FormatState {
   PELOI_PNGINFO info;
   pelo::DecodeRequest request;
   uint32_t iterFlag;
-  PELOI_PNGREADBUFFER reader;
+  pelo::BufferedSource reader;
   bool inputReady;     // memory: chunks merged
   uint32_t idatEntry;  // other sources: the entry being read
   pelo::png::Inflater inflater;
@@ -90,7 +105,7 @@ uint32_t set_pass_size(PELOI_PNGCONTEXT* context, uint32_t fullWidth, uint32_t f
 
 // Reads the next piece of the image data, at most 4096 bytes and never beyond the chunk of `entryIndex`
 // or, when that is used up, the next. 1, or 0 when there is none.
-int refill_from_chunks(PELOI_PNGCONTEXT* context, PELOI_PNGREADBUFFER* buffer, uint32_t entryIndex);
+int refill_from_chunks(PELOI_PNGCONTEXT* context, Source* reader, uint32_t entryIndex);
 
 // Decompress and write until the image ends or the mode says stop: a Result. `total` receives the number
 // of bytes decompressed so far.
@@ -114,6 +129,20 @@ bool completes_row(const PELOI_PNGCONTEXT& context, int64_t sourceRow);
 
 // Asked after every output row: the external status may pause the decode; false cancels it.
 bool host_agrees();
+
+// ---- row_filter.cpp (clause 9) ----
+
+// Restores a scanline in place from its filter type and the restored row above it. An unknown type
+// leaves the row as it is but for its first byte, which becomes 0.
+void unfilter(uint8_t type, uint8_t* row, const uint8_t* above, size_t rowBytes, int bytesPerPixel);
+
+// ---- expand.cpp: scanlines of every colour type and depth into R, G, B, A bytes ----
+
+SampleMeaning meaning_of(const PELOI_PNGINFO& info);
+Expander expander_of(const PELOI_PNGINFO& info);
+
+// True when some pixel may have an alpha below 255.
+bool has_transparency(const PELOI_PNGINFO& info);
 
 // ---- output.cpp ----
 

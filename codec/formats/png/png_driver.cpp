@@ -1,16 +1,32 @@
 #include "codec/formats/png/png_driver.h"
 
+#include <algorithm>
+
 #include "codec/base/errors.h"
+#include "codec/base/io.h"
 
 namespace pelo::png {
 namespace {
 
 constexpr const char* kStage = "PNG decoder";
 
+// Attaches the reader to the start of a source: memory is read where it is. False when memory is short
+// or the source cannot be moved.
+bool open_reader(BufferedSource& reader, TAVIRPELO_IO* io) {
+  constexpr const char* kReading = "PNG source";
+  if (io == nullptr) return refuse(Reason::kArgument, kReading);
+  if (io->ioType == TAVIRPELO_IO_MEMORY) {
+    reader.open(static_cast<uint8_t*>(io->pSource), static_cast<uint32_t>(std::max(io->size, 0)));
+    return io->pSource != nullptr || refuse(Reason::kEmpty, kReading);
+  }
+  if (!reader.open(io)) return refuse(Reason::kNoMemory, kReading);
+  return seek_io(io, 0, SEEK_SET) == 0 || refuse(Reason::kSource, kReading);
+}
+
 // The state of a first call: reader, header, output.
 Result begin(PELOI_PNGCONTEXT& context, TAVIRPELO_DECINFO& decInfo) {
-  if (!open_read_buffer(context.reader, decInfo.pIO)) return kNoMemory;
-  if (parse_chunks(&context.info, &context.reader) != kDone) return kUnreadable;
+  if (!open_reader(context.reader, decInfo.pIO)) return kNoMemory;
+  if (parse_chunks(&context.info, context.reader.get()) != kDone) return kUnreadable;
   const PELOI_PNGINFO& info = context.info;
   if (info.width == 0 || info.height == 0)
     return refuse(Reason::kDamaged, kStage, "no header"), kUnreadable;
@@ -44,7 +60,7 @@ int decompress(PELOI_PNGCONTEXT& context) {
   constexpr Decompress kVariants[2][2] = {{inflate_memory, inflate_stream},
                                           {inflate_interlaced_memory, inflate_interlaced_stream}};
   const size_t interlaced = context.info.interlace != 0 ? 1 : 0;
-  const size_t streaming = is_memory(context.reader) ? 0 : 1;
+  const size_t streaming = context.reader->is_memory() ? 0 : 1;
   uint32_t total = 0;
   return kVariants[interlaced][streaming](&context, &total);
 }
@@ -61,7 +77,7 @@ int decode(TAVIRPELO_DECINFO& decInfo, void* output, const DecodeRequest& reques
   if (context->output.width == 0 || context->output.height == 0) return kDone;
   if (!accepts_lines(*context, lines))
     return refuse(Reason::kArgument, kStage, "rows of an interlaced PNG"), kLineMode;
-  context->reader.source = decInfo.pIO;
+  if (!context->reader->is_memory()) context->reader->io = decInfo.pIO;
   context->decInfo = &decInfo;
   context->iterFlag = decInfo.pngIterFlag != 0 ? 1 : 0;
   aim_output(*context, output, lines);
@@ -96,9 +112,9 @@ int release(TAVIRPELO_DECINFO* decInfo) {
 int needs_alpha(TAVIRPELO_DECINFO* decInfo) {
   if (decInfo == nullptr || decInfo->pIO == nullptr) return 0;
   const auto context = pelo::os_new<PELOI_PNGCONTEXT>();
-  if (context == nullptr || !open_read_buffer(context->reader, decInfo->pIO)) return 0;
+  if (context == nullptr || !open_reader(context->reader, decInfo->pIO)) return 0;
   // What was read before a failure decides.
-  static_cast<void>(parse_chunks(&context->info, &context->reader));
+  static_cast<void>(parse_chunks(&context->info, context->reader.get()));
   release(decInfo);
   const bool carriesAlpha = (context->info.colourType & 4) != 0;
   return carriesAlpha || (context->info.ancillaryFlags & kTrnsRead) != 0;

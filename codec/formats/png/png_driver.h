@@ -1,10 +1,10 @@
 // Driver of the PNG decoder, and the release of its state.
 //
 // How to read this room: png_driver.cpp is where each call of a decode begins and ends. parse.cpp reads
-// the chunks through read_buffer.h; decompress.cpp runs the inflater (inflate.h, huffman_table.h) over
-// the image data; scanlines.cpp cuts what it yields into rows and has row_filter.h restore them;
-// output.cpp writes them, through expand.h. png_context.h has what all of these keep between calls;
-// head.h is all that format detection needs. png_abi.h has the given names.
+// the chunks; decompress.cpp runs the inflater (inflate.h, huffman_table.h) over the image data;
+// scanlines.cpp cuts what it yields into rows and has row_filter.cpp restore them; output.cpp writes
+// them, through expand.cpp. png_context.h has what all of these keep between calls, png_info.h what the
+// chunks say. png_abi.h has the given names.
 #pragma once
 
 #include <cstdint>

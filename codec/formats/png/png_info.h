@@ -1,11 +1,14 @@
-// What the chunks before the pixels say: header, palette, transparency, and where the image data lie.
+// What the chunks before the pixels say (ISO/IEC 15948): header, palette, transparency, and where the
+// image data lie.
 #pragma once
 
 #include <array>
 #include <cstdint>
 
-#include "codec/formats/png/read_buffer.h"
-#include "tavirpelo/decinfo.h"
+#include "codec/base/source.h"
+#include "tavirpelo/parse.h"
+
+typedef pelo::Source PELOI_PNGREADBUFFER;
 
 namespace pelo::png {
 
@@ -61,15 +64,35 @@ namespace pelo::png {
 
 // Reads the chunks from the source's start to the first empty chunk; their data are checked, not
 // decompressed. A Result: 1, 6 (a checksum differs), 7, 8.
-int parse_chunks(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer);
+int parse_chunks(PELOI_PNGINFO* info, Source* source);
 
 // Reads the `length` bytes of a tRNS chunk at the cursor into the palette's alpha or the colour key. 1;
 // 3 before any IHDR; 6 for a colour type or length that allows none; 8 when the read fails or there are
 // more values than palette entries. The chunk type is not looked at.
-int parse_transparency(PELOI_PNGINFO* info, PELOI_PNGREADBUFFER* buffer, uint32_t length,
-                       uint32_t chunkType, std::array<uint16_t, 3>* colourKey);
+int parse_transparency(PELOI_PNGINFO* info, Source* source, uint32_t length, uint32_t chunkType,
+                       std::array<uint16_t, 3>* colourKey);
+
+// Given steps: one refill of an empty window, and one behind the unread bytes. 1, or 11 when `need`
+// (more) bytes exceed 4096, the source is memory or has no more.
+int refill_empty(Source* source, uint32_t need);
+int refill_behind(Source* source, uint32_t need);
 
 // A big-endian 32-bit value.
 uint32_t load_uint32(const uint8_t* bytes);
+
+// ---- the checksum of chunks: ISO 3309, reflected polynomial 0xEDB88320 ----
+
+constexpr uint32_t kCrcPreset = 0xFFFFFFFF;
+
+// The register after `size` more bytes. The checksum is the complement of the last register.
+uint32_t crc32_update(uint32_t crc, const uint8_t* data, size_t size);
+
+// The checksum of a byte array.
+uint32_t crc32(const uint8_t* data, uint32_t length);
+
+// ---- format detection (5.2 and 11.2.2) ----
+
+bool sniff(const uint8_t* head);
+int parse_head(TAVIRPELO_DECINFO& decInfo, Source& source, TAVIRPELO_HINFO* hinfo);
 
 }  // namespace pelo::png

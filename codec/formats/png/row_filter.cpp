@@ -1,7 +1,8 @@
-#include "codec/formats/png/row_filter.h"
-
+// Undoing the filters of scanlines.
 #include <algorithm>
 #include <cstdlib>
+
+#include "codec/formats/png/png_context.h"
 
 namespace pelo::png {
 namespace {

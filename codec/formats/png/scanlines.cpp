@@ -3,9 +3,8 @@
 #include <cstring>
 #include <utility>
 
-#include "codec/base/row_progress.h"
+#include "codec/base/dec_info.h"
 #include "codec/formats/png/png_context.h"
-#include "codec/formats/png/row_filter.h"
 
 namespace pelo::png {
 namespace {

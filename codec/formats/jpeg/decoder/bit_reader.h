@@ -6,8 +6,8 @@
 #include <cstdint>
 #include <type_traits>
 
-#include "codec/base/buffered_source.h"
 #include "codec/base/byte_order.h"
+#include "codec/base/source.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
 
 namespace pelo::jpeg {

@@ -7,11 +7,11 @@
 #include <cstdint>
 #include <memory>
 
-#include "codec/base/buffered_source.h"
 #include "codec/base/checked.h"
 #include "codec/base/errors.h"
 #include "codec/base/geometry.h"
 #include "codec/base/os_memory.h"
+#include "codec/base/source.h"
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 #include "codec/formats/jpeg/decoder/huffman.h"
 #include "codec/formats/jpeg/decoder/row_output.h"

@@ -6,7 +6,7 @@
 // segment.
 #pragma once
 
-#include "codec/base/buffered_source.h"
+#include "codec/base/source.h"
 #include "codec/formats/jpeg/tiff.h"
 #include "tavirpelo/exif.h"
 

@@ -9,17 +9,17 @@ namespace pelo::jpeg {
 
 namespace {
 
-bool read_frame_size(PELOJ_SOURCE& source, uint32_t& width, uint32_t& height) {
+bool read_frame_size(Source& source, uint32_t& width, uint32_t& height) {
   FrameHead head;
   uint32_t remaining;
   if (!read_frame_head(source, head, remaining) || head.precision != 8) return false;
   height = static_cast<uint32_t>(head.height);
   width = static_cast<uint32_t>(head.width);
-  return source_skip(source, remaining);
+  return source.skip(remaining);
 }
 
 // Walks to the first scan; false when the data ends before it.
-bool read_resolution(PELOJ_SOURCE& source, uint32_t& width, uint32_t& height) {
+bool read_resolution(Source& source, uint32_t& width, uint32_t& height) {
   uint8_t code;
   while (next_marker(source, code)) {
     const Marker marker{code};
@@ -39,13 +39,8 @@ int jpeg_size(const uint8_t* data, uint32_t size, uint32_t* width, uint32_t* hei
   if (size < 2 || size > INT_MAX || data[0] != 0xFF || data[1] != static_cast<uint8_t>(Marker::kSoi)) {
     return PELOJ_FAIL;
   }
-  TAVIRPELO_IO io{};
-  io.ioType = TAVIRPELO_IO_MEMORY;
-  io.pSource = const_cast<uint8_t*>(data);
-  io.size = static_cast<int>(size);
-  io.position = 2;
-  uint8_t window[kSourceBufferSize];
-  PELOJ_SOURCE source{&io, 2, size, 0, 0, window};
+  Source source = Source::over(const_cast<uint8_t*>(data), size);
+  source.take(2);
   uint32_t seenWidth = 0;
   uint32_t seenHeight = 0;
   if (!read_resolution(source, seenWidth, seenHeight)) return PELOJ_FAIL;

@@ -1,8 +1,10 @@
+#include "codec/formats/gif/record.h"
+
 #include <algorithm>
 
 #include "codec/base/axis_stepper.h"
+#include "codec/base/errors.h"
 #include "codec/formats/format.h"
-#include "codec/formats/gif/output.h"
 #include "codec/pixel/row_stores.h"
 
 namespace pelo::gif {
@@ -17,6 +19,19 @@ int64_t first_row(const Sampling& s, int64_t screenRow) {
 }
 
 }  // namespace
+
+Record* new_record(void) {
+  auto record = os_new<Record>();
+  if (record == nullptr) return refuse(Reason::kNoMemory, "GIF decoder"), nullptr;
+  record->kind = Record::kKind;
+  record->reader.buffer = record->window;
+  record->control.transparentIndex = -1;
+  return record.release();
+}
+
+void delete_record(Record* record) {
+  OsDelete{}(record);
+}
 
 bool IndexPlane::allocate(Size wanted) {
   size = wanted;
