@@ -77,23 +77,6 @@ class BufferedSource {
 // at least one byte (possibly fewer than n in all), 0 when there was nothing to read or no room for it.
 int check_buffer(Source* source, int n);
 
-// The same by the names that the JPEG rooms use.
-[[nodiscard]] inline bool source_need(Source& source, uint32_t n) {
-  return source.need(n);
-}
-inline const uint8_t* source_take(Source& source, uint32_t n) {
-  return source.take(n);
-}
-[[nodiscard]] inline bool source_skip(Source& source, int64_t k) {
-  return source.skip(k);
-}
-[[nodiscard]] inline bool source_reposition(Source& source, int64_t offset) {
-  return source.move_to(offset);
-}
-inline uint32_t source_offset(const Source& source) {
-  return source.tell();
-}
-
 }  // namespace pelo
 
 // The record's order is that of the interface.

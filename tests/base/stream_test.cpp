@@ -79,17 +79,17 @@ TEST(Streams, ShortReadsNeverInventBytes) {
   EXPECT_EQ(1, PELOJ_CheckBuffer(source.get(), 250));
   EXPECT_EQ(100u, source->avail);  // one read, and no room in front of the unread bytes for another
   EXPECT_EQ(0, PELOJ_CheckBuffer(source.get(), 250));
-  EXPECT_TRUE(pelo::source_need(*source.get(), 250));
+  EXPECT_TRUE(source.get()->need(250));
   EXPECT_EQ(300u, source->avail);
-  ASSERT_TRUE(pelo::source_skip(*source.get(), 60));
-  ASSERT_TRUE(pelo::source_need(*source.get(), 3800));
-  EXPECT_EQ(60u, pelo::source_offset(*source.get()));
-  for (int i = 60; i < 150; ++i) ASSERT_EQ(i % 251, *pelo::source_take(*source.get(), 1)) << i;
-  ASSERT_TRUE(pelo::source_reposition(*source.get(), 5920));
+  ASSERT_TRUE(source.get()->skip(60));
+  ASSERT_TRUE(source.get()->need(3800));
+  EXPECT_EQ(60u, source.get()->tell());
+  for (int i = 60; i < 150; ++i) ASSERT_EQ(i % 251, *source.get()->take(1)) << i;
+  ASSERT_TRUE(source.get()->move_to(5920));
   EXPECT_EQ(1, PELOJ_CheckBuffer(source.get(), 90));
-  EXPECT_FALSE(pelo::source_need(*source.get(), 90));
+  EXPECT_FALSE(source.get()->need(90));
   EXPECT_EQ(80u, source->avail);
-  EXPECT_EQ(5920 % 251, *pelo::source_take(*source.get(), 1));
+  EXPECT_EQ(5920 % 251, *source.get()->take(1));
   EXPECT_EQ(2, PELOJ_CheckBuffer(source.get(), 0));
   EXPECT_EQ(0, PELOJ_CheckBuffer(source.get(), 4097));
   TAVIRPELO_Close_IO(io);

@@ -31,7 +31,7 @@ int header_info(TAVIRPELO_IO* io, TAVIRPELO_HINFO* hinfo) {
   PELOJ_FILEHEADER small{};
   if (header.thumbnail.type == PELOJ_THUMBNAIL_JPEG &&
       thumbnail_in_source(header.thumbnail, source->size)) {
-    if (!source_reposition(*source.get(), header.thumbnail.offset)) {
+    if (!source.get()->move_to(header.thumbnail.offset)) {
       return fail("TAVIRPELO_DecodeJPEG : seek Fail");
     }
     if (scan_size(source.get(), kScanMode, &small) != PELOJ_OK) {

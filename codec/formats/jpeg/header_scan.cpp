@@ -54,13 +54,13 @@ bool read_frame(PELOJ_SOURCE& source, Marker code, PELOJ_FILEHEADER& result) {
   result.width = head.width;
   result.height = head.height;
   if (code == Marker::kSof2) result.progressive = 1;
-  return source_skip(source, remaining);
+  return source.skip(remaining);
 }
 
 bool search_segment(PELOJ_SOURCE& source, SegmentReader reader, ThumbnailSearch& search) {
   uint32_t remaining;
   if (!segment_length(source, remaining)) return false;
-  const Segment segment{source, int64_t{source_offset(source)} + remaining};
+  const Segment segment{source, int64_t{source.tell()} + remaining};
   if (segment.end >= source.size) return false;
   if (!reader(segment, search)) return refuse(Reason::kDamaged, kStage, "an application segment");
   return segment.leave();

@@ -37,8 +37,8 @@ PELOJ_THUMBNAIL scanned(const TAVIRPELO_EXIFTHUMBNAIL& t) {
 
 // Reads a directory's entry count at the current position; false when the data ends.
 bool read_count(const Exif& exif, uint16_t& count) {
-  if (!source_need(exif.segment.source, 2)) return false;
-  count = tiff::load16(source_take(exif.segment.source, 2), exif.header.order);
+  if (!exif.segment.source.need(2)) return false;
+  count = tiff::load16(exif.segment.source.take(2), exif.header.order);
   return true;
 }
 
@@ -48,11 +48,11 @@ bool find_ifd1(const Exif& exif, uint32_t& ifd1) {
   ifd1 = 0;
   if (exif.header.ifd0 < tiff::kHeaderSize || !exif.inside(exif.header.ifd0)) return true;
   uint16_t count;
-  if (!source_skip(source, int64_t{exif.header.ifd0} - tiff::kHeaderSize) || !read_count(exif, count) ||
-      !source_skip(source, int64_t{count} * tiff::kEntrySize) || !source_need(source, 4)) {
+  if (!source.skip(int64_t{exif.header.ifd0} - tiff::kHeaderSize) || !read_count(exif, count) ||
+      !source.skip(int64_t{count} * tiff::kEntrySize) || !source.need(4)) {
     return false;
   }
-  ifd1 = tiff::load32(source_take(source, 4), exif.header.order);
+  ifd1 = tiff::load32(source.take(4), exif.header.order);
   if (!exif.inside(ifd1)) ifd1 = 0;
   return true;
 }
@@ -61,14 +61,13 @@ bool find_ifd1(const Exif& exif, uint32_t& ifd1) {
 bool read_ifd1(const Exif& exif, uint32_t ifd1, ThumbnailSearch& search) {
   PELOJ_SOURCE& source = exif.segment.source;
   uint16_t count;
-  if (!source_reposition(source, exif.base + ifd1) || !read_count(exif, count)) return false;
+  if (!source.move_to(exif.base + ifd1) || !read_count(exif, count)) return false;
   TAVIRPELO_EXIFTHUMBNAIL thumbnail{};
   bool reachable = true;
   for (; count > 0; --count) {
-    if (!source_need(source, tiff::kEntrySize)) return false;
+    if (!source.need(tiff::kEntrySize)) return false;
     if (exif.segment.left() < tiff::kEntrySize) break;
-    const tiff::Entry entry =
-        tiff::parse_entry(source_take(source, tiff::kEntrySize), exif.header.order);
+    const tiff::Entry entry = tiff::parse_entry(source.take(tiff::kEntrySize), exif.header.order);
     if (tiff::type_size(entry.type) == 0) break;
     const auto value = entry.first_value();
     const ThumbnailTag* tag = thumbnail_tag(entry.tag);
@@ -84,11 +83,11 @@ bool read_ifd1(const Exif& exif, uint32_t ifd1, ThumbnailSearch& search) {
 
 bool read_exif(const Segment& segment, ThumbnailSearch& search) {
   if (!segment.holds(kIdentifier + tiff::kHeaderSize)) return true;
-  const uint8_t* bytes = source_take(segment.source, kIdentifier + tiff::kHeaderSize);
+  const uint8_t* bytes = segment.source.take(kIdentifier + tiff::kHeaderSize);
   if (std::memcmp(bytes, "Exif\0", kIdentifier) != 0) return true;
   const auto header = tiff::parse_header(bytes + kIdentifier);
   if (!header) return true;
-  const Exif exif{segment, int64_t{source_offset(segment.source)} - tiff::kHeaderSize, *header};
+  const Exif exif{segment, int64_t{segment.source.tell()} - tiff::kHeaderSize, *header};
   uint32_t ifd1;
   if (!find_ifd1(exif, ifd1)) return false;
   return ifd1 == 0 || read_ifd1(exif, ifd1, search);

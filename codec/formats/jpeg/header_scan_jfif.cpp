@@ -17,13 +17,13 @@ PELOJ_THUMBNAIL rest_of(const Segment& segment, int32_t type) {
   thumbnail.type = type;
   thumbnail.layout = type == PELOJ_THUMBNAIL_PIXELS ? 2 : 0;
   thumbnail.length = static_cast<uint32_t>(segment.left());
-  thumbnail.offset = source_offset(segment.source);
+  thumbnail.offset = segment.source.tell();
   return thumbnail;
 }
 
 void read_jfif_thumbnail(const Segment& segment, ThumbnailSearch& search) {
   if (!segment.holds(kJfifFields)) return;
-  const uint8_t* fields = source_take(segment.source, kJfifFields);
+  const uint8_t* fields = segment.source.take(kJfifFields);
   PELOJ_THUMBNAIL thumbnail = rest_of(segment, PELOJ_THUMBNAIL_PIXELS);
   thumbnail.width = fields[7];
   thumbnail.height = fields[8];
@@ -38,7 +38,7 @@ void accept_pixels(const Segment& segment, ThumbnailSearch& search, uint32_t byt
 // Pixels are believed only when they fill the size that an earlier JFIF segment gave.
 void read_jfxx_thumbnail(const Segment& segment, ThumbnailSearch& search) {
   if (!segment.holds(1)) return;
-  switch (*source_take(segment.source, 1)) {
+  switch (*segment.source.take(1)) {
     case kJpegThumbnail:
       return search.accept(rest_of(segment, PELOJ_THUMBNAIL_JPEG));
     case kPaletteThumbnail:
@@ -54,7 +54,7 @@ void read_jfxx_thumbnail(const Segment& segment, ThumbnailSearch& search) {
 
 bool read_jfif(const Segment& segment, ThumbnailSearch& search) {
   if (!segment.holds(kIdentifier)) return true;
-  const uint8_t* identifier = source_take(segment.source, kIdentifier);
+  const uint8_t* identifier = segment.source.take(kIdentifier);
   if (std::memcmp(identifier, "JFIF", kIdentifier) == 0) read_jfif_thumbnail(segment, search);
   if (std::memcmp(identifier, "JFXX", kIdentifier) == 0) read_jfxx_thumbnail(segment, search);
   return true;

@@ -23,17 +23,17 @@ bool is_thumbnail(const Resource& resource) {
 bool next_resource(const Segment& segment, Resource& resource) {
   PELOJ_SOURCE& source = segment.source;
   if (!segment.holds(7)) return false;
-  const uint8_t* head = source_take(source, 7);
+  const uint8_t* head = source.take(7);
   if (std::memcmp(head, "8BIM", 4) != 0) return false;
   resource.id = load_be16(head + 4);
   const uint32_t nameRest = (head[6] & 0xFEu) + 1;
   if (!segment.holds(nameRest + 4)) return false;
-  resource.size = load_be32(source_take(source, nameRest + 4) + nameRest);
+  resource.size = load_be32(source.take(nameRest + 4) + nameRest);
   return resource.size <= segment.left();
 }
 
 void read_thumbnail(const Segment& segment, ThumbnailSearch& search) {
-  const uint8_t* head = source_take(segment.source, kThumbnailHeader);
+  const uint8_t* head = segment.source.take(kThumbnailHeader);
   const bool pixels = load_be32(head) == 0;
   PELOJ_THUMBNAIL thumbnail{};
   thumbnail.type = pixels ? PELOJ_THUMBNAIL_PIXELS : PELOJ_THUMBNAIL_PHOTOSHOP;
@@ -41,7 +41,7 @@ void read_thumbnail(const Segment& segment, ThumbnailSearch& search) {
   thumbnail.width = static_cast<int32_t>(load_be32(head + 4));
   thumbnail.height = static_cast<int32_t>(load_be32(head + 8));
   thumbnail.length = load_be32(head + 20);
-  thumbnail.offset = source_offset(segment.source);
+  thumbnail.offset = segment.source.tell();
   search.accept(thumbnail);
 }
 
@@ -49,13 +49,13 @@ void read_thumbnail(const Segment& segment, ThumbnailSearch& search) {
 
 bool read_photoshop(const Segment& segment, ThumbnailSearch& search) {
   if (search.found.present != 0 || segment.left() < kIdentifier) return true;
-  if (!source_skip(segment.source, kIdentifier)) return false;
+  if (!segment.source.skip(kIdentifier)) return false;
   Resource resource;
   while (next_resource(segment, resource)) {
-    const int64_t next = source_offset(segment.source) + resource.size + (resource.size & 1);
+    const int64_t next = segment.source.tell() + resource.size + (resource.size & 1);
     if (is_thumbnail(resource) && segment.holds(kThumbnailHeader)) read_thumbnail(segment, search);
     if (next > segment.end) break;
-    if (!source_skip(segment.source, next - source_offset(segment.source))) return false;
+    if (!segment.source.skip(next - segment.source.tell())) return false;
   }
   return true;
 }

@@ -12,13 +12,11 @@ struct Segment {
   PELOJ_SOURCE& source;
   int64_t end;  // source offset of the byte behind the segment
 
-  int64_t left() const { return end - source_offset(source); }
+  int64_t left() const { return end - source.tell(); }
   // True when n more bytes belong to the segment and are in the buffer.
-  [[nodiscard]] bool holds(uint32_t n) const { return left() >= n && source_need(source, n); }
+  [[nodiscard]] bool holds(uint32_t n) const { return left() >= n && source.need(n); }
   // Consumes to the segment's end from wherever its reader stopped, before or behind it.
-  [[nodiscard]] bool leave() const {
-    return left() >= 0 ? source_skip(source, left()) : source_reposition(source, end);
-  }
+  [[nodiscard]] bool leave() const { return left() >= 0 ? source.skip(left()) : source.move_to(end); }
 };
 
 // What a scan collects: the last usable thumbnail.

@@ -6,8 +6,8 @@ namespace pelo::jpeg {
 
 bool find_soi(PELOJ_SOURCE& source) {
   bool afterFf = false;
-  while (source_need(source, 1)) {
-    const uint8_t byte = *source_take(source, 1);
+  while (source.need(1)) {
+    const uint8_t byte = *source.take(1);
     if (afterFf && byte == static_cast<uint8_t>(Marker::kSoi)) return true;
     afterFf = byte == 0xFF;
   }
@@ -16,8 +16,8 @@ bool find_soi(PELOJ_SOURCE& source) {
 
 bool next_marker(PELOJ_SOURCE& source, uint8_t& code) {
   bool afterFf = false;
-  while (source_need(source, 1)) {
-    const uint8_t byte = *source_take(source, 1);
+  while (source.need(1)) {
+    const uint8_t byte = *source.take(1);
     if (afterFf && byte != 0xFF) {
       code = byte;
       return true;
@@ -28,8 +28,8 @@ bool next_marker(PELOJ_SOURCE& source, uint8_t& code) {
 }
 
 bool segment_length(PELOJ_SOURCE& source, uint32_t& remaining) {
-  if (!source_need(source, 2)) return false;
-  const uint32_t length = load_be16(source_take(source, 2));
+  if (!source.need(2)) return false;
+  const uint32_t length = load_be16(source.take(2));
   if (length < 2) return false;
   remaining = length - 2;
   return true;
@@ -42,7 +42,7 @@ bool has_segment(Marker code) {
 
 bool skip_segment(PELOJ_SOURCE& source) {
   uint32_t remaining;
-  return segment_length(source, remaining) && source_skip(source, remaining);
+  return segment_length(source, remaining) && source.skip(remaining);
 }
 
 FrameHead load_frame_head(const uint8_t* bytes) {
@@ -51,10 +51,10 @@ FrameHead load_frame_head(const uint8_t* bytes) {
 
 bool read_frame_head(PELOJ_SOURCE& source, FrameHead& head, uint32_t& remaining) {
   if (!segment_length(source, remaining) || remaining < kFrameHeadBytes ||
-      !source_need(source, kFrameHeadBytes)) {
+      !source.need(kFrameHeadBytes)) {
     return false;
   }
-  head = load_frame_head(source_take(source, kFrameHeadBytes));
+  head = load_frame_head(source.take(kFrameHeadBytes));
   remaining -= kFrameHeadBytes;
   return true;
 }
@@ -82,7 +82,7 @@ Reason foreign_process(PELOJ_SOURCE& source, uint8_t code) {
     case 0xC5:
     case 0xC6: {
       constexpr uint32_t kPrecision = 2;  // behind the segment's length
-      const bool known = source_need(source, kPrecision + 1);
+      const bool known = source.need(kPrecision + 1);
       const bool twelve = known && source.buffer[source.pos + kPrecision] == 12;
       return twelve ? Reason::kTwelveBit : Reason::kVariant;
     }

@@ -60,15 +60,15 @@ uint32_t match_code(BitReader& reader, const DerivedTable& table, int length) {
 
 // Reads up to the next marker, which becomes the unread one. False at the end of the source.
 bool scan_for_marker(PELOJ_SOURCE& source, Entropy& entropy, MarkerRecord& marker) {
-  while (source_need(source, 1)) {
-    if (*source_take(source, 1) != 0xFF) {
+  while (source.need(1)) {
+    if (*source.take(1) != 0xFF) {
       marker.discardedBytes++;
       continue;
     }
     uint8_t code;
     do {
-      if (!source_need(source, 1)) return false;
-      code = *source_take(source, 1);
+      if (!source.need(1)) return false;
+      code = *source.take(1);
     } while (code == 0xFF);
     if (code != 0) {
       entropy.unreadMarker = code;

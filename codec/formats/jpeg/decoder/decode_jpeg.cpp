@@ -35,8 +35,7 @@ bool large_enough(PELOJ_SOURCE& source, PELOJ_THUMBNAIL& thumbnail, const Reques
     return thumbnail.width != 0 && thumbnail.height != 0 && request.width < thumbnail.width &&
            request.height < thumbnail.height;
   }
-  if (thumbnail.type != PELOJ_THUMBNAIL_JPEG || !source_reposition(source, thumbnail.offset))
-    return false;
+  if (thumbnail.type != PELOJ_THUMBNAIL_JPEG || !source.move_to(thumbnail.offset)) return false;
   const PELOJ_FILEHEADER header = scan_header(source);
   if (header.width == 0 || header.height == 0) return false;
   thumbnail.width = header.width;
@@ -54,7 +53,7 @@ bool usable(PELOJ_SOURCE& source, PELOJ_THUMBNAIL& thumbnail, uint32_t policy, c
 
 bool decode_at(TAVIRPELO_DECINFO& decInfo, PELOJ_SOURCE& source, uint32_t offset, int imageWidth,
                int imageHeight, const Request& request) {
-  if (!source_reposition(source, offset)) {
+  if (!source.move_to(offset)) {
     log_error("TAVIRPELO_DecodeJPEG : seek Fail");
     return false;
   }

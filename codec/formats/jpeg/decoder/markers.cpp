@@ -30,15 +30,15 @@ struct Input {
 
   // Consumes n bytes into `bytes`; false when the source ends first.
   bool read(void* bytes, uint32_t n) const {
-    if (!source_need(source, n)) return cut();
-    std::memcpy(bytes, source_take(source, n), n);
+    if (!source.need(n)) return cut();
+    std::memcpy(bytes, source.take(n), n);
     return true;
   }
-  bool skip(uint32_t n) const { return source_skip(source, n) || cut(); }
+  bool skip(uint32_t n) const { return source.skip(n) || cut(); }
 
   // The bytes of a segment behind its length.
   bool open_segment(uint32_t& left) const {
-    return (source_need(source, 2) || cut()) && segment_length(source, left);
+    return (source.need(2) || cut()) && segment_length(source, left);
   }
 };
 

@@ -105,14 +105,14 @@ int make_scan_record(PELOJ_JDINFO* jdInfo, OsPtr<ScanRecord>* slot) {
 
 void save_scan(PELOJ_JDINFO* jdInfo, ScanRecord* record) {
   record->entropy = *jdInfo->entropy.state;
-  record->sourcePosition = source_offset(*jdInfo->source);
+  record->sourcePosition = jdInfo->source->tell();
   record->eobRun = jdInfo->entropy.eobRun;
   record->nextRestart = jdInfo->marker->nextRestart;
   record->unreadMarker = jdInfo->entropy.unreadMarker;
 }
 
 int load_scan(PELOJ_JDINFO* jdInfo, const ScanRecord* record) {
-  if (!source_reposition(*jdInfo->source, record->sourcePosition)) return 0;
+  if (!jdInfo->source->move_to(record->sourcePosition)) return 0;
   static_cast<ScanHeader&>(jdInfo->scan) = record->header;
   *jdInfo->entropy.state = record->entropy;
   jdInfo->entropy.eobRun = record->eobRun;

@@ -12,9 +12,9 @@ namespace {
 // Reads n bytes, more than the reader's window if need be.
 bool read(PELOJ_SOURCE& source, uint8_t* bytes, uint32_t n) {
   while (n > 0) {
-    if (!source_need(source, 1)) return false;
+    if (!source.need(1)) return false;
     const uint32_t part = std::min(n, source.avail);
-    std::memcpy(bytes, source_take(source, part), part);
+    std::memcpy(bytes, source.take(part), part);
     bytes += part;
     n -= part;
   }
@@ -24,14 +24,13 @@ bool read(PELOJ_SOURCE& source, uint8_t* bytes, uint32_t n) {
 // True with the cursor at the TIFF header when the segment that `remaining` bytes are left of is EXIF;
 // `remaining` then counts from there. Otherwise the segment has been passed; `lost` when that failed.
 bool enter_exif(PELOJ_SOURCE& cursor, uint32_t& remaining, bool& lost) {
-  const int64_t end = int64_t{source_offset(cursor)} + remaining;
-  if (remaining >= kExifIdentifierSize && end <= cursor.size &&
-      source_need(cursor, kExifIdentifierSize)) {
-    const bool found = is_exif_identifier(source_take(cursor, kExifIdentifierSize));
+  const int64_t end = int64_t{cursor.tell()} + remaining;
+  if (remaining >= kExifIdentifierSize && end <= cursor.size && cursor.need(kExifIdentifierSize)) {
+    const bool found = is_exif_identifier(cursor.take(kExifIdentifierSize));
     remaining -= kExifIdentifierSize;
     if (found) return true;
   }
-  lost = !source_skip(cursor, remaining);
+  lost = !cursor.skip(remaining);
   return false;
 }
 
@@ -61,10 +60,9 @@ bool is_exif_identifier(const uint8_t* bytes) {
 int find_and_read(PELOJ_SOURCE* cursor, TAVIRPELO_EXIFINFO* info) {
   constexpr uint8_t kStart[] = {0xFF, static_cast<uint8_t>(Marker::kSoi)};
   uint32_t remaining;
-  if (!source_need(*cursor, 2) || std::memcmp(source_take(*cursor, 2), kStart, 2) != 0)
-    return PELOJ_FAIL;
+  if (!cursor->need(2) || std::memcmp(cursor->take(2), kStart, 2) != 0) return PELOJ_FAIL;
   if (!find_exif(*cursor, remaining)) return PELOJ_FAIL;
-  const uint32_t base = source_offset(*cursor);
+  const uint32_t base = cursor->tell();
   OsBuffer<uint8_t> tiff;
   if (!tiff.allocate(remaining) || !read(*cursor, tiff.data(), remaining)) return PELOJ_FAIL;
   return read_structure(tiff.data(), base, remaining, info);

@@ -4,8 +4,8 @@
 #include <cstring>
 
 #include "codec/base/dec_info.h"
-#include "codec/formats/jpeg/decoder/mcu_decode.h"
 #include "codec/formats/jpeg/decoder/imcu_row.h"
+#include "codec/formats/jpeg/decoder/mcu_decode.h"
 
 namespace pelo::jpeg {
 namespace {
@@ -134,14 +134,14 @@ void init_partial(const PELOJ_JDINFO* jdInfo, RowSnapshot* snapshot) {
   *snapshot = {entropy.bits,
                entropy.lastDc,
                entropy.restartsToGo,
-               pelo::source_offset(*jdInfo->source),
+               jdInfo->source->tell(),
                entropy.insufficient,
                jdInfo->marker->nextRestart,
                jdInfo->entropy.unreadMarker};
 }
 
 int load_partial(PELOJ_JDINFO* jdInfo, const RowSnapshot* snapshot) {
-  if (!pelo::source_reposition(*jdInfo->source, snapshot->sourcePosition)) return 0;
+  if (!jdInfo->source->move_to(snapshot->sourcePosition)) return 0;
   EntropyState& entropy = *jdInfo->entropy.state;
   entropy.bits = snapshot->bits;
   entropy.lastDc = snapshot->lastDc;
