@@ -130,26 +130,17 @@ TEST(StripDecode, IgnoresEmptyCallsAndRefusesMissingArguments) {
 
 using HostileStrips = QuietTest;
 
-// Bands of 5 rows of a decode that may end anywhere; the number of bands, -1 when it did not start.
-int run(Bytes jpeg, const Shape& shape, int stopAfter = 1000) {
-  const DecInfo source = open_memory(jpeg, 0, TAVIRPELO_THUMBNAIL_NEVER);
-  if (source == nullptr) return -1;
-  PELOJ_JDINFO* state = __elo_jpeg_dec_line_init(source.get(), shape.width, shape.height, shape.format);
-  if (state == nullptr) return -1;
-  for (int band = 0;; ++band) {
-    if (5 * band >= shape.height || band == stopAfter) {
-      __elo_jpeg_dec_line_finish(state);
-      return band;
-    }
-    if (Band(shape, 5 * band, 5).process(state, 5) == 0) return band;
-  }
-}
-
 #ifdef TAVIR_HAVE_LIBJPEG
 TEST_F(HostileStrips, ADamagedProgressivePictureSetsTheError) {
-  const Bytes jpeg = encode_libjpeg(67, 203, {.progressive = true});
+  Bytes jpeg = encode_libjpeg(67, 203, {.progressive = true});
+  jpeg.resize(jpeg.size() - jpeg.size() / 3);
+  const DecInfo source = open_memory(jpeg, 0, TAVIRPELO_THUMBNAIL_NEVER);
   gTAVIRPELO_Error = 0;
-  EXPECT_LT(run(prefix(jpeg, jpeg.size() - jpeg.size() / 3), {67, 203, 1}), 41);
+  PELOJ_JDINFO* state = __elo_jpeg_dec_line_init(source.get(), 67, 203, TAVIRPELO_RGB888);
+  const Shape shape{67, 203, TAVIRPELO_RGB888};
+  int rows = 0;
+  while (state != nullptr && rows < 203 && Band(shape, rows, 7).process(state, 7) == 1) rows += 7;
+  EXPECT_LT(rows, 203);
   EXPECT_EQ(TAVIRPELO_ERROR_DECODE, gTAVIRPELO_Error);
 }
 #endif

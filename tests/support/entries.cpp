@@ -184,8 +184,8 @@ const Entry& entry(std::string_view name) {
 void repair_checksums(std::span<uint8_t> file) {
   if (file.size() < 8 || file[1] != 'P') return;
   for (size_t at = 8; at + 12 <= file.size();) {
-    const uint64_t length = pelo::load_be32(&file[at]);
-    if (length == 0 || at + 12 + length > file.size()) return;
+    const size_t length = pelo::load_be32(&file[at]);
+    if (length == 0 || length > file.size() - at - 12) return;
     pelo::store_be32(&file[at + 8 + length],
                      __PELOI_PngCrc32(&file[at + 4], static_cast<uint32_t>(length) + 4));
     at += 12 + length;
