@@ -112,8 +112,9 @@ int scale_anchored(const ScaleRequest& request) {
   if (scaledWidth < 1 || scaledHeight < 1) return 0;
 
   const ptrdiff_t bytes = layout->bytes;
-  const auto whole_pixels = [&](int stride) {
-    return format == TAVIRPELO_RGB888 ? ptrdiff_t{stride} : stride / bytes * bytes;
+  const bool anyStride = format == TAVIRPELO_RGB888;
+  const auto whole_pixels = [=](int stride) {
+    return anyStride ? ptrdiff_t{stride} : stride / bytes * bytes;
   };
   const ptrdiff_t sourceStride = whole_pixels(srcStride), targetStride = whole_pixels(dstStride);
   const Span x = span_of(srcWidth, dstWidth, scaledWidth, across(anchor));

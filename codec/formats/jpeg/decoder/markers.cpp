@@ -30,7 +30,7 @@ struct Input {
 
   // Consumes n bytes into `bytes`; false when the source ends first.
   bool read(void* bytes, uint32_t n) const {
-    if (!source.need(n)) return cut();
+    if (!source.need(n)) return cut(), false;
     std::memcpy(bytes, source.take(n), n);
     return true;
   }
