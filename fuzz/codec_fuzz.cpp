@@ -26,8 +26,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   if (size <= kHead) return 0;
   pelo::platform::set_log_sink([](const char*) {});
   constexpr int kFormats[] = {0, 1, 5, 6, 7, 8, 10, 11};
-  const tests::Request r{1 + data[2] % 100, 1 + data[3] % 100, kFormats[data[1] % 8],
-                         (data[4] | data[5] << 8) & 0x37FFu, 1 + data[6] % 40};
+  const tests::Request r{1 + data[2] % 100,     1 + data[3] % 100,
+                         kFormats[data[1] % 8], (data[4] | data[5] << 8) & 0x37FFu,
+                         1 + data[6] % 40,      data[7] % 5};
   // Blocks of exactly the right sizes: any byte beyond is noticed.
   std::vector<uint8_t> file(data + kHead, data + size);
   std::vector<uint8_t> pixels(static_cast<size_t>(r.width) * static_cast<size_t>(r.height) *
@@ -36,7 +37,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   TAVIRPELO_DECINFO* d = TAVIRPELO_CreateDecInfo(TAVIRPELO_IO_MEMORY, file.data(),
                                                  static_cast<int>(file.size()), r.format, r.option);
   if (d == nullptr) return 0;
-  TAVIRPELO_SetDecMode(d, data[7] % 5);
+  TAVIRPELO_SetDecMode(d, r.mode);
   tests::entries()[data[0] % tests::entries().size()].run(d, pixels.data(), r);
   check_set(pixels);
   TAVIRPELOI_AbortPNGIter(d);

@@ -192,6 +192,26 @@ TEST(Bmp, HeaderLayouts) {
 }
 
 TEST(Bmp, RowsInBatches) {
+  for (const bool topDown : {false, true}) {
+    Bmp bmp = random_bmp(4, 24, 13, 33);
+    bmp.topDown = topDown;
+    Bytes file = bmp.file();
+    for (const View& v : {View{{13, 33}, {13, 33}}, {{9, 20}, {9, 20}, TAVIRPELO_FIT_STRETCH}}) {
+      const auto [width, height] = v.box;
+      const Bytes want = expected(bmp, v, 1);
+      for (int lines = 1; lines <= height + 1; ++lines) {
+        const DecInfo decInfo = open_memory(file, 1, v.option);
+        GuardedPixels pixels(width, height, 1);
+        int calls = 0;
+        do {
+          ASSERT_EQ(1, TAVIRPELOI_DecodeBMPLine(decInfo.get(), pixels.data(), width, height, lines));
+          ++calls;
+        } while (decInfo->pFormatInfo != nullptr);
+        EXPECT_EQ((height + lines - 1) / lines, calls);
+        ASSERT_EQ(want, pixels.content()) << lines;
+      }
+    }
+  }
   Bytes file = random_bmp(5, 8, 4, 250).file();
   const DecInfo decInfo = open_memory(file, 1);
   GuardedPixels pixels(4, 250, 1), other(4, 250, 1);
@@ -231,6 +251,18 @@ TEST(Bmp, EveryTruncation) {
   });
 }
 
+TEST(Bmp, EveryHeaderByte) {
+  for (const int bits : kDepths) {
+    const Bytes file = random_bmp(7, bits, 6, 4).file();
+    for (size_t at = 0; at < std::min<size_t>(file.size(), 70); ++at) {
+      for (const uint8_t value : {0x00, 0x01, 0x02, 0x7F, 0x80, 0xFE, 0xFF}) {
+        for (const uint32_t option : {0u, uint32_t{TAVIRPELO_FIT_STRETCH | TAVIRPELO_ROTATE_90}})
+          EXPECT_LE(decode_bmp(overwritten(file, at, {value}), {{7, 5}, {}, option}, 8).answer, 1);
+      }
+    }
+  }
+}
+
 TEST(Bmp, FieldsAtTheirLimits) {
   const Bytes file = random_bmp(8, 8, 6, 4).file();
   const auto with = [&](size_t at, uint32_t value, int bytes) {
@@ -261,6 +293,11 @@ TEST(Bmp, ArgumentsAndSources) {
     const Bytes got = decode_bmp(file, {{6, 4}, {}}, format).pixels;
     EXPECT_EQ(Bytes(got.size(), kFill), got);
   }
+  const TempFile onDisk;
+  onDisk.write(file);
+  EXPECT_EQ(1, fail_each_allocation([&] {
+              return decode(TAVIRPELOI_DecodeBMP, open_file(onDisk.path(), 1).get(), 3, 3).answer;
+            }));
 }
 
 }  // namespace

@@ -31,20 +31,26 @@ int use(TAVIRPELO_EXIFINFO* info) {
 }
 
 // Blocks end where their data ends.
+int read(Bytes jpeg) {
+  jpeg.shrink_to_fit();
+  return use(TAVIRPELO_CreateJpegExifInfoFromBuffer(jpeg.data(), static_cast<int>(jpeg.size())));
+}
 int read_segment(Bytes segment) {
   segment.shrink_to_fit();
   return use(PELOJ_CreatExifInfoUseExifBuffer(segment.data(), static_cast<int>(segment.size())));
 }
 
-TEST_P(HostileExif, EveryTruncation) {
+TEST_P(HostileExif, EveryTruncationAndFlippedByte) {
   const auto cut_segment = [](const Bytes& cut) {
     EXPECT_EQ(0, read_segment(cut));  // shorter than its length says
+    EXPECT_EQ(0, read(ByteWriter().u16(0xFFD8).block(cut)));
     if (cut.size() < 4) return;
     // The same with a length that agrees: a TIFF structure that ends early.
     const Bytes agreeing = overwritten(cut, 2, ByteWriter().u16(cut.size() - 2));
     EXPECT_EQ(cut.size() >= 19 ? 1 : 0, read_segment(agreeing)) << cut.size();
   };
   every_truncation(whole_, cut_segment, 0);
+  every_flip(whole_, {0xFF, 0x01, 0x80, 0x04}, [](const Bytes& bad, size_t) { read_segment(bad); });
 }
 
 // Counts and offsets of every entry at their extremes and around the size of the data, for every type.
@@ -84,6 +90,13 @@ TEST_P(HostileExif, AFullDirectoryThatPointsAtItself) {
     exif.entry(Ifd::k0, tag, tag == 271 ? 2 : 4, tag == 271 ? 60000 : 1, offset);
   }
   EXPECT_EQ(1, read_segment(exif.segment()));
+}
+
+TEST_P(HostileExif, MemoryRunsOutAtEveryAllocation) {
+  long objects = 0;
+  EXPECT_EQ(1, fail_each_allocation([&] { return read(jpeg_); }, [&](int got) { objects += got; }));
+  // Strings and records that memory was short for are missing; the object is there.
+  EXPECT_GT(objects, 8);
 }
 
 }  // namespace

@@ -5,17 +5,12 @@
 namespace tests {
 namespace {
 
-// Two images, extensions, a local palette, interlace, transparency: something of everything.
-GifFile victim() {
-  GifFile file = sample_gif(23, 19, 3);
-  file.loops = true;
-  file.images[0].control = GifControl{2, 4, 1};
-  GifImage second = sample_gif(12, 9, 4, true).images[0];
-  second.left = 5, second.top = 6;
-  second.palette = sample_palette(16, 7);
-  second.control = GifControl{3, 4, -1};
-  file.images.push_back(second);
-  return file;
+// A source that claims to be longer than it is has not simply ended.
+TEST(GifHostile, ShorterThanItSays) {
+  MemoryStream stream{prefix(animated_gif().bytes(), 120)};
+  const DecInfo decInfo = open_stream(stream, 7);
+  decInfo->pIO->size = 300;
+  EXPECT_EQ(0, decode(TAVIRPELOI_DecodeGIF, decInfo.get(), 23, 19).answer);
 }
 
 // Where each image's data begin and end, found without the library in a file of sub-blocks, extensions
@@ -65,7 +60,7 @@ TEST(GifHostile, AnimationsCutAnywhere) {
 
 // More data than the image has pixels, none, and a sub-block that ends it without an end code.
 TEST(GifHostile, TooMuchAndTooLittleData) {
-  GifFile file = victim();
+  GifFile file = animated_gif();
   const auto second = [&] { return decode_frames(file.bytes(), 23, 19); };
   const Bytes expected = second().frames[1];
   for (const auto& [width, height] : {std::pair(23, 18), {23, 1}, {23, 0}, {0, 19}}) {

@@ -68,25 +68,27 @@ TEST_P(Pieces, EqualTheWhole) {
 
 // ---- what ends a decode that is under way ----
 
-template <auto Decode>
-int five_lines(TAVIRPELO_DECINFO* d, void* pixels, int width, int height) {
-  return Decode(d, pixels, width, height, 5);
+template <auto Decode, int kLines = 5>
+int lines(TAVIRPELO_DECINFO* d, void* pixels, int width, int height) {
+  return Decode(d, pixels, width, height, kLines);
 }
 
 struct Step {
   const char* sample;
   Decoder step, whole;
   int (*abort)(TAVIRPELO_DECINFO*);
+  Decoder noLines = nullptr;  // the same for an impossible number of them
 };
 constexpr Step kSteps[] = {
-    {"png, truecolour", five_lines<TAVIRPELOI_DecodePNGLine>, TAVIRPELOI_DecodePNG,
-     TAVIRPELOI_AbortPNGIter},
+    {"png, truecolour", lines<TAVIRPELOI_DecodePNGLine>, TAVIRPELOI_DecodePNG, TAVIRPELOI_AbortPNGIter,
+     lines<TAVIRPELOI_DecodePNGLine, -1>},
     {"png, truecolour", TAVIRPELOI_DecodePNGIter, TAVIRPELOI_DecodePNG, TAVIRPELOI_AbortPNGIter},
-    {"gif", five_lines<TAVIRPELOI_DecodeGIFLine>, TAVIRPELOI_DecodeGIF, TAVIRPELOI_AborAGIF},
+    {"gif", lines<TAVIRPELOI_DecodeGIFLine>, TAVIRPELOI_DecodeGIF, TAVIRPELOI_AborAGIF,
+     lines<TAVIRPELOI_DecodeGIFLine, 0>},
     {"gif", TAVIRPELOI_DecodeGIFIter, TAVIRPELOI_DecodeGIF, TAVIRPELOI_AbortGIFIter},
     {"gif", TAVIRPELOI_DecodeAGIF, TAVIRPELOI_DecodeGIF, TAVIRPELOI_AborAGIF},
     {"gif", TAVIRPELOI_DecodeAGIFIter, TAVIRPELOI_DecodeGIF, TAVIRPELOI_AborAGIF},
-    {"bmp", five_lines<TAVIRPELOI_DecodeBMPLine>, TAVIRPELOI_DecodeBMP, TAVIRPELOI_AbortBMPIter},
+    {"bmp", lines<TAVIRPELOI_DecodeBMPLine>, TAVIRPELOI_DecodeBMP, TAVIRPELOI_AbortBMPIter},
 };
 
 TEST(PiecesEnded, ByAnotherRequestOrTheCaller) {
@@ -104,7 +106,7 @@ TEST(PiecesEnded, ByAnotherRequestOrTheCaller) {
       ASSERT_NE(0, step(width, height));
       ASSERT_NE(nullptr, d->pFormatInfo);
     };
-    // The same request in different words.
+    // Each differs in one thing.
     const std::function<int()> others[] = {
         [&] { return step(width, height - 1); },
         [&] { return step(width + 1, height); },
@@ -119,6 +121,7 @@ TEST(PiecesEnded, ByAnotherRequestOrTheCaller) {
     start();
     EXPECT_EQ(0, step(width, -5));
     EXPECT_EQ(0, s.step(d, nullptr, width, height));
+    if (s.noLines != nullptr) EXPECT_EQ(0, s.noLines(d, pixels.data(), width, height));
     EXPECT_NE(nullptr, d->pFormatInfo) << "what is no request changes nothing";
     EXPECT_EQ(1, s.whole(d, pixels.data(), 10, 10)) << "a decode in one call starts afresh";
     EXPECT_EQ(nullptr, d->pFormatInfo);
@@ -136,6 +139,72 @@ TEST(PiecesEnded, ByAnotherRequestOrTheCaller) {
     EXPECT_EQ(&foreign, d->pFormatInfo);
     EXPECT_EQ(before, pixels.content());
     d->pFormatInfo = nullptr;
+  }
+}
+
+TEST(PiecesEnded, ByADecodeOfAnotherKind) {
+  constexpr Decoder kKinds[] = {lines<TAVIRPELOI_DecodeGIFLine>, TAVIRPELOI_DecodeGIFIter,
+                                TAVIRPELOI_DecodeAGIF};
+  Bytes file = sample("gif").file;
+  GuardedPixels pixels(23, 19, 7);
+  for (const Decoder kind : kKinds) {
+    for (const Decoder other : kKinds) {
+      if (kind == other) continue;
+      const DecInfo d = open_memory(file, 7);
+      ASSERT_NE(0, kind(d.get(), pixels.data(), 23, 19));
+      EXPECT_EQ(0, other(d.get(), pixels.data(), 23, 19));
+      EXPECT_EQ(nullptr, d->pFormatInfo);
+    }
+  }
+}
+
+// What each call answers, the rows that it leaves alone, and when the decode ends.
+TEST(PiecesOfRows, CallsAndAnswers) {
+  const struct {
+    const char* sample;
+    int (*decode)(TAVIRPELO_DECINFO*, void*, int, int, int);
+    int more;  // answer of a call that is not the last
+  } cases[] = {{"png, truecolour", TAVIRPELOI_DecodePNGLine, 4},
+               {"gif", TAVIRPELOI_DecodeGIFLine, 1},
+               {"gif, interlaced", TAVIRPELOI_DecodeGIFLine, 1}};
+  for (const auto& c : cases) {
+    const auto [width, height] = sample(c.sample).size;
+    Bytes file = sample(c.sample).file;
+    for (const Size size : {Size{width, height}, {width + 3, 2 * height}, {width, height / 3}}) {
+      for (int rows = 1; rows <= size.height + 1; ++rows) {
+        const DecInfo d = open_memory(file, 7, kStretch);
+        for (int row = 0; row < size.height; row += rows) {
+          GuardedPixels band(size.width, rows, 7);
+          const bool last = row + rows >= size.height;
+          ASSERT_EQ(last ? 1 : c.more, c.decode(d.get(), band.data(), size.width, size.height, rows));
+          ASSERT_EQ(last, d->pFormatInfo == nullptr) << rows << " from " << row;
+          const int used = std::min(rows, size.height - row);
+          const Bytes rest = suffix(band.content(), bytes_of(7, size.width, used));
+          EXPECT_EQ(Bytes(rest.size(), kFill), rest);
+        }
+      }
+    }
+  }
+  // A GIF in batches of sixteen of its rows, behind a first call that only begins.
+  for (const int height : {15, 16, 17, 48}) {
+    Bytes file = sample_gif(10, height, 3).bytes();
+    const DecInfo d = open_memory(file, 7);
+    GuardedPixels pixels(10, height, 7);
+    int calls = 1;
+    while (TAVIRPELOI_DecodeGIFIter(d.get(), pixels.data(), 10, height) == 4) ++calls;
+    EXPECT_EQ(1 + (height + 15) / 16, calls);
+  }
+}
+
+// Made smaller on both sides, lines of a GIF are sampled, not averaged, and turned requests come
+// unturned: alike whatever the split.
+TEST(PiecesOfRows, ReducedLinesOfAGif) {
+  const auto by_lines = [](int rows, uint32_t option) {
+    return pixels_of(entry("gif_by_lines"), sample("gif").file, {15, 11, 7, option, rows});
+  };
+  for (const int rows : {2, 7}) {
+    EXPECT_EQ(by_lines(11, 0x700), by_lines(rows, 0x700));
+    EXPECT_EQ(by_lines(11, 0x700), by_lines(rows, 0x704));
   }
 }
 

@@ -15,6 +15,7 @@ struct Request {
   int format = TAVIRPELO_RGB888;  // one of packed pixels
   uint32_t option = 0;
   int lines = 5;  // rows of a band or a call, where an entry takes them; turns and targets elsewhere
+  int mode = 0;   // of JPEG decodes
 };
 
 // An object's memory, which must be its source.
@@ -28,8 +29,7 @@ struct Entry {
   // Goes through the source to its end or to the first failure, as a caller would, and ends what it
   // began. Entries of pixels write width x height of them. 0 for a failure.
   int (*run)(TAVIRPELO_DECINFO*, uint8_t* pixels, const Request&);
-  bool pixels;     // writes them, as the format's decoder in one call does
-  bool anySource;  // reads files and streams as well as memory
+  bool pixels;  // writes them, as the format's decoder in one call does
 };
 
 std::span<const Entry> entries();

@@ -174,4 +174,16 @@ GifFile sample_gif(int width, int height, int bits, bool interlaced) {
   return {width, height, sample_palette(1 << bits), {image}};
 }
 
+GifFile animated_gif(bool interlaced) {
+  GifFile file = sample_gif(23, 19, 3, interlaced);
+  file.loops = true;
+  file.images[0].control = GifControl{2, 4, 1};
+  GifImage second = sample_gif(12, 9, 4, true).images[0];
+  second.left = 5, second.top = 6;
+  second.palette = sample_palette(16, 7);
+  second.control = GifControl{3, 4, -1};
+  file.images.push_back(second);
+  return file;
+}
+
 }  // namespace tests

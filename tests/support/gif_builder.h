@@ -64,4 +64,8 @@ Bytes sample_palette(int colours, uint32_t seed = 1);
 // A file of one image that fills the screen, with a palette of 2^bits colours.
 GifFile sample_gif(int width, int height, int bits = 8, bool interlaced = false);
 
+// 23 x 19 pixels with something of everything: two images, extensions, a local palette, interlace,
+// transparency.
+GifFile animated_gif(bool interlaced = false);
+
 }  // namespace tests

@@ -10,16 +10,11 @@
 namespace tests {
 namespace {
 
-// Two images, extensions, a local palette, transparency.
-Bytes animated_gif(bool interlaced) {
-  GifFile file = sample_gif(23, 19, 3, interlaced);
-  file.loops = true;
-  file.images[0].control = GifControl{2, 4, 1};
-  GifImage second = sample_gif(12, 9, 4, true).images[0];
-  second.left = 5, second.top = 6;
-  second.palette = sample_palette(16, 7);
-  second.control = GifControl{3, 4, -1};
-  file.images.push_back(second);
+// An image that leaves parts of the screen above and below it.
+Bytes framed_gif() {
+  GifFile file = sample_gif(30, 6, 6);
+  file.height = 20;
+  file.images[0].top = 5;
   return file.bytes();
 }
 
@@ -40,8 +35,9 @@ std::vector<Sample> make_samples() {
       {"png, truecolour", png_file(2, 8, false, 300), png},
       {"png, palette", png_file(3, 4, false, SIZE_MAX), png},
       {"png, alpha, interlaced", png_file(6, 8, true, 40), png, true},
-      {"gif", animated_gif(false), gif},
-      {"gif, interlaced", animated_gif(true), gif, true},
+      {"gif", animated_gif().bytes(), gif},
+      {"gif, interlaced", animated_gif(true).bytes(), gif, true},
+      {"gif, framed", framed_gif(), {30, 20}},
       {"bmp", bmp_file(21, 14), {21, 14}},
       {"wbmp", wbmp_file(21, 14), {21, 14}},
   };

@@ -89,6 +89,26 @@ TEST(ReEncode, WhatIsRefused) {
   EXPECT_EQ(TAVIRPELO_CODEC_ARGUMENT, debug_PeloCodecError);
 }
 
+TEST(ReEncode, DamageAndShortMemory) {
+  const Bytes source = encode_own(60, 50, 90);
+  every_flip(
+      source, {0x01, 0x80, 0xFF},
+      [](const Bytes& damaged, size_t at) { fit(damaged, at % 2 ? 900 : 1500); }, 2, 5);
+  every_truncation(
+      source, [](const Bytes& cut) { fit(cut, 900); }, 2, 9);
+  uint8_t* buffer = nullptr;
+  const auto run = [&] {
+    Bytes copy = source;
+    int size = 1024;
+    TAVIRPELO_OsFree(std::exchange(buffer, static_cast<uint8_t*>(TAVIRPELO_OsMalloc(1024))));
+    return elo_re_encode_to_buffer(copy.data(), static_cast<int>(copy.size()), 1, &buffer, &size, 900);
+  };
+  // The first of them is the buffer's own. A pass that had to be left out may still leave a picture.
+  const auto judge = [&](int answer) { EXPECT_EQ(answer == 1, buffer != nullptr); };
+  EXPECT_EQ(1, fail_each_allocation(run, judge, 2));
+  TAVIRPELO_OsFree(buffer);
+}
+
 TEST(ReEncode, GainsAndScales) {
   EXPECT_EQ(1024, __elo_get_update_gain(99, 100));
   for (const auto& [r, gain] : {std::pair{25, 960},

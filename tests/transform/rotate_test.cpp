@@ -121,6 +121,21 @@ TEST(Rotate, AbortedAnywhereEndsTheFile) {
   }
 }
 
+TEST(Rotate, DamageAndShortMemory) {
+  const Bytes source = encode_own(48, 40, 80);
+  const auto cut_turn = [](const Bytes& cut) {
+    for (const size_t t : {0, 1, 3, 5})
+      turn(cut, {48, 40}, kTurns[t].angle, kTurns[t].flip, cut.size() % 2 == 0);
+  };
+  every_truncation(source, cut_turn, 2, 7);
+  const auto damaged_turn = [](const Bytes& damaged, size_t at) {
+    turn(damaged, {48, 40}, kTurns[at % 7].angle, kTurns[at % 7].flip);
+  };
+  every_flip(source, {0x01, 0x80, 0xFF}, damaged_turn, 2, 3);
+  for (const size_t t : {1, 3})
+    fail_each_allocation([&] { return turn(source, {48, 40}, kTurns[t].angle, kTurns[t].flip).answer; });
+}
+
 #ifdef TAVIR_HAVE_LIBJPEG
 
 Bytes run_jpegtran(const Bytes& source, const char* options) {
