@@ -14,7 +14,7 @@ namespace pelo::gif {
 int fill_buffer(int need, TAVIRPELO_IO* io, uint8_t* buffer, int* remaining, uint8_t** cursor) {
   if (*remaining >= need) return 1;
   if (need > static_cast<int>(kSourceBufferSize)) return 0;
-  const auto avail = static_cast<uint32_t>(*remaining);
+  const auto avail = static_cast<uint32_t>(std::max(*remaining, 0));
   const auto pos = avail == 0 ? 0 : static_cast<uint32_t>(*cursor - buffer);
   Source source{io, 0, 0, pos, avail, buffer};
   const bool filled = source.need(static_cast<uint32_t>(need));

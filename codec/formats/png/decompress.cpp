@@ -121,6 +121,7 @@ int inflate_interlaced(PELOI_PNGCONTEXT& context, uint32_t* total, OpenInput ope
 }
 
 }  // namespace
+
 int refill_from_chunks(PELOI_PNGCONTEXT* context, Source* reader, uint32_t entryIndex) {
   PELOI_PNGINFO& info = context->info;
   while (entryIndex < info.idatCount && info.idat[entryIndex].length == 0) ++entryIndex;

@@ -98,6 +98,7 @@ int start(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int l
 }
 
 }  // namespace
+
 int decode_request(TAVIRPELO_DECINFO* decInfo, void* output, int width, int height, int lines) {
   const int result = decode(*decInfo, output, request_of(*decInfo, width, height), lines);
   if (result != kMore) release(decInfo);

@@ -1,7 +1,6 @@
 // The bit reader where it meets what is no data: windows, stuffing, markers, restarts, the end.
 #include "codec/formats/jpeg/decoder/bit_reader.h"
 
-#include "codec/base/io.h"
 #include "codec/formats/jpeg/decoder/jd_info.h"
 #include "codec/formats/jpeg/decoder/mcu_decode.h"
 #include "codec/formats/jpeg/marker_codes.h"
@@ -13,11 +12,10 @@ namespace {
 int next_byte(BitReader& reader) {
   if (reader.next == reader.end) {
     PELOJ_SOURCE& source = *reader.source;
-    const int count = read_io(source.io, source.buffer, static_cast<int>(kSourceBufferSize));
-    if (count <= 0) return -1;
-    source.consumed += static_cast<uint32_t>(count);
-    reader.next = source.buffer;
-    reader.end = reader.plainEnd = source.buffer + count;
+    source.pos = source.avail = 0;
+    if (!source.refill(kSourceBufferSize)) return -1;
+    reader.next = source.next();
+    reader.end = reader.plainEnd = reader.next + source.avail;
   }
   return *reader.next++;
 }

@@ -37,6 +37,12 @@ void replicate_row_group(const Frame& frame, Progress& progress) {
   progress.readPosition = 0;
 }
 
+// Full-grid rows at hand, as many as are left of a capacity: the row group's, or the next one's.
+int rows_at_hand(const Frame& frame, Progress& progress, int left) {
+  if (progress.readPosition >= frame.vMax) replicate_row_group(frame, progress);
+  return std::min(frame.vMax - progress.readPosition, left);
+}
+
 void advance(Progress& progress, int vMax, int rows) {
   progress.readPosition += rows;
   if (progress.readPosition >= vMax) ++progress.rowGroup;
@@ -109,9 +115,7 @@ void replicate_rows(const Component& component, int vMax, uint8_t** input, uint8
 }
 
 void convert_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
-  if (jdInfo->progress.readPosition >= jdInfo->frame.vMax)
-    replicate_row_group(jdInfo->frame, jdInfo->progress);
-  const int rows = std::min(jdInfo->frame.vMax - jdInfo->progress.readPosition, capacity - *rowCounter);
+  const int rows = rows_at_hand(jdInfo->frame, jdInfo->progress, capacity - *rowCounter);
   jdInfo->resampling.continueFlag = 1;
   while (jdInfo->resampling.continueFlag && jdInfo->output.emitted < jdInfo->output.bandEnd) {
     jdInfo->resampling.convert(jdInfo, rows);
@@ -123,9 +127,7 @@ void convert_rows(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
 }
 
 void skip_rows_unconverted(PELOJ_JDINFO* jdInfo, int* rowCounter, int capacity) {
-  if (jdInfo->progress.readPosition >= jdInfo->frame.vMax)
-    replicate_row_group(jdInfo->frame, jdInfo->progress);
-  const int rows = std::min(jdInfo->frame.vMax - jdInfo->progress.readPosition, capacity - *rowCounter);
+  const int rows = rows_at_hand(jdInfo->frame, jdInfo->progress, capacity - *rowCounter);
   *rowCounter += rows;
   advance(jdInfo->progress, jdInfo->frame.vMax, rows);
 }
