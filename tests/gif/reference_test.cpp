@@ -3,6 +3,8 @@
 
 #include <gif_lib.h>
 
+#include <cstring>
+
 #include "tests/gif/gif_decode.h"
 
 namespace tests {

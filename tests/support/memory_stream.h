@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <climits>
-#include <cstring>
 
 #include "tavirpelo/io.h"
 #include "tests/support/bytes.h"
@@ -21,7 +20,7 @@ struct MemoryStream {
 inline int stream_read(void* context, void* destination, int length) {
   auto& s = *static_cast<MemoryStream*>(context);
   const size_t count = std::min({static_cast<size_t>(std::min(length, s.limit)), s.bytes.size() - s.at});
-  std::memcpy(destination, s.bytes.data() + s.at, count);
+  std::copy_n(s.bytes.begin() + static_cast<ptrdiff_t>(s.at), count, static_cast<uint8_t*>(destination));
   s.at += count;
   return static_cast<int>(count) + s.lie;
 }
